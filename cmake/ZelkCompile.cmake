@@ -1,0 +1,37 @@
+# zelk_compile_options: what every source of this tree is compiled with. zelk::warnings is for our own
+# targets only and is never exported.
+find_package(Threads REQUIRED)
+
+add_library(zelk_options INTERFACE)
+add_library(zelk::options ALIAS zelk_options)
+target_compile_options(zelk_options INTERFACE -Wall -Wextra -fno-strict-aliasing)
+# The platform keeps its index checks (LOG_FATAL_IF) in every build type only with LOG_NDEBUG 0; they are
+# part of the library's behaviour.
+target_compile_definitions(zelk_options INTERFACE LOG_NDEBUG=0)
+
+if(ZELK_SANITIZE)
+  target_compile_options(zelk_options INTERFACE -fsanitize=${ZELK_SANITIZE} -fno-omit-frame-pointer)
+  target_link_options(zelk_options INTERFACE -fsanitize=${ZELK_SANITIZE})
+  if(ZELK_SANITIZE MATCHES "undefined")
+    # vptr checks need RTTI of the platform's classes, which its libraries do not promise.
+    target_compile_options(zelk_options INTERFACE -fno-sanitize-recover=all -fno-sanitize=vptr)
+  endif()
+endif()
+if(ZELK_COVERAGE)
+  target_compile_options(zelk_options INTERFACE --coverage)
+  target_link_options(zelk_options INTERFACE --coverage)
+endif()
+
+# The library's sources, compiled once: the shared library is linked from them, and so are the test
+# programs, which reach internals that the shared library does not export.
+add_library(zelkclient_objects OBJECT)
+target_include_directories(zelkclient_objects
+  PUBLIC ${CMAKE_SOURCE_DIR}/include
+  PRIVATE ${CMAKE_SOURCE_DIR})
+target_link_libraries(zelkclient_objects
+  PUBLIC android::binder android::utils android::log android::ui Threads::Threads
+  PRIVATE zelk::options)
+# The device's platform code is built without exceptions; so are we. (RTTI stays on: a caller that derives
+# from a stub may need its type information.)
+target_compile_options(zelkclient_objects PRIVATE -fno-exceptions)
+set_target_properties(zelkclient_objects PROPERTIES POSITION_INDEPENDENT_CODE ON)
