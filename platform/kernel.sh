@@ -1,0 +1,50 @@
+# SPDX-License-Identifier: Apache-2.0
+# Debian's kernel with the Binder driver, and the initramfs that starts it. Sourced by ./dev.
+# shellcheck shell=bash disable=SC2153,SC2034 # variables shared with ./dev and vm.sh
+
+# In the order in which they are loaded.
+KERNEL_MODULES=(virtio_ring virtio virtio_pci_modern_dev virtio_pci_legacy_dev virtio_pci netfs fscache 9pnet
+    9pnet_virtio 9p binder_linux)
+
+# Sets VM_KERNEL and VM_INITRAMFS. The kernel is the newest that the archive had when it was first needed.
+ensure_vm_image() {
+    local folder key
+    VM_KERNEL=$ZELK_CACHE/kernel/bookworm
+    make_cached "$VM_KERNEL" 200 "fetching Debian's kernel (about 70 MB)" unpack_kernel
+    key=$(cat "$VM_KERNEL/version" "$ROOT/platform/vm-init" /bin/busybox \
+        <(printf '%s\n' "${KERNEL_MODULES[@]}") | short_hash)
+    folder=$ZELK_CACHE/initramfs/$key
+    make_cached "$folder" 20 "making the initramfs" make_initramfs "$VM_KERNEL"
+    VM_INITRAMFS=$folder/initramfs
+}
+
+# Only the image and the modules named above are kept, out of 400 MB.
+unpack_kernel() {
+    local scratch=$1 package
+    local -a files=("${KERNEL_MODULES[@]/#/*/}")
+    files=("${files[@]/%/.ko}")
+    update_private_lists
+    package=$(private_apt apt-cache depends linux-image-amd64 | awk '$1 == "Depends:" { print $2; exit }')
+    [[ -n $package ]] || die "Debian's archive has no linux-image-amd64"
+    cd -- "$scratch" || exit
+    run_logged "the kernel cannot be fetched" private_apt apt-get download "$package"
+    mkdir -p result/modules unpacked
+    dpkg-deb --fsys-tarfile "$package"_*.deb |
+        tar -C unpacked -xf - --wildcards './boot/vmlinuz-*' "${files[@]}" ||
+        die "the kernel package $package cannot be unpacked"
+    find unpacked/lib -name '*.ko' -exec mv -t result/modules {} +
+    mv unpacked/boot/vmlinuz-* result/vmlinuz
+    printf '%s\n' "$package"_*.deb >result/version
+}
+
+make_initramfs() {
+    local kernel=$1 scratch=$2 root=$2/root module
+    mkdir -p -- "$root/bin" "$root/modules" "$scratch/result"
+    cp /bin/busybox "$root/bin/"
+    install -m 755 "$ROOT/platform/vm-init" "$root/init"
+    for module in "${KERNEL_MODULES[@]}"; do
+        cp "$kernel/modules/$module.ko" "$root/modules/"
+        printf '/modules/%s.ko\n' "$module" >>"$root/modules/order"
+    done
+    (cd "$root" && find . | cpio --quiet -o -H newc) >"$scratch/result/initramfs"
+}

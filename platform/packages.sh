@@ -1,0 +1,95 @@
+# SPDX-License-Identifier: Apache-2.0
+# The host: what it must be, and Debian's packages that have to be on it. Sourced by ./dev.
+# shellcheck shell=bash disable=SC2034 # the lists are used by ./dev
+
+# The Android platform's headers and libraries, and the compiler of its interface files.
+PACKAGES_PLATFORM=(android-libutils-dev android-libcutils-dev android-liblog-dev android-libbase-dev
+    android-platform-system-core-headers android-platform-frameworks-native-headers aidl xz-utils)
+# Compilers; clang with its runtime and symbolizer is for the address sanitizer.
+PACKAGES_BUILD=(g++ cmake ninja-build clang libclang-rt-14-dev llvm)
+PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev)
+# Libraries of zelkctl and the simulator; mandoc checks the manual pages.
+PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev mandoc)
+# The machine that runs a kernel with the Binder driver.
+PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
+
+# check_host [os-release file] [machine]
+check_host() {
+    local os_release=${1:-/etc/os-release} machine=${2:-$(uname -m)} tool
+    [[ $machine == x86_64 ]] ||
+        die "unsupported architecture $machine: the shared control block fits glibc's mutex on x86-64" \
+            "only (on other machines, 64-bit Arm among them, it has another size)"
+    check_distribution "$os_release"
+    for tool in apt-get apt-cache dpkg-query dpkg-deb flock setpriv sha256sum; do
+        command -v "$tool" >/dev/null || die "$tool is missing: it belongs to every Debian system"
+    done
+}
+
+# Other releases carry another Android, whose libbinder has other sources than platform/ builds.
+check_distribution() {
+    local ID='' VERSION_ID='' PRETTY_NAME='this system'
+    if [[ -r $1 ]]; then
+        # shellcheck source=/dev/null
+        . "$1"
+    fi
+    [[ $ID == debian && $VERSION_ID == 12 ]] ||
+        die "unsupported distribution ($PRETTY_NAME): the platform is built from the packages of Debian 12;" \
+            "elsewhere bring the android:: targets along (docs/platform.md)"
+}
+
+missing_packages() {
+    local installed
+    installed=$(dpkg-query -W -f '${db:Status-Abbrev}${Package}\n' "$@" 2>/dev/null |
+        sed -n 's/^ii //p')
+    comm -23 <(printf '%s\n' "$@" | sort -u) <(sort -u <<<"$installed")
+}
+
+# need_packages <package …>: installs those that are missing, after asking where a person can answer.
+need_packages() {
+    local -a missing sudo=()
+    mapfile -t missing < <(missing_packages "$@")
+    if ((${#missing[@]} == 0)); then
+        return
+    fi
+    local command="apt-get install --no-install-recommends ${missing[*]}"
+    if ((EUID != 0)); then
+        can_ask_for_sudo || die "packages are missing; as root run: $command"
+        ask "Install these packages with sudo: ${missing[*]}?" ||
+            die "packages are missing; as root run: $command"
+        sudo=(sudo)
+        sudo -v || die "sudo refused; as root run: $command"
+    fi
+    install_packages
+}
+
+can_ask_for_sudo() {
+    [[ -t 0 && -t 2 ]] && command -v sudo >/dev/null
+}
+
+ask() {
+    local answer
+    read -r -p "$1 [y/N] " answer
+    [[ $answer == [yY]* ]]
+}
+
+# Takes missing and sudo from need_packages. The package lists are fetched only where they turn out to be
+# absent or too old.
+install_packages() {
+    local -a install=("${sudo[@]}" env DEBIAN_FRONTEND=noninteractive
+        apt-get -q -y install --no-install-recommends "${missing[@]}")
+    say "installing ${missing[*]}"
+    if all_have_candidates "${missing[@]}" && "${install[@]}" </dev/null >&2; then
+        return
+    fi
+    say "fetching the package lists"
+    "${sudo[@]}" apt-get -q update </dev/null >&2 || die "apt-get update failed: is the network up?"
+    all_have_candidates "${missing[@]}" ||
+        die "apt knows no candidate for some of these packages: ${missing[*]}"
+    "${install[@]}" </dev/null >&2 || die "apt-get could not install ${missing[*]} (its messages are above)"
+}
+
+all_have_candidates() {
+    local with_candidate
+    with_candidate=$(apt-cache policy "$@" | grep -c '^  Candidate: [^(]')
+    ((with_candidate == $#))
+}

@@ -1,0 +1,86 @@
+# SPDX-License-Identifier: Apache-2.0
+# The Android sources, from Debian's source package, and the platform built of them. Sourced by ./dev.
+# shellcheck shell=bash
+
+# What is unpacked; the whole package is five times as large.
+ANDROID_PARTS=(
+    frameworks/native/cmds/service
+    frameworks/native/cmds/servicemanager
+    frameworks/native/include
+    frameworks/native/libs/arect
+    frameworks/native/libs/binder
+    frameworks/native/libs/math
+    frameworks/native/libs/nativebase
+    frameworks/native/libs/ui
+    system/core/base
+    system/core/libcutils
+    system/core/liblog/include
+    system/core/libprocessgroup/include
+    system/core/libutils
+)
+
+# The version of the source package that the installed headers were built from.
+android_version() {
+    local version
+    version=$(dpkg-query -W -f '${source:Version}' android-platform-frameworks-native-headers)
+    [[ $version == 29.0.6-* ]] ||
+        die "the installed Android headers are of version $version; platform/CMakeLists.txt builds 29.0.6"
+    printf '%s\n' "$version"
+}
+
+ensure_sources() {
+    local version
+    version=$(android_version)
+    ANDROID_SOURCES=$ZELK_CACHE/sources/android-platform-tools-$version
+    make_cached "$ANDROID_SOURCES" 300 "fetching the sources of android-platform-tools $version (76 MB)" \
+        unpack_sources "$version"
+}
+
+unpack_sources() {
+    local version=$1 scratch=$2
+    update_private_lists
+    cd -- "$scratch" || exit
+    run_logged "the source package cannot be fetched" \
+        private_apt apt-get source --download-only "android-platform-tools=$version"
+    mkdir result
+    run_logged "the source package cannot be unpacked" \
+        tar -C result --strip-components=1 -xf "android-platform-tools_${version%-*}.orig.tar.gz" \
+        "${ANDROID_PARTS[@]/#/android-platform-tools-${version%-*}/}"
+}
+
+# ensure_platform ["" | thread]: builds the platform, with that sanitizer, where build/platform… points.
+ensure_platform() {
+    local sanitize=$1 folder link=$ROOT/build/platform
+    ensure_sources
+    folder=$ZELK_CACHE/platform/$(platform_key "$sanitize")
+    make_cached "$folder" 500 "building the Android platform${sanitize:+ with -fsanitize=$sanitize}" \
+        build_platform "$sanitize" "$folder"
+    if [[ $sanitize == thread ]]; then
+        link=$link-tsan
+    fi
+    if [[ $(readlink -- "$link") != "$folder" ]]; then
+        mkdir -p -- "$ROOT/build"
+        ln -sfnT -- "$folder" "$link"
+    fi
+}
+
+platform_key() {
+    {
+        printf '%s\n' "$ANDROID_SOURCES" "$1"
+        g++ -dumpfullversion -dumpmachine
+        dpkg-query -W android-libutils-dev android-libcutils-dev android-liblog-dev android-libbase-dev aidl
+        (cd "$ROOT/platform" && find CMakeLists.txt ./*.in ./*.h servicemanager -type f -print0 |
+            sort -z | xargs -0 sha256sum)
+    } | short_hash
+}
+
+build_platform() {
+    local sanitize=$1 folder=$2 scratch=$3
+    run_logged "the platform cannot be configured" \
+        cmake -S "$ROOT/platform" -B "$scratch/build" -G Ninja -DCMAKE_C_COMPILER=gcc \
+        -DCMAKE_CXX_COMPILER=g++ -DANDROID_SOURCE_DIR="$ANDROID_SOURCES" -DPLATFORM_SANITIZE="$sanitize" \
+        -DCMAKE_INSTALL_PREFIX="$folder"
+    cmake --build "$scratch/build" >&2 || die "the platform does not build (the messages are above)"
+    DESTDIR=$scratch/stage run_logged "the platform cannot be installed" cmake --install "$scratch/build"
+    mv -- "$scratch/stage$folder" "$scratch/result"
+}
