@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <binder/IInterface.h>
-
+#include "pemaro/Binder.h"
 #include "pemaro/ITouchCompanionClient.h"
 
 namespace pemaro {
 
-/** Proxy of ITouchCompanionClient, held by the service; an identity without operations. */
+/// Proxy of ITouchCompanionClient, held by the service; an identity without operations.
 class ZELK_API BpTouchCompanionClient : public android::BpInterface<ITouchCompanionClient> {
   public:
     explicit BpTouchCompanionClient(const android::sp<android::IBinder>& remote);

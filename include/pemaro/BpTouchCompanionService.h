@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <binder/IInterface.h>
-
+#include "pemaro/Binder.h"
 #include "pemaro/ITouchCompanionService.h"
 
 namespace pemaro {
 
-/** Proxy of ITouchCompanionService; see there for what each operation returns. Callable from any
- * thread. */
+/// Proxy of ITouchCompanionService; see there for what each operation returns. Callable from any
+/// thread.
 class ZELK_API BpTouchCompanionService : public android::BpInterface<ITouchCompanionService> {
   public:
     explicit BpTouchCompanionService(const android::sp<android::IBinder>& remote);

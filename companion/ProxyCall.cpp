@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "companion/ProxyCall.h"
+
+#include <log/log.h>
+#include <utils/String8.h>
+
+#include <cstring>
+
+#include "pemaro/Status.h"
+
+namespace pemaro {
+
+ProxyCall::ProxyCall(const char* tag, const ProxyRow& row, const android::String16& descriptor)
+        : mTag(tag), mRow(row) {
+    if (mRow.entry != nullptr) {
+        __android_log_print(ANDROID_LOG_DEBUG, mTag, "%s", mRow.entry);
+    }
+    request.writeInterfaceToken(descriptor);
+}
+
+int ProxyCall::transact(android::IBinder* remote) {
+    android::status_t status = remote->transact(mRow.code, request, &reply, 0);
+    if (status == android::NO_ERROR) {
+        return STATUS_NO_ERROR;
+    }
+    if (mRow.transportError != nullptr) {
+        __android_log_print(ANDROID_LOG_ERROR, mTag, mRow.transportError, transportText(status));
+    }
+    return STATUS_UNKNOWN_ERROR;
+}
+
+int ProxyCall::readStatus() {
+    int status = reply.readInt32();
+    if (status != STATUS_NO_ERROR && mRow.remoteError != nullptr) {
+        __android_log_print(ANDROID_LOG_ERROR, mTag, mRow.remoteError, errStr(status));
+    }
+    return status;
+}
+
+int ProxyCall::transactForStatus(android::IBinder* remote) {
+    int status = transact(remote);
+    return status == STATUS_NO_ERROR ? readStatus() : status;
+}
+
+const char* transportText(android::status_t status) {
+    // In unsigned arithmetic: the platform's UNKNOWN_ERROR is the one number that has no negative.
+    return strerror(static_cast<int>(0u - static_cast<unsigned int>(status)));
+}
+
+void writeText(android::Parcel& parcel, const std::string& text) {
+    parcel.writeString8(android::String8(text.data(), text.size()));
+}
+
+std::string readText(const android::Parcel& parcel) {
+    android::String8 text = parcel.readString8();
+    return std::string(text.c_str(), text.size());
+}
+
+}  // namespace pemaro

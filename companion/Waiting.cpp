@@ -1,0 +1,11 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "companion/Waiting.h"
+
+namespace pemaro {
+
+WaitHooks& waitHooks() {
+    static WaitHooks hooks = {pthread_cond_timedwait, usleep};
+    return hooks;
+}
+
+}  // namespace pemaro
