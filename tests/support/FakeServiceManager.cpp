@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tests/support/FakeServiceManager.h"
+
+#include <utils/String16.h>
+#include <utils/String8.h>
+
+#include <utility>
+
+namespace pemaro::test {
+
+namespace {
+
+std::mutex gDefaultLock;
+android::sp<FakeServiceManager> gDefault;
+
+std::string textOf(const android::String16& name) {
+    return android::String8(name).c_str();
+}
+
+}  // namespace
+
+void FakeServiceManager::add(const std::string& name,
+                             const android::sp<android::IBinder>& service) {
+    std::lock_guard<std::mutex> lock(mLock);
+    mServices[name] = service;
+}
+
+void FakeServiceManager::remove(const std::string& name) {
+    std::lock_guard<std::mutex> lock(mLock);
+    mServices.erase(name);
+}
+
+int FakeServiceManager::lookups(const std::string& name) const {
+    std::lock_guard<std::mutex> lock(mLock);
+    auto found = mLookups.find(name);
+    return found == mLookups.end() ? 0 : found->second;
+}
+
+void FakeServiceManager::onLookup(LookupHook hook) {
+    std::lock_guard<std::mutex> lock(mLock);
+    mHook = std::move(hook);
+}
+
+android::sp<android::IBinder> FakeServiceManager::find(const android::String16& name16) const {
+    std::string name = textOf(name16);
+    LookupHook hook;
+    int attempt;
+    {
+        std::lock_guard<std::mutex> lock(mLock);
+        attempt = ++mLookups[name];
+        hook = mHook;
+    }
+    if (hook) {
+        hook(name, attempt);
+    }
+    std::lock_guard<std::mutex> lock(mLock);
+    auto found = mServices.find(name);
+    return found == mServices.end() ? nullptr : found->second;
+}
+
+android::sp<android::IBinder> FakeServiceManager::getService(const android::String16& name) const {
+    return find(name);
+}
+
+android::sp<android::IBinder> FakeServiceManager::checkService(
+        const android::String16& name) const {
+    return find(name);
+}
+
+android::sp<android::IBinder> FakeServiceManager::waitForService(const android::String16& name) {
+    return find(name);
+}
+
+android::status_t FakeServiceManager::addService(const android::String16& name,
+                                                 const android::sp<android::IBinder>& service,
+                                                 bool /*allowIsolated*/, int /*dumpsysFlags*/) {
+    add(textOf(name), service);
+    return android::NO_ERROR;
+}
+
+android::Vector<android::String16> FakeServiceManager::listServices(int /*dumpsysFlags*/) {
+    std::lock_guard<std::mutex> lock(mLock);
+    android::Vector<android::String16> names;
+    for (const auto& entry : mServices) {
+        names.push(android::String16(entry.first.c_str()));
+    }
+    return names;
+}
+
+bool FakeServiceManager::isDeclared(const android::String16& name) {
+    std::lock_guard<std::mutex> lock(mLock);
+    return mServices.count(textOf(name)) != 0;
+}
+
+ScopedServiceManager::ScopedServiceManager() : mManager(new FakeServiceManager) {
+    std::lock_guard<std::mutex> lock(gDefaultLock);
+    gDefault = mManager;
+}
+
+ScopedServiceManager::~ScopedServiceManager() {
+    std::lock_guard<std::mutex> lock(gDefaultLock);
+    gDefault = nullptr;
+}
+
+}  // namespace pemaro::test
+
+// Takes the place of libbinder's.
+android::sp<android::IServiceManager> android::defaultServiceManager() {
+    std::lock_guard<std::mutex> lock(pemaro::test::gDefaultLock);
+    return pemaro::test::gDefault;
+}
