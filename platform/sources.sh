@@ -53,7 +53,7 @@ ensure_platform() {
     local sanitize=$1 folder link=$ROOT/build/platform
     ensure_sources
     folder=$ZELK_CACHE/platform/$(platform_key "$sanitize")
-    make_cached "$folder" 500 "building the Android platform${sanitize:+ with -fsanitize=$sanitize}" \
+    make_cached "$folder" 500 "building the Android platform${sanitize:+ with -fsanitize=$sanitize} (about half a minute)" \
         build_platform "$sanitize" "$folder"
     if [[ $sanitize == thread ]]; then
         link=$link-tsan
@@ -80,7 +80,7 @@ build_platform() {
         cmake -S "$ROOT/platform" -B "$scratch/build" -G Ninja -DCMAKE_C_COMPILER=gcc \
         -DCMAKE_CXX_COMPILER=g++ -DANDROID_SOURCE_DIR="$ANDROID_SOURCES" -DPLATFORM_SANITIZE="$sanitize" \
         -DCMAKE_INSTALL_PREFIX="$folder"
-    cmake --build "$scratch/build" >&2 || die "the platform does not build (the messages are above)"
+    run_logged "the platform does not build" cmake --build "$scratch/build"
     DESTDIR=$scratch/stage run_logged "the platform cannot be installed" cmake --install "$scratch/build"
     mv -- "$scratch/stage$folder" "$scratch/result"
 }

@@ -71,6 +71,11 @@ vm_kill() {
     done
 }
 
+# To be run in the background: a process that does not outlive this script, even when that is killed.
+vm_helper() {
+    exec setpriv --pdeathsig KILL "$@"
+}
+
 # ---- waiting, and being told to stop -------------------------------------------------------------------
 
 vm_set_timer() {
@@ -80,7 +85,7 @@ vm_set_timer() {
         VM_TIMER=
     fi
     if [[ -n $1 ]]; then
-        sleep "$1" &
+        vm_helper sleep "$1" &
         VM_TIMER=$!
     fi
 }
@@ -179,15 +184,11 @@ vm_start_qemu() {
     mkfifo "$VM_SCRATCH/serial"
     exec {VM_SERIAL}<>"$VM_SCRATCH/serial"
     vm_qemu_arguments
-    # In a session of its own, a terminal's Ctrl-C does not reach it; and it does not outlive this script.
-    setsid setpriv --pdeathsig KILL qemu-system-x86_64 "${VM_QEMU[@]}" \
+    # In a session of its own, a terminal's Ctrl-C does not reach it.
+    vm_helper setsid qemu-system-x86_64 "${VM_QEMU[@]}" \
         <"$VM_SCRATCH/serial" >"$VM_SCRATCH/console" 2>&1 &
     VM_CHILD=$!
-    # shellcheck disable=SC2016
-    setsid setpriv --pdeathsig KILL bash -c 'sleep "$1"; [[ -e $2/started ]] || kill -KILL "$3"' \
-        watchdog "$VM_BOOT_SECONDS" "$VM_EXCHANGE" "$VM_CHILD" &
-    VM_WATCHDOG=$!
-    disown "$VM_WATCHDOG"
+    vm_watch_boot
     vm_follow "$VM_EXCHANGE/stdout" &
     VM_READERS=("$!")
     if [[ -e $VM_EXCHANGE/stderr ]]; then
@@ -197,7 +198,17 @@ vm_start_qemu() {
 }
 
 vm_follow() {
-    exec tail -q -s 0.05 -c +1 --pid="$VM_CHILD" -f -- "$1" 2>/dev/null
+    vm_helper tail -q -s 0.05 -c +1 --pid="$VM_CHILD" -f -- "$1" 2>/dev/null
+}
+
+# Ends a guest that hangs before it gets to the command.
+vm_watch_boot() {
+    mkfifo "$VM_SCRATCH/nothing"
+    # shellcheck disable=SC2016 # expanded by the helper
+    vm_helper bash -c 'read -r -t "$1" <>"$2/nothing"; [[ -e $2/exchange/started ]] || kill -KILL "$3"' \
+        watchdog "$VM_BOOT_SECONDS" "$VM_SCRATCH" "$VM_CHILD" &
+    VM_WATCHDOG=$!
+    disown "$VM_WATCHDOG"
 }
 
 # shellcheck disable=SC2054 # commas are QEMU's
