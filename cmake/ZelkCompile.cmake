@@ -34,4 +34,7 @@ target_link_libraries(zelkclient_objects
 # The device's platform code is built without exceptions; so are we. (RTTI stays on: a caller that derives
 # from a stub may need its type information.)
 target_compile_options(zelkclient_objects PRIVATE -fno-exceptions)
-set_target_properties(zelkclient_objects PROPERTIES POSITION_INDEPENDENT_CODE ON)
+set_target_properties(zelkclient_objects PROPERTIES
+  POSITION_INDEPENDENT_CODE ON
+  CXX_VISIBILITY_PRESET hidden
+  VISIBILITY_INLINES_HIDDEN ON)

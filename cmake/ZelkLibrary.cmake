@@ -4,6 +4,8 @@ add_library(zelk::zelkclient ALIAS zelkclient)
 target_link_libraries(zelkclient
   PUBLIC android::binder android::utils android::log android::ui
   PRIVATE zelkclient_objects Threads::Threads zelk::options)
+target_link_options(zelkclient PRIVATE LINKER:--version-script=${CMAKE_SOURCE_DIR}/cmake/zelkclient.map)
+set_target_properties(zelkclient PROPERTIES LINK_DEPENDS ${CMAKE_SOURCE_DIR}/cmake/zelkclient.map)
 target_include_directories(zelkclient PUBLIC
   $<BUILD_INTERFACE:${CMAKE_SOURCE_DIR}/include>
   $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)

@@ -109,6 +109,84 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     /// Gives the frames of acquireBuffer() back to the service.
     void releaseBuffer(FrameBuffer* buffer);
 
+    // ---- commands ----
+
+    /// Sends a command: its name and, each after a space, numbers as strtol() reads them in base 0
+    /// ("calibrate 3 0x10"; what is no number counts as 0). Unless the call itself fails, `*result`
+    /// receives a text that the caller releases with free(): the service's own, "response success"
+    /// when it sent none, or "response failed" together with the status 0x4000000C when the
+    /// response could not be read. 0x40000000 for a null `command`; 0x40000006, and a null
+    /// `*result`, when the text could not be allocated. `result` must not be null.
+    int sendCommand(const char* command, char** result);
+
+    /// Sends a request map as it is and stores the service's answer into `response`.
+    int sendCommand(SerializableMap& request, SerializableMap& response);
+
+    /// Chooses by the bits of `mask` what recorded frames contain. 0x4000000C when the response
+    /// cannot be read; the number in it is only logged.
+    int setRecordFilter(unsigned int mask);
+
+    /// Sets a property to a list of numbers, as in sendCommand(). The only property is
+    /// "setRollingLogSize"; 0x40000005 for any other name and for a null `name` or `value`.
+    int setProperty(const char* name, const char* value);
+
+    /// Reads the value under `key`, "RESPONSE", "RESULTS" of a response: as a number, a map or an
+    /// array. 0x4000000C, and `result` as it was, when it is absent or something else.
+    int getResultFromResponseCmd(SerializableMap& response, int& result, std::string key);
+    int getResultFromResponseCmd(SerializableMap& response, SerializableMap& result,
+                                 std::string key);
+    int getResultFromResponseCmd(SerializableMap& response, SerializableMapArray& result,
+                                 std::string key);
+
+    /// Appends the numbers of a space-separated list to `values` and adds their number to `count`:
+    /// one number more than there are spaces. Returns 0. The first character of `text` is taken
+    /// without being looked at, so an empty text needs a second NUL.
+    int getToolCmdValue(char* text, SerializableMapArray& values, int& count);
+
+    /// Reads `text`, whose first character is taken without being looked at, as one hexadecimal
+    /// number. Returns 0.
+    int getToolCmdValue(char* text, int& value);
+
+    // ---- configuration, events, sessions ----
+
+    /// Hands an event to the service.
+    int sendEvent(eventType type, eventParam param);
+
+    /// Makes the service read its configuration from a file of its own: `*path`, or when null the
+    /// one it knows. An empty path is not a null one.
+    int reloadConfig(const std::string* path);
+
+    /// Makes the service write its configuration, as reloadConfig() reads it.
+    int saveConfig(const std::string* path);
+
+    /// Replaces the service's binary configuration by `size` bytes.
+    int setConfigParams(const void* data, size_t size);
+
+    /// Reads the binary configuration. `*len` is the capacity of `buffer` in bytes and receives the
+    /// configuration's length; with a `*len` of 0 only the length is asked for. 0x4000001B for a
+    /// null `len`; 0x40000000, and `*len` as it was, on any failure, a buffer that is too small
+    /// among them. With a null `buffer` and enough capacity nothing is copied, and 0 returned.
+    int getConfigParams(void* buffer, size_t* len);
+
+    /// Reads configuration values: `params` names the wanted keys and receives their values. A map
+    /// without entries asks for nothing and succeeds without a call.
+    int getConfigParams(SerializableMap& params);
+
+    /// The bytes of a frame. A failed call cannot be told from a packet size of 0x40000000.
+    int getPacketSize();
+
+    /// Reads the service's inspection word into `*value`, which must not be null.
+    int inspect(unsigned int* value);
+
+    /// Saves the service's state and stores the session's identifier into `sessionID`.
+    int saveSession(int& sessionID);
+
+    /// Returns the service to the state of a saved session.
+    int restoreSession(int sessionID);
+
+    /// Authenticates the caller with a text that only the service understands; it must not be null.
+    int setAuth(const char* auth);
+
   protected:
     /// Unregisters from the service and ends the recording thread, if init() had succeeded.
     ~TouchCompanionClient() override;
@@ -120,6 +198,7 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     int waitForFrames(uint32_t& write, uint32_t& available);
     uint32_t frameLength(const void* frame) const;
     void countFrame();
+    int readCommandResponse(SerializableMap& response, char** result);
 
     bool mInitialized = false;
     android::sp<TouchCompanionThread> mThread;

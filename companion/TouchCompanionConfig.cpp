@@ -1,0 +1,120 @@
+// SPDX-License-Identifier: Apache-2.0
+// TouchCompanionClient's configuration, events, sessions and authentication: each hands one call to
+// the service and passes its status on.
+
+#define LOG_TAG "TouchCompanionClient"
+
+#include <log/log.h>
+
+#include "pemaro/Status.h"
+#include "pemaro/TouchCompanionClient.h"
+
+namespace pemaro {
+
+namespace {
+
+// Most of the operations below: one call, and a line for a failure.
+template <typename Operation>
+int forward(const android::sp<ITouchCompanionService>& service, const char* failure,
+            Operation&& operation) {
+    if (service == nullptr) {
+        return STATUS_INVALID_STATE;
+    }
+    int status = operation(*service);
+    if (status != STATUS_NO_ERROR && failure != nullptr) {
+        ALOGE("%s", failure);
+    }
+    return status;
+}
+
+}  // namespace
+
+int TouchCompanionClient::sendEvent(eventType type, eventParam param) {
+    return forward(mService, "sendEvent failed", [&](ITouchCompanionService& service) {
+        return service.sendEvent(static_cast<int>(type), static_cast<int>(param));
+    });
+}
+
+int TouchCompanionClient::reloadConfig(const std::string* path) {
+    return forward(mService, "reloadConfig failed",
+                   [&](ITouchCompanionService& service) { return service.reloadConfig(path); });
+}
+
+int TouchCompanionClient::saveConfig(const std::string* path) {
+    return forward(mService, "saveConfig failed",
+                   [&](ITouchCompanionService& service) { return service.saveConfig(path); });
+}
+
+int TouchCompanionClient::setConfigParams(const void* data, size_t size) {
+    return forward(
+            mService, "setConfigParams (binary) failed",
+            [&](ITouchCompanionService& service) { return service.setConfigParams(data, size); });
+}
+
+int TouchCompanionClient::getConfigParams(void* buffer, size_t* len) {
+    if (mService == nullptr) {
+        return STATUS_INVALID_STATE;
+    }
+    if (len == nullptr) {
+        ALOGE("Error: len cannot be null!");
+        return STATUS_NULL_POINTER;
+    }
+    const size_t length = mService->getConfigParams(buffer, *len);
+    if (length == 0) {
+        ALOGE("getConfigParams (binary) failed");
+        return STATUS_UNKNOWN_ERROR;
+    }
+    if (*len != 0 && length > *len) {
+        ALOGE("something went wrong! returned len should not be larger than expected len.");
+        return STATUS_UNKNOWN_ERROR;
+    }
+    *len = length;
+    return STATUS_NO_ERROR;
+}
+
+int TouchCompanionClient::getConfigParams(SerializableMap& params) {
+    // Nothing is asked for, so nothing can fail: not even the lack of a service.
+    if (params.size() == 0) {
+        ALOGD("params map is empty...no config values were retrieved");
+        return STATUS_NO_ERROR;
+    }
+    return forward(mService, nullptr, [&](ITouchCompanionService& service) {
+        return service.getConfigParams(params);
+    });
+}
+
+int TouchCompanionClient::getPacketSize() {
+    return forward(mService, nullptr,
+                   [](ITouchCompanionService& service) { return service.getPacketSize(); });
+}
+
+int TouchCompanionClient::inspect(unsigned int* value) {
+    return forward(mService, nullptr,
+                   [&](ITouchCompanionService& service) { return service.inspect(value); });
+}
+
+int TouchCompanionClient::saveSession(int& sessionID) {
+    return forward(mService, nullptr, [&](ITouchCompanionService& service) {
+        ALOGD("saveSession E %d", sessionID);
+        int status = service.saveSession(sessionID);
+        ALOGD("saveSession X= %d", status);
+        return status;
+    });
+}
+
+int TouchCompanionClient::restoreSession(int sessionID) {
+    return forward(mService, nullptr, [&](ITouchCompanionService& service) {
+        ALOGD("restoreSession E %d", sessionID);
+        int status = service.restoreSession(sessionID);
+        ALOGD("restoreSession X= %d", status);
+        return status;
+    });
+}
+
+int TouchCompanionClient::setAuth(const char* auth) {
+    return forward(mService, "setAuth failed", [&](ITouchCompanionService& service) {
+        return service.setAuth(std::string(auth));
+    });
+}
+
+}  // namespace pemaro
