@@ -192,13 +192,13 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     ~TouchCompanionClient() override;
 
   private:
-    int mapBlock();
-    void startThread();
-    void endThread();
-    int waitForFrames(uint32_t& write, uint32_t& available);
-    uint32_t frameLength(const void* frame) const;
-    void countFrame();
-    int readCommandResponse(SerializableMap& response, char** result);
+    ZELK_LOCAL int mapBlock();
+    ZELK_LOCAL void startThread();
+    ZELK_LOCAL void endThread();
+    ZELK_LOCAL int waitForFrames(uint32_t& write, uint32_t& available);
+    ZELK_LOCAL uint32_t frameLength(const void* frame) const;
+    ZELK_LOCAL void countFrame();
+    ZELK_LOCAL int readCommandResponse(SerializableMap& response, char** result);
 
     bool mInitialized = false;
     android::sp<TouchCompanionThread> mThread;
