@@ -363,16 +363,6 @@ status_t replyFilled(Service& service, const Parcel&, Parcel& reply) {
     return NO_ERROR;
 }
 
-template <int (Service::*kOperation)()>
-status_t replyPlain(Service& service, const Parcel&, Parcel& reply) {
-    return replyStatus(reply, (service.*kOperation)());
-}
-
-template <int (Service::*kOperation)(int)>
-status_t replyInt(Service& service, const Parcel& data, Parcel& reply) {
-    return replyStatus(reply, (service.*kOperation)(data.readInt32()));
-}
-
 template <int (Service::*kOperation)(const std::string&)>
 status_t replyText(Service& service, const Parcel& data, Parcel& reply) {
     return replyStatus(reply, (service.*kOperation)(readText(data)));

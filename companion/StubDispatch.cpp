@@ -5,8 +5,10 @@
 
 namespace pemaro {
 
-void logAccepted(const char* tag, const char* text) {
-    __android_log_print(ANDROID_LOG_DEBUG, tag, "%s", text);
+void logTransaction(const char* tag, const char* text) {
+    if (text != nullptr) {
+        __android_log_print(ANDROID_LOG_DEBUG, tag, "%s", text);
+    }
 }
 
 }  // namespace pemaro

@@ -10,8 +10,7 @@ namespace pemaro {
 
 // What every stub of the library does with every transaction, told once: test the interface token
 // before anything else, so that even a code the stub does not know must carry it; hand a code
-// outside the interface's table to BBinder; else log the row's text, if it has one, and run its
-// handler.
+// outside the interface's table to BBinder; else run the row's handler between the row's two texts.
 
 /// One transaction of an interface; row n of a table serves the code n + 1.
 template <typename Service>
@@ -22,9 +21,12 @@ struct StubRow {
     /// result.
     android::status_t (*handle)(Service& service, const android::Parcel& data,
                                 android::Parcel& reply);
+    /// Logged at debug priority when the reply is written; null for nothing.
+    const char* finished = nullptr;
 };
 
-void logAccepted(const char* tag, const char* text);
+/// At debug priority; nothing for a null text.
+void logTransaction(const char* tag, const char* text);
 
 /// `fallback` is the call of BBinder::onTransact, which only the stub itself may make.
 template <typename Service, size_t N, typename Fallback>
@@ -39,17 +41,29 @@ android::status_t dispatch(const char* tag, const StubRow<Service> (&rows)[N],
         return fallback();
     }
     const StubRow<Service>& row = rows[code - android::IBinder::FIRST_CALL_TRANSACTION];
-    if (row.log != nullptr) {
-        logAccepted(tag, row.log);
-    }
+    logTransaction(tag, row.log);
     android::Parcel unwanted;  // a local caller may pass no reply parcel
-    return row.handle(service, data, reply != nullptr ? *reply : unwanted);
+    android::status_t result = row.handle(service, data, reply != nullptr ? *reply : unwanted);
+    logTransaction(tag, row.finished);
+    return result;
 }
 
 /// The common end of a handler: the operation's status goes into the reply.
 inline android::status_t replyStatus(android::Parcel& reply, int status) {
     reply.writeInt32(status);
     return android::NO_ERROR;
+}
+
+/// The handler of an operation without arguments.
+template <auto kOperation, typename Service>
+android::status_t replyPlain(Service& service, const android::Parcel&, android::Parcel& reply) {
+    return replyStatus(reply, (service.*kOperation)());
+}
+
+/// The handler of an operation on one number.
+template <auto kOperation, typename Service>
+android::status_t replyInt(Service& service, const android::Parcel& data, android::Parcel& reply) {
+    return replyStatus(reply, (service.*kOperation)(data.readInt32()));
 }
 
 }  // namespace pemaro
