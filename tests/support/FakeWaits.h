@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <pthread.h>
+#include <time.h>
+#include <unistd.h>
+
+#include <functional>
+#include <mutex>
+#include <vector>
+
+#include "companion/Waiting.h"
+
+namespace pemaro::test {
+
+/// While one lives the library's waits return at once: a wait on a condition as if its time were
+/// over, a sleep as if it had been slept. What they were asked for is kept. Only one may live at a
+/// time.
+class FakeWaits {
+  public:
+    FakeWaits();
+    ~FakeWaits();
+    FakeWaits(const FakeWaits&) = delete;
+    FakeWaits& operator=(const FakeWaits&) = delete;
+
+    /// Called in place of each wait on a condition with its number, counted from 1.
+    void onWait(std::function<void(int number)> hook);
+
+    /// Called in place of each sleep with its number, counted from 1.
+    void onSleep(std::function<void(int number)> hook);
+
+    std::vector<timespec> deadlines() const;
+    std::vector<useconds_t> sleeps() const;
+
+  private:
+    static int condTimedWait(pthread_cond_t* cond, pthread_mutex_t* mutex,
+                             const timespec* deadline);
+    static int sleepMicros(useconds_t micros);
+
+    const WaitHooks mReal;
+    mutable std::mutex mLock;
+    std::function<void(int number)> mWaitHook;
+    std::function<void(int number)> mSleepHook;
+    std::vector<timespec> mDeadlines;
+    std::vector<useconds_t> mSleeps;
+};
+
+}  // namespace pemaro::test
