@@ -6,7 +6,6 @@
 #include <binder/ProcessState.h>
 #include <fmt/core.h>
 #include <signal.h>
-#include <stdlib.h>
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
@@ -14,18 +13,19 @@
 #include <string>
 #include <vector>
 
-#include "simulator/BinderDriver.h"
 #include "simulator/TouchCompanionSimulator.h"
+#include "tools/common/BinderDriver.h"
+#include "tools/common/CommandLine.h"
 
 using pemaro::simulator::Fault;
 using pemaro::simulator::SimulatorOptions;
 using pemaro::simulator::TouchCompanionSimulator;
+using pemaro::tools::kExitFailure;
+using pemaro::tools::kExitSuccess;
 
 namespace {
 
 constexpr const char* kServiceName = "pemaro.TouchService";
-constexpr int kExitFailure = 1;
-constexpr int kExitUsage = 2;
 
 struct CommandLine {
     SimulatorOptions options;
@@ -114,7 +114,7 @@ int serve(CommandLine& line) {
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
     signal(SIGPIPE, SIG_IGN);
 
-    const std::string problem = pemaro::simulator::binderProblem();
+    const std::string problem = pemaro::tools::binderProblem();
     if (!problem.empty()) {
         return fail(problem);
     }
@@ -141,29 +141,25 @@ int serve(CommandLine& line) {
     const TouchCompanionSimulator::Totals totals = service->totals();
     fmt::print("stopped: {} recordings, {} frames, {} without room in the ring\n",
                totals.recordings, totals.produced, totals.dropped);
-    return EXIT_SUCCESS;
+    return kExitSuccess;
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
     CLI::App app("A simulated touch stack that serves " + std::string(kServiceName) +
-                 " over Binder until SIGINT or SIGTERM.");
+                         " over Binder until SIGINT or SIGTERM.",
+                 "zelk-touchstack");
     CommandLine line;
     std::vector<std::string> faults;
     addOptions(app, line, faults);
-    try {
-        app.parse(argc, argv);
+    const auto done = pemaro::tools::parseCommandLine(app, argc, argv, [&] {
         readFaults(faults, line.faults);
         checkRing(line.options);
-    } catch (const CLI::ParseError& error) {
-        return app.exit(error) == 0 ? EXIT_SUCCESS : kExitUsage;
+    });
+    if (done) {
+        return *done;
     }
-    if (!line.showLog) {
-        setenv("ANDROID_LOG_TAGS", "*:s", 1);
-    }
-    const int status = serve(line);
-    fflush(stdout);
-    // Binder threads are still at work, and the destructors of globals are not for them to meet.
-    _exit(status);
+    pemaro::tools::showPlatformLog(line.showLog);
+    pemaro::tools::leave(serve(line));
 }

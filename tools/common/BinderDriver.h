@@ -3,7 +3,7 @@
 
 #include <string>
 
-namespace pemaro::simulator {
+namespace pemaro::tools {
 
 /**
  * Why this process cannot use Binder, in one sentence, or the empty string when it can: the driver
@@ -12,4 +12,4 @@ namespace pemaro::simulator {
  */
 std::string binderProblem();
 
-}  // namespace pemaro::simulator
+}  // namespace pemaro::tools

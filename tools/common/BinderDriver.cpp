@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "simulator/BinderDriver.h"
+#include "tools/common/BinderDriver.h"
 
 #include <binder/ProcessState.h>
 #include <fcntl.h>
@@ -8,7 +8,7 @@
 #include <cerrno>
 #include <cstring>
 
-namespace pemaro::simulator {
+namespace pemaro::tools {
 
 std::string binderProblem() {
     const int fd = open("/dev/binder", O_RDWR | O_CLOEXEC);
@@ -22,4 +22,4 @@ std::string binderProblem() {
     return "";
 }
 
-}  // namespace pemaro::simulator
+}  // namespace pemaro::tools

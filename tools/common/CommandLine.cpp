@@ -1,0 +1,37 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/common/CommandLine.h"
+
+#include <android/log.h>
+#include <unistd.h>
+
+#include <cstdio>
+
+namespace pemaro::tools {
+
+std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
+                                    const std::function<void()>& check) {
+    app.failure_message([](const CLI::App* failed, const CLI::Error& error) {
+        return failed->get_name() + ": " + error.what() + " (--help tells more)\n";
+    });
+    try {
+        app.parse(argc, argv);
+        if (check) {
+            check();
+        }
+    } catch (const CLI::ParseError& error) {
+        return app.exit(error) == 0 ? kExitSuccess : kExitUsage;
+    }
+    return std::nullopt;
+}
+
+void silencePlatformLog() {
+    setenv("ANDROID_LOG_TAGS", "*:s", 1);
+}
+
+void leave(int status) {
+    fflush(stdout);
+    fflush(stderr);
+    _exit(status);
+}
+
+}  // namespace pemaro::tools

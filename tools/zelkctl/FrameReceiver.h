@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <chrono>
+#include <condition_variable>
+#include <cstdint>
+#include <mutex>
+#include <string>
+
+#include "tools/zelkctl/FrameFile.h"
+
+namespace pemaro::zelkctl {
+
+/** What a recording brought so far. */
+struct FrameStats {
+    uint64_t frames = 0;
+    uint64_t bytes = 0;
+    uint64_t gaps = 0;       ///< places where sequence numbers are missing
+    uint64_t lost = 0;       ///< how many are missing there
+    uint64_t corrupt = 0;    ///< frames that were not believed, and are neither counted nor written
+    bool sequenced = false;  ///< whether the frames carry sequence numbers at all
+    std::string firstCorrupt;  ///< what was wrong with the first corrupt one
+};
+
+/** Takes the frames of a recording: checks, counts and writes them. */
+class FrameReceiver {
+  public:
+    /** `file` may be null; `limit` frames are taken, all if 0. */
+    FrameReceiver(FrameFile* file, uint64_t limit) : mFile(file), mLimit(limit) {}
+
+    /** To be told before the recording starts: no more than this is ever read of a frame. */
+    void setPacketSize(uint32_t bytes) { mPacketSize = bytes; }
+
+    /** The data callback of the client; `context` is the receiver. */
+    static void onFrame(int, void* frame, unsigned long length, void* context);
+
+    FrameStats stats() const;
+
+    /** Waits until the receiver takes no more frames, having enough of them or nowhere to write
+     * them; false when that did not happen in time. */
+    bool waitUntilDone(std::chrono::milliseconds patience);
+
+  private:
+    void take(const void* frame, size_t length);
+    std::string check(const void* frame, size_t length);
+    void follow(uint32_t sequence);
+
+    FrameFile* const mFile;
+    const uint64_t mLimit;
+    uint32_t mPacketSize = 0;
+
+    mutable std::mutex mLock;
+    std::condition_variable mChanged;
+    FrameStats mStats;
+    bool mDone = false;
+    uint32_t mNextSequence = 0;
+};
+
+}  // namespace pemaro::zelkctl

@@ -1,0 +1,26 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <string>
+
+namespace pemaro::zelkctl {
+
+/**
+ * A line on stdout that tells how far a command is: on a terminal redrawn in place, and otherwise a
+ * line of its own each time.
+ */
+class LiveLine {
+  public:
+    LiveLine();
+    /** Ends the line, so that what follows stands on the next. */
+    ~LiveLine();
+
+    bool isTerminal() const { return mTerminal; }
+    void show(const std::string& text);
+
+  private:
+    const bool mTerminal;
+    bool mShown = false;
+};
+
+}  // namespace pemaro::zelkctl

@@ -1,0 +1,26 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <fmt/core.h>
+
+#include <cstdio>
+#include <string>
+
+#include "pemaro/Status.h"
+#include "tools/common/CommandLine.h"
+
+namespace pemaro::zelkctl {
+
+/** Tells in one line on stderr what went wrong; the exit status of a failed command. */
+inline int fail(const std::string& problem) {
+    fflush(stdout);
+    fmt::print(stderr, "zelkctl: {}\n", problem);
+    return tools::kExitFailure;
+}
+
+/** The same for an operation that returned a status. */
+inline int failStatus(const std::string& operation, int status) {
+    return fail(operation + ": " + errStr(status));
+}
+
+}  // namespace pemaro::zelkctl

@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: Apache-2.0
+
+/// zelkctl: the touch companion client as a command line.
+
+#include <signal.h>
+
+#include "tools/common/CommandLine.h"
+#include "tools/zelkctl/Commands.h"
+
+int main(int argc, char** argv) {
+    CLI::App app("Talks to the touch service through libzelkclient.", "zelkctl");
+    app.require_subcommand(1);
+    bool showLog = false;
+    app.add_flag("--log", showLog, "Show the platform's log lines on stderr");
+
+    pemaro::zelkctl::Action action;
+    pemaro::zelkctl::addPingCommand(app, action);
+    pemaro::zelkctl::addRecordCommand(app, action);
+
+    if (const auto done = pemaro::tools::parseCommandLine(app, argc, argv)) {
+        return *done;
+    }
+    pemaro::tools::showPlatformLog(showLog);
+    // A reader of our output that went away is an error of writing, not the end of the recording.
+    signal(SIGPIPE, SIG_IGN);
+    pemaro::tools::leave(action());
+}
