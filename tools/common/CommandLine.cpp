@@ -24,8 +24,8 @@ std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
     return std::nullopt;
 }
 
-void silencePlatformLog() {
-    setenv("ANDROID_LOG_TAGS", "*:s", 1);
+void showPlatformLog(bool show) {
+    __android_log_set_minimum_priority(show ? ANDROID_LOG_VERBOSE : ANDROID_LOG_FATAL);
 }
 
 void leave(int status) {
