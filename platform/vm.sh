@@ -71,16 +71,17 @@ vm_kill() {
     done
 }
 
-# To be run in the background: a process that does not outlive this script, even when that is killed.
+# To be run in the background: a process that a terminal's Ctrl-C does not reach, and that does not outlive
+# this script even when that is killed.
 vm_helper() {
-    exec setpriv --pdeathsig KILL "$@"
+    exec setpriv --pdeathsig KILL setsid "$@"
 }
 
 # ---- waiting, and being told to stop -------------------------------------------------------------------
 
 vm_set_timer() {
     if [[ -n $VM_TIMER ]]; then
-        vm_kill "$VM_TIMER"
+        kill -KILL "$VM_TIMER" 2>/dev/null || true
         wait "$VM_TIMER" 2>/dev/null || true
         VM_TIMER=
     fi
@@ -120,7 +121,7 @@ vm_wait() {
             ;;
         *)
             vm_forget_reader "$ended"
-            vm_stop PIPE PIPE
+            [[ -n $VM_STOPPED ]] || vm_stop PIPE PIPE
             ;;
         esac
     done
@@ -184,8 +185,7 @@ vm_start_qemu() {
     mkfifo "$VM_SCRATCH/serial"
     exec {VM_SERIAL}<>"$VM_SCRATCH/serial"
     vm_qemu_arguments
-    # In a session of its own, a terminal's Ctrl-C does not reach it.
-    vm_helper setsid qemu-system-x86_64 "${VM_QEMU[@]}" \
+    vm_helper qemu-system-x86_64 "${VM_QEMU[@]}" \
         <"$VM_SCRATCH/serial" >"$VM_SCRATCH/console" 2>&1 &
     VM_CHILD=$!
     vm_watch_boot
@@ -243,8 +243,10 @@ vm_signal_qemu() {
 }
 
 vm_finish_qemu() {
-    local console=$ROOT/build/vm-console.log
-    wait "${VM_READERS[@]}" || true
+    local console=$ROOT/build/vm-console.log reader
+    for reader in "${VM_READERS[@]}"; do
+        wait "$reader" || true
+    done
     if [[ -s $VM_EXCHANGE/status || -n $VM_STOPPED ]]; then
         vm_exit "$(cat "$VM_EXCHANGE/status" 2>/dev/null)"
     fi
