@@ -1,0 +1,205 @@
+// SPDX-License-Identifier: Apache-2.0
+// The gesture manager's transactions, both sides: first the codes and the texts of each operation,
+// then the proxy, the meta-interface and the stub. docs/manager-protocol.md lists the parcels.
+
+#define LOG_TAG "IGestureManagerService"
+
+#include "pemaro/IGestureManagerService.h"
+
+#include "managers/ManagerCall.h"
+#include "pemaro/BnGestureManagerService.h"
+#include "pemaro/BpGestureManagerService.h"
+
+namespace pemaro {
+
+using android::IBinder;
+using android::Parcel;
+using android::sp;
+using android::status_t;
+using Gesture = IGestureManagerClient::GestureData;
+
+namespace {
+
+enum {
+    SUBSCRIBE = IBinder::FIRST_CALL_TRANSACTION,
+    UNSUBSCRIBE,
+    ENABLE_WAKEUP,
+    DISABLE_WAKEUP,
+    ENABLE,
+    DISABLE,
+    ADD_GESTURE,
+    DELETE_GESTURE,
+    ENABLE_GESTURE,
+    DISABLE_GESTURE,
+    VERIFY_GESTURE,
+    GET_MAX_PREDEFINED_GESTURE,
+    GET_MAX_USERDEFINED_GESTURE,
+};
+
+// Log readers know these texts so; they stay: unsubscribe's entry has a colon and a blank, the
+// wake-up operations fail as "enable()" and "disable()", the limits fail without parentheses, and
+// what the transactions call ENABLE, DISABLE and VERIFY_GESTURE the operations call otherwise.
+constexpr ProxyRow kSubscribe = managerRow(SUBSCRIBE, "Bp::subscribe", "subscribe() error: %s");
+constexpr ProxyRow kUnsubscribe =
+        managerRow(UNSUBSCRIBE, "Bp: unsubscribe", "unsubscribe() error: %s");
+constexpr ProxyRow kEnableWakeup =
+        managerRow(ENABLE_WAKEUP, "Bp::enableWakeup", "enable() error: %s");
+constexpr ProxyRow kDisableWakeup =
+        managerRow(DISABLE_WAKEUP, "Bp::disableWakeup", "disable() error: %s");
+constexpr ProxyRow kStartGestureDetection =
+        managerRow(ENABLE, "Bp::startGestureDetection", "startGestureDetection() error: %s");
+constexpr ProxyRow kStopGestureDetection =
+        managerRow(DISABLE, "Bp::stopGestureDetection", "stopGestureDetection() error: %s");
+constexpr ProxyRow kAddGesture =
+        managerRow(ADD_GESTURE, "Bp::addGesture", "addGesture() error: %s");
+constexpr ProxyRow kDeleteGesture =
+        managerRow(DELETE_GESTURE, "Bp::deleteGesture", "deleteGesture() error: %s");
+constexpr ProxyRow kEnableGesture =
+        managerRow(ENABLE_GESTURE, "Bp::enableGesture", "enableGesture() error: %s");
+constexpr ProxyRow kDisableGesture =
+        managerRow(DISABLE_GESTURE, "Bp::disableGesture", "disableGesture() error: %s");
+constexpr ProxyRow kImproveGestureTraining = managerRow(
+        VERIFY_GESTURE, "Bp::improveGestureTraining", "improveGestureTraining() error: %s");
+constexpr ProxyRow kGetMaxPreDefinedGesture =
+        managerRow(GET_MAX_PREDEFINED_GESTURE, "Bp::getMaxPreDefinedGesture enter",
+                   "getMaxPreDefinedGesture error: %s");
+constexpr ProxyRow kGetMaxUserDefinedGesture =
+        managerRow(GET_MAX_USERDEFINED_GESTURE, "Bp::getMaxUserDefinedGesture enter",
+                   "getMaxUserDefinedGesture error: %s");
+
+}  // namespace
+
+// ---- proxy ----
+
+namespace {
+
+struct Call : ManagerCall {
+    explicit Call(const ProxyRow& row)
+            : ManagerCall(LOG_TAG, row, IGestureManagerService::descriptor) {}
+};
+
+}  // namespace
+
+BpGestureManagerService::BpGestureManagerService(const sp<IBinder>& remote)
+        : BpInterface<IGestureManagerService>(remote) {}
+
+int BpGestureManagerService::subscribe(const sp<IGestureManagerClient>& client) {
+    Call call(kSubscribe);
+    call.writeClient(client);
+    return call.transactForStatus(remote());
+}
+
+int BpGestureManagerService::unsubscribe(const sp<IGestureManagerClient>& client) {
+    Call call(kUnsubscribe);
+    call.writeClient(client);
+    return call.transactForStatus(remote());
+}
+
+int BpGestureManagerService::enableWakeup() {
+    return Call(kEnableWakeup).transactForStatus(remote());
+}
+
+int BpGestureManagerService::disableWakeup() {
+    return Call(kDisableWakeup).transactForStatus(remote());
+}
+
+int BpGestureManagerService::startGestureDetection() {
+    return Call(kStartGestureDetection).transactForStatus(remote());
+}
+
+int BpGestureManagerService::stopGestureDetection() {
+    return Call(kStopGestureDetection).transactForStatus(remote());
+}
+
+int BpGestureManagerService::addGesture(int count, Gesture* samples, int& result) {
+    Call call(kAddGesture);
+    call.request.writeInt32(count);
+    call.writeRecords(samples, count);
+    return call.transactForValue(remote(), result);
+}
+
+int BpGestureManagerService::deleteGesture(int gesture) {
+    Call call(kDeleteGesture);
+    call.request.writeInt32(gesture);
+    return call.transactForStatus(remote());
+}
+
+int BpGestureManagerService::enableGesture(int gesture) {
+    Call call(kEnableGesture);
+    call.request.writeInt32(gesture);
+    return call.transactForStatus(remote());
+}
+
+int BpGestureManagerService::disableGesture(int gesture) {
+    Call call(kDisableGesture);
+    call.request.writeInt32(gesture);
+    return call.transactForStatus(remote());
+}
+
+int BpGestureManagerService::improveGestureTraining(Gesture* sample, int& result) {
+    Call call(kImproveGestureTraining);
+    call.writeRecords(sample, 1);
+    return call.transactForValue(remote(), result);
+}
+
+int BpGestureManagerService::getMaxPreDefinedGesture(unsigned int& count) {
+    return Call(kGetMaxPreDefinedGesture).transactForValue(remote(), count);
+}
+
+int BpGestureManagerService::getMaxUserDefinedGesture(unsigned int& count) {
+    return Call(kGetMaxUserDefinedGesture).transactForValue(remote(), count);
+}
+
+IMPLEMENT_META_INTERFACE(GestureManagerService, "pemaro.GestureManagerService")
+
+// ---- stub ----
+
+namespace {
+
+using Service = IGestureManagerService;
+
+status_t onAddGesture(Service& service, const Parcel& data, Parcel& reply) {
+    int count = data.readInt32();
+    Gesture* samples = readRecords<Gesture>(data, count);
+    return replyValue<int>(reply,
+                           [&](int& result) { return service.addGesture(count, samples, result); });
+}
+
+status_t onVerifyGesture(Service& service, const Parcel& data, Parcel& reply) {
+    Gesture* sample = readRecords<Gesture>(data, 1);
+    return replyValue<int>(
+            reply, [&](int& result) { return service.improveGestureTraining(sample, result); });
+}
+
+const StubRow<Service> kRows[] = {
+        {"SUBSCRIBE transact received...", replyClient<&Service::subscribe, IGestureManagerClient>},
+        {"UNSUBSCRIBE transact received...",
+         replyClient<&Service::unsubscribe, IGestureManagerClient>},
+        {"ENABLE_WAKEUP transact received...", replyPlain<&Service::enableWakeup>},
+        {"DISABLE_WAKEUP transact received...", replyPlain<&Service::disableWakeup>},
+        {"ENABLE transact received...", replyPlain<&Service::startGestureDetection>},
+        {"DISABLE transact received...", replyPlain<&Service::stopGestureDetection>},
+        {"ADD_GESTURE transact received...", onAddGesture},
+        {"DELETE_GESTURE transact received...", replyInt<&Service::deleteGesture>},
+        {"ENABLE_GESTURE transact received...", replyInt<&Service::enableGesture>},
+        {"DISABLE_GESTURE transact received...", replyInt<&Service::disableGesture>},
+        {"VERIFY_GESTURE transact received...", onVerifyGesture},
+        {"GET_MAX_PREDEFINED_GESTURE transact received...",
+         replyNumber<&Service::getMaxPreDefinedGesture, unsigned int>,
+         "GET_MAX_PREDEFINED_GESTURE transact finished..."},
+        {"GET_MAX_USERDEFINED_GESTURE transact received...",
+         replyNumber<&Service::getMaxUserDefinedGesture, unsigned int>,
+         "GET_MAX_USERDEFINED_GESTURE transact finished..."},
+};
+static_assert(sizeof(kRows) / sizeof(kRows[0]) == GET_MAX_USERDEFINED_GESTURE, "one row a code");
+
+}  // namespace
+
+status_t BnGestureManagerService::onTransact(uint32_t code, const Parcel& data, Parcel* reply,
+                                             uint32_t flags) {
+    Service& service = *this;
+    return dispatch(LOG_TAG, kRows, *this, service, code, data, reply,
+                    [&] { return BBinder::onTransact(code, data, reply, flags); });
+}
+
+}  // namespace pemaro

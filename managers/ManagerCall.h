@@ -1,0 +1,94 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "companion/ProxyCall.h"
+#include "companion/StubDispatch.h"
+#include "pemaro/Binder.h"
+#include "pemaro/Status.h"
+
+namespace pemaro {
+
+// What the three managers' interfaces share beyond ProxyCall and StubDispatch, both sides:
+//
+//   - The service's status is passed on without a log; a row has no text for it.
+//   - A reply carries values first and the status last, as int32 each.
+//   - A callback object crosses as a strong binder.
+//   - Records cross as raw bytes, without a length and without a copy on the receiving side. No
+//     record, which reads as null, is what null is sent as.
+
+// ---- proxies ----
+
+constexpr ProxyRow managerRow(uint32_t code, const char* entry, const char* transportError) {
+    return {code, entry, transportError, nullptr};
+}
+
+struct ManagerCall : ProxyCall {
+    using ProxyCall::ProxyCall;
+
+    template <typename Client>
+    void writeClient(const android::sp<Client>& client) {
+        request.writeStrongBinder(android::IInterface::asBinder(client));
+    }
+
+    /// A negative count is more bytes than any request holds: then nothing is written.
+    template <typename Record>
+    void writeRecords(const Record* records, int count) {
+        if (records != nullptr) {
+            request.write(records, static_cast<size_t>(count) * sizeof(Record));
+        }
+    }
+
+    /// For the operations that answer with a number and the status.
+    template <typename Value>
+    int transactForValue(android::IBinder* remote, Value& value) {
+        int status = transact(remote);
+        if (status != STATUS_NO_ERROR) {
+            return status;
+        }
+        value = static_cast<Value>(reply.readInt32());
+        return readStatus();
+    }
+};
+
+// ---- stubs ----
+
+/// The records of a request, in place; null when there are fewer than `count` or that is negative.
+template <typename Record>
+Record* readRecords(const android::Parcel& data, int count) {
+    const void* records = data.readInplace(static_cast<size_t>(count) * sizeof(Record));
+    return static_cast<Record*>(const_cast<void*>(records));
+}
+
+/// Calls an operation that stores a number through its last argument; `call` receives the place.
+/// The place is preset only so that an operation that forgets it is no undefined behaviour.
+template <typename Value, typename Call>
+android::status_t replyValue(android::Parcel& reply, Call&& call) {
+    Value value{};
+    int status = call(value);
+    reply.writeInt32(static_cast<int32_t>(value));
+    return replyStatus(reply, status);
+}
+
+/// The handler of subscribing and unsubscribing.
+template <auto kOperation, typename Client, typename Service>
+android::status_t replyClient(Service& service, const android::Parcel& data,
+                              android::Parcel& reply) {
+    return replyStatus(reply, (service.*kOperation)(Client::asInterface(data.readStrongBinder())));
+}
+
+/// The handler of an operation that tells a number.
+template <auto kOperation, typename Value, typename Service>
+android::status_t replyNumber(Service& service, const android::Parcel&, android::Parcel& reply) {
+    return replyValue<Value>(reply, [&](Value& value) { return (service.*kOperation)(value); });
+}
+
+/// The handler of a callback with one record.
+template <auto kOperation, typename Record, typename Client>
+android::status_t replyRecord(Client& client, const android::Parcel& data, android::Parcel& reply) {
+    return replyStatus(reply, (client.*kOperation)(readRecords<Record>(data, 1)));
+}
+
+}  // namespace pemaro
