@@ -1,0 +1,92 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include "pemaro/Binder.h"
+#include "pemaro/BnGestureManagerClient.h"
+#include "pemaro/Export.h"
+#include "pemaro/IGestureManagerService.h"
+
+namespace pemaro {
+
+/// A caller's handle on the gesture manager: wake-up gestures, gesture detection, the gestures that
+/// the user defines, and a notice when the service dies.
+///
+/// It is the callback object that it subscribes, and reference-counted: hold it in an `android::sp`
+/// before init() is called.
+///
+///     void onGesture(IGestureManagerClient::GestureData* data, void* context);
+///     void onDeath(void* context);
+///
+///     android::sp<GestureManagerClient> client =
+///             new GestureManagerClient(onGesture, onDeath, context);
+///     int status = client->init();
+///     if (status == 0) status = client->startGestureDetection();
+///     ...
+///     client->deinit();
+///
+/// The client does not reconnect by itself. After a death the caller calls deinit(), which lets go
+/// of the dead service, and init(), which waits for a new one.
+///
+/// Every operation is one synchronous Binder call on the caller's thread and returns a status of
+/// Status.h: 0, the service's own status unchanged, 0x40000000 when the transaction failed, or
+/// 0x4000000B when the client holds no service (before init(), after deinit()). Failures are
+/// logged. The client takes no lock: deinit() and destruction must not coincide with a callback
+/// on another thread. Log tag: "GestureManagerClient".
+class ZELK_API GestureManagerClient : public BnGestureManagerClient,
+                                      public android::IBinder::DeathRecipient {
+  public:
+    /// Receives a gesture on a Binder thread: (record, context). The record is valid until the
+    /// callback returns; it is null when the service sent none.
+    using GestureCallback = void (*)(IGestureManagerClient::GestureData*, void*);
+
+    /// Told on a Binder thread that the service died: (context).
+    using DeathCallback = void (*)(void*);
+
+    /// Without a callback its events are dropped; with a null context each event makes the client
+    /// unsubscribe. `ctx` stays the caller's and is passed back unchanged.
+    GestureManagerClient(GestureCallback gestureCb, DeathCallback deathCb, void* ctx);
+    /// A client without callbacks and context, whose events are dropped.
+    GestureManagerClient();
+
+    /// Looks the service up, in ten attempts with half a second of sleep after each that failed,
+    /// subscribes and watches for the service's death. 0x4000000A: no service manager or no such
+    /// service; 0x4000000D: the binder found is no gesture manager; 0x40000000: the service cannot
+    /// be watched; else what subscribing returned. A further call looks up and subscribes again.
+    int init();
+
+    /// Unsubscribes and ends the watch, if init() had succeeded, and lets go of the service. Always
+    /// 0.
+    int deinit();
+
+    /// See IGestureManagerService for these; verifyGesture() is its improveGestureTraining().
+    int enableWakeup();
+    int disableWakeup();
+    int startGestureDetection();
+    int stopGestureDetection();
+    int addGesture(int count, IGestureManagerClient::GestureData* samples, int& result);
+    int deleteGesture(int gesture);
+    int enableGesture(int gesture);
+    int disableGesture(int gesture);
+    int verifyGesture(IGestureManagerClient::GestureData* sample, int& result);
+    int getMaxPreDefinedGesture(unsigned int& count);
+    int getMaxUserDefinedGesture(unsigned int& count);
+
+    /// Called for the service on a Binder thread; hands the record to the callback. Always 0.
+    int gestureCallback(IGestureManagerClient::GestureData* data) override;
+
+    /// Called by Binder on one of its threads when the service's process died.
+    void binderDied(const android::wp<android::IBinder>& who) override;
+
+  protected:
+    /// Neither unsubscribes nor ends the watch: the service keeps a client alive until deinit().
+    ~GestureManagerClient() override;
+
+  private:
+    bool mInitialized = false;
+    android::sp<IGestureManagerService> mService;
+    GestureCallback mGestureCallback;
+    DeathCallback mDeathCallback;
+    void* mContext;
+};
+
+}  // namespace pemaro

@@ -1,0 +1,167 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <log/log.h>
+
+#include <utility>
+
+#include "pemaro/Binder.h"
+#include "pemaro/Status.h"
+
+namespace pemaro {
+
+// How the manager clients reach their services. A client is the callback object that it subscribes
+// and keeps two members for its connection, a flag and the service:
+//
+//   idle        flag off, no service     constructed, deinit(), or a failed init()
+//   subscribed  flag on, service held    a successful init()
+//   orphaned    flag on, service dead    the service's process died; deinit() leads back to idle
+//
+// (A touch manager client keeps the service when subscribing failed, and is not told of a death.)
+// Nothing is locked: see the clients' headers for what must not coincide.
+
+/// The service called `name`, asked for once; null, with the reason logged, when there is none.
+android::sp<android::IBinder> findService(const char* tag, const char* name);
+
+/// The same in ten attempts, with half a second of sleep after each that failed.
+android::sp<android::IBinder> awaitService(const char* tag, const char* name);
+
+void logManagerDebug(const char* tag, const char* text);
+void logManagerError(const char* tag, const char* text);
+
+/// What distinguishes the connection of one client class from that of another. The texts of a
+/// client that does not watch its service are null where they are about that.
+struct ManagerTexts {
+    const char* tag;
+    const char* serviceName;
+    const char* connected;
+    const char* linkFailed;
+};
+
+/// What a client's members and texts make possible; made for the duration of a call.
+template <typename Service, typename Client>
+class ManagerConnection {
+  public:
+    using DeathRecipient = android::IBinder::DeathRecipient;
+
+    /// Refers to all of its arguments.
+    ManagerConnection(const ManagerTexts& texts, bool& initialized, android::sp<Service>& service,
+                      Client* self)
+            : mTexts(texts), mInitialized(initialized), mService(service), mSelf(self) {}
+
+    /// init() of the clients that watch their service: look up, subscribe, link to its death. What
+    /// had been done is undone when a step fails.
+    int initWatched(DeathRecipient* watcher) {
+        logManagerDebug(mTexts.tag, "init: E");
+        android::sp<android::IBinder> binder = awaitService(mTexts.tag, mTexts.serviceName);
+        if (binder == nullptr) {
+            return STATUS_ERROR_ACQUIRING_RESOURCE;
+        }
+        int status = hold(binder);
+        if (status != STATUS_NO_ERROR) {
+            return status;
+        }
+        status = mService->subscribe(mSelf);
+        if (status != STATUS_NO_ERROR) {
+            mService.clear();
+            return refused(status);
+        }
+        if (binder->linkToDeath(watcher, nullptr, 0) != android::NO_ERROR) {
+            logManagerError(mTexts.tag, mTexts.linkFailed);
+            unsubscribe();
+            mService.clear();
+            return STATUS_UNKNOWN_ERROR;
+        }
+        return connected();
+    }
+
+    // ---- the steps of init() ----
+
+    /// Keeps the service behind `binder`, in place of any that was held.
+    int hold(const android::sp<android::IBinder>& binder) {
+        mService = Service::asInterface(binder);
+        if (mService == nullptr) {
+            logManagerError(mTexts.tag, "wrong service interface?");
+            return STATUS_BAD_PARAMETER;
+        }
+        return STATUS_NO_ERROR;
+    }
+
+    int refused(int status) {
+        logManagerError(mTexts.tag, "subscribing to service failed");
+        return status;
+    }
+
+    /// Success is logged as an error so that it shows in every log.
+    int connected() {
+        mInitialized = true;
+        logManagerError(mTexts.tag, mTexts.connected);
+        return STATUS_NO_ERROR;
+    }
+
+    // ---- the rest of a client's life ----
+
+    /// `watcher` is the one of initWatched(), null where there is none.
+    int deinit(DeathRecipient* watcher) {
+        logManagerDebug(mTexts.tag, "deinit: E");
+        if (mInitialized && mService != nullptr) {
+            unsubscribe();
+            android::sp<android::IBinder> binder = android::IInterface::asBinder(mService);
+            if (binder != nullptr && watcher != nullptr) {
+                binder->unlinkToDeath(watcher, nullptr, 0, nullptr);
+            }
+            mService.clear();
+            mInitialized = false;
+        }
+        logManagerDebug(mTexts.tag, "deinit: X");
+        return STATUS_NO_ERROR;
+    }
+
+    /// Whether an event can be handed to the caller's function. Without a function it is dropped;
+    /// a null context means that the caller is gone, and the client unsubscribes.
+    template <typename Callback>
+    bool accepts(Callback* callback, void* context, const char* callbackMissing) {
+        if (callback == nullptr) {
+            logManagerError(mTexts.tag, callbackMissing);
+            return false;
+        }
+        if (context == nullptr) {
+            logManagerError(mTexts.tag, "JNI context is null...unsubscribing client");
+            unsubscribe();
+            return false;
+        }
+        return true;
+    }
+
+  private:
+    void unsubscribe() {
+        android::sp<Service> service = mService;
+        if (service != nullptr) {
+            service->unsubscribe(mSelf);
+        }
+    }
+
+    const ManagerTexts& mTexts;
+    bool& mInitialized;
+    android::sp<Service>& mService;
+    Client* const mSelf;
+};
+
+/// Calls an operation of the service and passes its status on; a failure is logged with `failure`,
+/// a format for its message. 0x4000000B when no service is held.
+template <typename Service, typename... Parameters, typename... Arguments>
+int callService(const char* tag, const char* failure, const android::sp<Service>& service,
+                int (Service::*operation)(Parameters...), Arguments&&... arguments) {
+    int status = STATUS_INVALID_STATE;
+    // Kept for the call, during which a callback on this thread may let go of the service.
+    android::sp<Service> held = service;
+    if (held != nullptr) {
+        status = (held.get()->*operation)(std::forward<Arguments>(arguments)...);
+    }
+    if (status != STATUS_NO_ERROR) {
+        __android_log_print(ANDROID_LOG_ERROR, tag, failure, errStr(status));
+    }
+    return status;
+}
+
+}  // namespace pemaro
