@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "pemaro/Binder.h"
+
 #include <binder/IServiceManager.h>
 
 #include <functional>

@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <binder/IMemory.h>
-
 #include <cstddef>
 #include <cstdint>
 #include <memory>
 
+#include "pemaro/Binder.h"
 #include "pemaro/TouchCompanionSharedCblk.h"
 
 namespace pemaro::test {

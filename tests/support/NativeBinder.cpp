@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tests/support/NativeBinder.h"
 
+#include "pemaro/Binder.h"
+
 #include <binder/ProcessState.h>
 #include <gtest/gtest.h>
 #include <linux/android/binder.h>

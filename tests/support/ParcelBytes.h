@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <binder/IBinder.h>
-#include <binder/Parcel.h>
-
 #include <cstdint>
 #include <functional>
 #include <string>
 #include <vector>
+
+#include "pemaro/Binder.h"
 
 namespace pemaro::test {
 

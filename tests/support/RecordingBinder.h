@@ -1,15 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <binder/Binder.h>
-#include <binder/Parcel.h>
-
 #include <cstdint>
 #include <functional>
 #include <mutex>
 #include <string>
 #include <vector>
 
+#include "pemaro/Binder.h"
 #include "tests/support/ParcelBytes.h"
 
 namespace pemaro::test {

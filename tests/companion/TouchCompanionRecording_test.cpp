@@ -1,0 +1,542 @@
+// SPDX-License-Identifier: Apache-2.0
+// Recording: the choice of the output, starting and stopping, and the delivery of frames.
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <cstdio>
+#include <cstring>
+#include <string>
+
+#include "tests/companion/TouchCompanionClientTest.h"
+#include "tests/support/FakeClock.h"
+
+namespace pemaro::test {
+namespace {
+
+using android::sp;
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::Not;
+
+constexpr uint32_t kFrameSize = 64;
+constexpr uint32_t kBufferFrames = 8;
+constexpr nsecs_t kSecond = 1000000000;
+
+class TouchCompanionRecording : public TouchCompanionClientTest {
+  protected:
+    FrameRing mRing{kBufferFrames, kFrameSize};
+    FakeWaits mWaits;
+    Frames mFrames;
+};
+
+// ---- the output ----
+
+TEST_F(TouchCompanionRecording, TellsTheServiceTheOutput) {
+    const sp<TouchCompanionClient> client = connect();
+    EXPECT_EQ(0, client->setRecordOutput(0));
+    EXPECT_EQ(0, client->setRecordOutput(1));
+    EXPECT_EQ(0, client->setRecordOutput(-7));
+    EXPECT_THAT(mService->calls(), ElementsAre("setRecordParameter(0)", "setRecordParameter(1)",
+                                               "setRecordParameter(-7)"));
+    EXPECT_THAT(clientLines(), IsEmpty());
+}
+
+TEST_F(TouchCompanionRecording, KeepsAnOutputThatTheServiceRefuses) {
+    const sp<TouchCompanionClient> client = connect();
+    mService->setStatus("setRecordParameter", STATUS_BAD_PARAMETER);
+    EXPECT_EQ(STATUS_BAD_PARAMETER, client->setRecordOutput(0));
+    EXPECT_THAT(clientLines(), ElementsAre("E output parameter(0) is wrong"));
+    EXPECT_EQ(0, client->setRecordFile("/f")) << "the output is stored before the service is asked";
+}
+
+TEST_F(TouchCompanionRecording, NamesTheFileOfTheFileOutput) {
+    const sp<TouchCompanionClient> client = connect();
+    EXPECT_EQ(0, client->setRecordOutput(0));
+    EXPECT_EQ(0, client->setRecordFile("/data/frames.bin"));
+    EXPECT_THAT(mService->calls(),
+                ElementsAre("setRecordParameter(0)", "setRecordFile(/data/frames.bin)"));
+    EXPECT_THAT(clientLines(), IsEmpty());
+}
+
+TEST_F(TouchCompanionRecording, RefusesAFileForAnyOtherOutput) {
+    const sp<TouchCompanionClient> client = connect();
+    EXPECT_EQ(STATUS_BAD_PARAMETER, client->setRecordFile("/f")) << "no output was chosen";
+    client->setRecordOutput(1);
+    EXPECT_EQ(STATUS_BAD_PARAMETER, client->setRecordFile("/f"));
+    EXPECT_THAT(mService->calls(), ElementsAre("setRecordParameter(1)"));
+    const std::string line = "E setRecordFile can be called only with OUTPUT_FILE option";
+    EXPECT_THAT(clientLines(), ElementsAre(line, line));
+}
+
+TEST_F(TouchCompanionRecording, PassesARefusedFileOn) {
+    const sp<TouchCompanionClient> client = connect();
+    client->setRecordOutput(0);
+    mService->setStatus("setRecordFile", STATUS_INVALID_FILE_PATH);
+    EXPECT_EQ(STATUS_INVALID_FILE_PATH, client->setRecordFile("/f"));
+    EXPECT_THAT(clientLines(), ElementsAre("E setDumpFile failed"));
+}
+
+TEST_F(TouchCompanionRecording, ReadsNothing) {
+    const sp<TouchCompanionClient> client = connect();
+    char buffer[4] = "abc";
+    EXPECT_EQ(0, client->read(buffer, sizeof(buffer)));
+    EXPECT_STREQ("abc", buffer);
+    EXPECT_THAT(mService->calls(), IsEmpty());
+}
+
+// ---- starting ----
+
+TEST_F(TouchCompanionRecording, DoesNotStartBeforeAnOutputIsChosen) {
+    const sp<TouchCompanionClient> client = connect();
+    EXPECT_EQ(STATUS_BAD_PARAMETER, client->startRecord());
+    EXPECT_THAT(mService->calls(), IsEmpty());
+    EXPECT_THAT(clientLines(), ElementsAre("E recording parameter is wrong(-1)"));
+}
+
+TEST_F(TouchCompanionRecording, StartsToAFileWithoutBlockOrThread) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(0);
+    mService->clearCalls();
+    EXPECT_EQ(0, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "startRecord"));
+    EXPECT_THAT(clientLines(), IsEmpty());
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "startRecord", "stopRecord"));
+}
+
+TEST_F(TouchCompanionRecording, MapsTheBlockForSharedMemory) {
+    const sp<TouchCompanionClient> client = connect();
+    mService->cblk = mRing.memory();
+    mRing.cblk().data = nullptr;
+    client->setRecordOutput(1);
+    forget();
+    EXPECT_EQ(0, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk", "startRecord"));
+    EXPECT_EQ(mRing.memory()->bytes() + 136, mRing.cblk().data);
+    EXPECT_THAT(clientLines(), IsEmpty()) << "no callback, no thread";
+}
+
+TEST_F(TouchCompanionRecording, DeliversNothingWithoutACallback) {
+    const sp<TouchCompanionClient> client = record(mRing);
+    mRing.put();
+    usleep(20000);
+    EXPECT_EQ(0u, mRing.cblk().read);
+}
+
+TEST_F(TouchCompanionRecording, DeliversBeforeTheServiceIsToldToStart) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    mService->cblk = mRing.memory();
+    client->setRecordOutput(1);
+    forget();
+    mService->onCall([&](const std::string& call) {
+        if (call == "startRecord") {
+            mRing.put();
+            EXPECT_TRUE(mFrames.waitFor(1));
+        }
+    });
+    EXPECT_EQ(0, client->startRecord());
+    EXPECT_THAT(clientLines(), Contains("D Init: callback is set, create DebugThread"));
+    EXPECT_EQ(0, client->stopRecord());
+}
+
+TEST_F(TouchCompanionRecording, PassesARefusedPreparationOn) {
+    const sp<TouchCompanionClient> client = connect();
+    client->setRecordOutput(1);
+    forget();
+    mService->setStatus("prepareRecord", STATUS_INVALID_STATE);
+    EXPECT_EQ(STATUS_INVALID_STATE, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord"));
+    EXPECT_THAT(clientLines(), ElementsAre("E fail to prepare recording"));
+}
+
+TEST_F(TouchCompanionRecording, FailsWithoutABlock) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(1);
+    forget();
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk"));
+    EXPECT_THAT(clientLines(), ElementsAre("E couldn't get shared control block"));
+}
+
+TEST_F(TouchCompanionRecording, FailsWhenTheBlockCannotBeMapped) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(1);
+    forget();
+    mService->cblk = LocalMemory::unmapped();
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk"));
+    EXPECT_THAT(clientLines(), IsEmpty());
+}
+
+TEST_F(TouchCompanionRecording, FailsWhenTheMemoryIsTooSmallForABlock) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(1);
+    forget();
+    for (size_t size : {0, 1, 104, 135}) {
+        mService->cblk = new LocalMemory(size);
+        EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord()) << size;
+    }
+    EXPECT_THAT(clientLines(), IsEmpty());
+    EXPECT_THAT(mService->calls(), Not(Contains("startRecord")));
+}
+
+// What was set up before the failure stays: the thread runs until the recording is stopped.
+TEST_F(TouchCompanionRecording, PassesARefusedStartOnAndGoesOnDelivering) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    mService->cblk = mRing.memory();
+    client->setRecordOutput(1);
+    mService->setStatus("startRecord", STATUS_INVALID_STATE);
+    EXPECT_EQ(STATUS_INVALID_STATE, client->startRecord());
+    EXPECT_THAT(clientLines(), Contains("E startRecord failed"));
+    mRing.put();
+    EXPECT_TRUE(mFrames.waitFor(1));
+    EXPECT_EQ(0, client->stopRecord());
+}
+
+TEST_F(TouchCompanionRecording, StartsAgainAfterAStop) {
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    for (size_t round = 1; round <= 20; ++round) {
+        mRing.put();
+        EXPECT_TRUE(mFrames.waitFor(round));
+        EXPECT_EQ(0, client->stopRecord());
+        EXPECT_EQ(0, client->startRecord());
+    }
+    EXPECT_EQ(20u, mFrames.count());
+}
+
+// ---- stopping ----
+
+TEST_F(TouchCompanionRecording, StopsAndLetsTheBlockGo) {
+    const sp<TouchCompanionClient> client = record(mRing);
+    const int32_t references = mRing.memory()->getStrongCount();
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("stopRecord"));
+    EXPECT_EQ(references - 1, mRing.memory()->getStrongCount());
+    EXPECT_THAT(clientLines(),
+                ElementsAre("D stopRecord: E", "D stopRecord: call stopRecord on remote side",
+                            "D stopRecord: clear shared memory"));
+    TouchCompanionClient::FrameBuffer buffer = {};
+    EXPECT_EQ(STATUS_INVALID_STATE, client->acquireBuffer(&buffer));
+}
+
+TEST_F(TouchCompanionRecording, KeepsTheBlockWhenTheServiceRefusesToStop) {
+    const sp<TouchCompanionClient> client = record(mRing);
+    mRing.put();
+    const int32_t references = mRing.memory()->getStrongCount();
+    mService->setStatus("stopRecord", STATUS_INVALID_STATE);
+    EXPECT_EQ(STATUS_INVALID_STATE, client->stopRecord());
+    EXPECT_EQ(references, mRing.memory()->getStrongCount());
+    EXPECT_EQ("E stopRecord failed", clientLines().back());
+    TouchCompanionClient::FrameBuffer buffer = {nullptr, kFrameSize, 0};
+    EXPECT_EQ(0, client->acquireBuffer(&buffer));
+    EXPECT_EQ(1u, buffer.frameCount);
+}
+
+TEST_F(TouchCompanionRecording, StopsWhatNeverStarted) {
+    const sp<TouchCompanionClient> client = connect();
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("stopRecord"));
+}
+
+TEST_F(TouchCompanionRecording, EndsTheThreadBeforeTheServiceIsToldToStop) {
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    mRing.put();
+    EXPECT_TRUE(mFrames.waitFor(1));
+    mService->onCall([&](const std::string& call) {
+        if (call == "stopRecord") {
+            mRing.put();
+            usleep(20000);
+            EXPECT_EQ(1u, mFrames.count()) << "the thread has ended";
+        }
+    });
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_EQ(1u, mFrames.count());
+}
+
+// ---- one pass of delivery ----
+
+// Passes are called by the test: a recording without a thread, and a callback all the same, is what a thread
+// that has ended by a refused stop leaves behind.
+class TouchCompanionDelivery : public TouchCompanionRecording {
+  protected:
+    void SetUp() override {
+        TouchCompanionRecording::SetUp();
+        mRing.setStart(6);
+        mClient = recordWithoutThread(mRing);
+    }
+
+    sp<TouchCompanionClient> recordWithoutThread(const FrameRing& ring) {
+        sp<TouchCompanionClient> client = record(ring, Frames::callback, &mFrames);
+        mService->setStatus("stopRecord", STATUS_INVALID_STATE);
+        client->stopRecord();
+        forget();
+        return client;
+    }
+
+    static std::string linesPointer(const void* data) {
+        char text[32];
+        snprintf(text, sizeof(text), "%p", data);
+        return text;
+    }
+
+    sp<TouchCompanionClient> mClient;
+};
+
+TEST_F(TouchCompanionDelivery, HandsOneFrameToTheCallbackAndReleasesIt) {
+    mRing.put();
+    mRing.put();
+    // The length is the frame's own, whatever the size of the run.
+    const uint32_t length = 1234567;
+    memcpy(mRing.slot(6) + 8, &length, sizeof(length));
+    mClient->processData();
+
+    ASSERT_EQ(1u, mFrames.count());
+    EXPECT_EQ(0, mFrames[0].zero);
+    EXPECT_EQ(mRing.slot(6), mFrames[0].data);
+    EXPECT_EQ(length, mFrames[0].length);
+    EXPECT_EQ(7u, mRing.cblk().read);
+    EXPECT_THAT(
+            clientLines(),
+            ElementsAre("D processData: acquire buffer",
+                        "D acquireBuffer: write = 8, read = 6, reqSize = 1, availaSize = 2",
+                        "D acquireBuffer: write = 8, read = 6, reqSize = 1, availSize = 2",
+                        "D acquireBuffer: read = 6, bufferEnd = 8",
+                        "D acquireBuffer: new reqSize = 1",
+                        "D acquireBuffer: data = " + linesPointer(mRing.slot(6)) +
+                                ", size = 64, frameCount = 1",
+                        "D processData: buffer is acquired(buffer size = 64, packet size = 1234567",
+                        "D releaseBuffer: read = 7, readWrap = 0", "D processData: finished"));
+}
+
+TEST_F(TouchCompanionDelivery, EndsAPassWithoutFramesWithItsStatus) {
+    mClient->processData();
+    EXPECT_EQ(0u, mFrames.count());
+    EXPECT_EQ(63u, mWaits.deadlines().size());
+    const Lines lines = clientLines();
+    ASSERT_GE(lines.size(), 3u);
+    EXPECT_EQ("E acquireBuffer: totalWaitTime exceeds, TIME_OUT", lines[lines.size() - 3]);
+    EXPECT_EQ("E processData: buffer is not acquired(error = 1073741845)", lines[lines.size() - 2]);
+    EXPECT_EQ("D processData: finished", lines.back());
+}
+
+TEST_F(TouchCompanionDelivery, DoesNothingWithoutABlock) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->processData();
+    EXPECT_EQ(0u, mFrames.count());
+}
+
+// ---- bad blocks: the callback is called once a pass, and nothing outside the memory is read ----
+
+TEST_F(TouchCompanionDelivery, CallsBackWithoutAFrameWhenFramesHaveNoSize) {
+    mRing.put();
+    mRing.cblk().frameSize = 0;
+    mClient->processData();
+    ASSERT_EQ(1u, mFrames.count());
+    EXPECT_EQ(mRing.slot(0), mFrames[0].data) << "slots of no size are all the first";
+    EXPECT_EQ(6u, mRing.cblk().read) << "no frame, none released";
+    EXPECT_EQ("D processData: finished", clientLines().back());
+    EXPECT_THAT(clientLines(), Not(Contains(::testing::HasSubstr("releaseBuffer"))));
+}
+
+TEST_F(TouchCompanionDelivery, ReadsNoLengthOutsideTheMemory) {
+    struct Bad {
+        const char* name;
+        uint32_t bufferFrames;
+        uint32_t frameSize;
+        uint32_t read;
+    };
+    const Bad kBad[] = {
+            {"no frames and no size", 0, 0, 0},
+            {"no frames", 0, 64, 0},
+            {"frames that are not there", 1000, 64, 500},
+            {"frames beyond 4 GiB", 0xffffffff, 0xffffffff, 3},
+            {"frames shorter than their header", 1, 8, 0},
+    };
+    for (const Bad& bad : kBad) {
+        mService->setStatus("stopRecord", 0);
+        // Memory for the block alone, or for less than a frame's header.
+        const sp<LocalMemory> memory = new LocalMemory(136 + (bad.frameSize == 8 ? 8 : 0));
+        TouchCompanionSharedCblk* block = new (memory->bytes()) TouchCompanionSharedCblk;
+        block->bufferFrames = bad.bufferFrames;
+        block->frameSize = bad.frameSize;
+        mService->cblk = memory;
+        const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+        client->setRecordOutput(1);
+        client->startRecord();
+        mService->setStatus("stopRecord", STATUS_INVALID_STATE);
+        client->stopRecord();
+
+        const size_t before = mFrames.count();
+        block->read = bad.read;
+        block->write = bad.read + 1;
+        client->processData();
+        ASSERT_EQ(before + 1, mFrames.count()) << bad.name;
+        EXPECT_EQ(0u, mFrames[before].length) << bad.name;
+    }
+}
+
+TEST_F(TouchCompanionDelivery, ReadsNoLengthBeforeTheMemory) {
+    mRing.put();
+    mRing.cblk().readWrap = 1;  // frame 6 would lie two slots before the first
+    mClient->processData();
+    ASSERT_EQ(1u, mFrames.count());
+    EXPECT_EQ(0u, mFrames[0].length);
+}
+
+TEST_F(TouchCompanionDelivery, ReadsNoLengthWhereTheServicePoints) {
+    mRing.put();
+    for (uintptr_t address : {uintptr_t{0}, uintptr_t{4096}, ~uintptr_t{0} - 1000}) {
+        mRing.cblk().read = 6;
+        mRing.cblk().readWrap = 0;
+        mRing.cblk().data = reinterpret_cast<uint8_t*>(address);
+        mClient->processData();
+    }
+    ASSERT_EQ(3u, mFrames.count());
+    EXPECT_EQ(0u, mFrames[0].length);
+    EXPECT_EQ(0u, mFrames[1].length);
+    EXPECT_EQ(0u, mFrames[2].length);
+}
+
+// ---- the frame rate ----
+
+class TouchCompanionFrameRate : public TouchCompanionDelivery {
+  protected:
+    // Delivers a frame at `time` and returns the frame rate's line, if that wrote one.
+    std::string deliverAt(nsecs_t time) {
+        clearLog();
+        mClock.set(time);
+        mRing.put();
+        mClient->processData();
+        for (const std::string& line : clientLines()) {
+            if (line.find("frameRate") != std::string::npos) return line;
+        }
+        return "";
+    }
+
+    FakeClock mClock;
+};
+
+TEST_F(TouchCompanionFrameRate, IsLoggedOnceASecond) {
+    const nsecs_t start = 1000 * kSecond + 7;
+    EXPECT_EQ("", deliverAt(start));
+    EXPECT_EQ("", deliverAt(start + kSecond - 1));
+    EXPECT_EQ("D frameRate = 3, total = 3, sec = 1", deliverAt(start + kSecond));
+    EXPECT_EQ("", deliverAt(start + kSecond + 1));
+    EXPECT_EQ("", deliverAt(start + 2 * kSecond - 1));
+    EXPECT_EQ("D frameRate = 3, total = 6, sec = 2", deliverAt(start + 2 * kSecond));
+    EXPECT_EQ("D frameRate = 2, total = 7, sec = 3", deliverAt(start + 4 * kSecond - 1));
+}
+
+TEST_F(TouchCompanionFrameRate, IsLoggedNoMoreOnceASecondWasSkipped) {
+    deliverAt(0);
+    EXPECT_EQ("D frameRate = 2, total = 2, sec = 1", deliverAt(kSecond));
+    for (int second : {3, 4, 5, 2}) {
+        EXPECT_EQ(second == 2 ? "D frameRate = 3, total = 6, sec = 2" : "",
+                  deliverAt(second * kSecond));
+    }
+}
+
+TEST_F(TouchCompanionFrameRate, IsNotLoggedForTimeThatRunsBackwards) {
+    deliverAt(10 * kSecond);
+    EXPECT_EQ("", deliverAt(9 * kSecond + 1));
+    EXPECT_EQ("", deliverAt(8 * kSecond));
+    EXPECT_EQ("D frameRate = 4, total = 4, sec = 1", deliverAt(11 * kSecond));
+}
+
+TEST_F(TouchCompanionFrameRate, BeginsAnewWithEachRecording) {
+    deliverAt(0);
+    deliverAt(kSecond);
+    EXPECT_EQ("", deliverAt(5 * kSecond));
+
+    mService->setStatus("stopRecord", 0);
+    EXPECT_EQ(0, mClient->stopRecord());
+    EXPECT_EQ(0, mClient->startRecord());
+    mService->setStatus("stopRecord", STATUS_INVALID_STATE);
+    mClient->stopRecord();
+    EXPECT_EQ("", deliverAt(10 * kSecond));
+    EXPECT_EQ("D frameRate = 2, total = 2, sec = 1", deliverAt(11 * kSecond));
+}
+
+TEST_F(TouchCompanionFrameRate, CountsPassesWithoutFramesToo) {
+    mRing.put();
+    mRing.cblk().frameSize = 0;
+    mClock.set(0);
+    mClient->processData();
+    mClock.set(kSecond);
+    mClient->processData();
+    EXPECT_THAT(clientLines(), Contains("D frameRate = 2, total = 2, sec = 1"));
+}
+
+// ---- the thread ----
+
+TEST_F(TouchCompanionRecording, CallsBackOnAThreadOfItsOwn) {
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    for (uint32_t i = 0; i < 3; ++i) {
+        mRing.put();
+    }
+    ASSERT_TRUE(mFrames.waitFor(3));
+    EXPECT_EQ(0, client->stopRecord());
+    for (uint32_t i = 0; i < 3; ++i) {
+        EXPECT_EQ(0, mFrames[i].zero);
+        EXPECT_EQ(mRing.slot(i), mFrames[i].data);
+        EXPECT_EQ(kFrameSize, mFrames[i].length);
+        EXPECT_NE(std::this_thread::get_id(), mFrames[i].thread);
+        EXPECT_EQ(mFrames[0].thread, mFrames[i].thread);
+    }
+}
+
+TEST_F(TouchCompanionRecording, GoesOnAfterAPassWithoutFrames) {
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    while (mWaits.deadlines().size() < 2 * 63) {
+        usleep(1000);
+    }
+    mRing.put();
+    EXPECT_TRUE(mFrames.waitFor(1));
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_THAT(clientLines(),
+                Contains("E processData: buffer is not acquired(error = 1073741845)"));
+}
+
+// Checks each frame's bytes and that none is missing, in the callback, while the service writes.
+struct StreamCheck {
+    static void callback(int, void* data, unsigned long length, void* context) {
+        StreamCheck& check = *static_cast<StreamCheck*>(context);
+        const uint32_t number = check.seen.load();
+        if (length != kFrameSize || !check.ring.holds(data, number)) {
+            check.bad += 1;
+        }
+        check.seen = number + 1;
+        if (number % 100 == 0) clearLog();
+    }
+
+    FrameRing& ring;
+    std::atomic<uint32_t> seen{0};
+    std::atomic<uint32_t> bad{0};
+};
+
+TEST_F(TouchCompanionRecording, DeliversEveryFrameOfAFastWriter) {
+    constexpr uint32_t kFrames = 5000;
+    mWaits.onWait([](int) { std::this_thread::yield(); });
+    StreamCheck check{mRing};
+    const sp<TouchCompanionClient> client = record(mRing, StreamCheck::callback, &check);
+    for (uint32_t written = 0; written < kFrames;) {
+        if (mRing.put()) {
+            ++written;
+        } else {
+            std::this_thread::yield();
+        }
+    }
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+    while (check.seen < kFrames && std::chrono::steady_clock::now() < giveUp) {
+        std::this_thread::yield();
+    }
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_EQ(kFrames, check.seen);
+    EXPECT_EQ(0u, check.bad);
+}
+
+}  // namespace
+}  // namespace pemaro::test
