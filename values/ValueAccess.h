@@ -15,6 +15,8 @@ namespace pemaro {
 /// copies and checks of the public operations. A value tagged as a container may hold none (a null
 /// pointer, when it was made of a text and a tag): it counts as an empty one.
 struct ValueAccess {
+    struct Layout;
+
     using DefaultEntries = android::DefaultKeyedVector<std::string, SerializableValue>;
     using Entries = android::KeyedVector<std::string, SerializableValue>;
     using Elements = android::Vector<SerializableValue>;
