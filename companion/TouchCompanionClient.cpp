@@ -79,17 +79,20 @@ TouchCompanionClient::TouchCompanionClient(DataCallback callback, void* context)
 TouchCompanionClient::~TouchCompanionClient() {
     if (mInitialized) {
         mService->unregisterClient();
-        if (mThread != nullptr) {
-            mThread->requestExit();
-            mThread->requestExitAndWait();
-            mThread.clear();
-        }
+    }
+    // Whatever init() returned: who could not open the service may have recorded all the same, and
+    // the thread works on this object.
+    if (mThread != nullptr) {
+        mThread->requestExit();
+        mThread->requestExitAndWait();
+        mThread.clear();
+    }
+    if (mInitialized) {
         IPCThreadState::self()->flushCommands();
     }
     mBinderHandle.clear();
     mCblkMemory.clear();
     mService.clear();
-    mThread.clear();
 }
 
 int TouchCompanionClient::init() {
