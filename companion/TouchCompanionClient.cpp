@@ -286,7 +286,9 @@ int TouchCompanionClient::acquireBuffer(FrameBuffer* buffer) {
     ALOGD("acquireBuffer: new reqSize = %u", frames);
 
     const uint32_t slot = read - bufferFrames * mCblk->readWrap;
-    buffer->data = mCblk->data + slot * frameSize;
+    // A number until it is used: the other side can write anything into the block.
+    const uintptr_t first = reinterpret_cast<uintptr_t>(mCblk->data);
+    buffer->data = reinterpret_cast<void*>(first + slot * frameSize);
     buffer->frameCount = frames;
     buffer->size = frameSize * frames;
     ALOGD("acquireBuffer: data = %p, size = %zu, frameCount = %u", buffer->data, buffer->size,
