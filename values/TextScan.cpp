@@ -13,8 +13,6 @@ namespace pemaro {
 
 namespace {
 
-constexpr std::string_view kTextSpaces = " \t\r\n\v\f";
-
 /// The first `c` in [from, limit), or null.
 const char* findChar(const char* from, const char* limit, char c) {
     if (from >= limit) return nullptr;
@@ -47,9 +45,12 @@ void logReadError(const char* message) {
 }
 
 std::string_view trimSpaces(std::string_view token) {
-    const size_t first = token.find_first_not_of(kTextSpaces);
-    if (first == std::string_view::npos) return token;
-    return token.substr(first, token.find_last_not_of(kTextSpaces) - first + 1);
+    size_t first = 0;
+    size_t end = token.size();
+    while (first < end && isTextSpace(token[first])) ++first;
+    if (first == end) return token;
+    while (isTextSpace(token[end - 1])) --end;
+    return token.substr(first, end - first);
 }
 
 int scalarType(std::string_view token) {

@@ -54,13 +54,30 @@ void adoptNullItem(const SerializableMap& from, SerializableMap& to) {
     A::entries(to) = A::Entries();
 }
 
-/// Copies a value, but leaves the contents of the map or array that it holds to a later step.
+// A copy of a flat container first shares its buffer. Editing an element then makes the platform copy
+// all of them at once, without the cost of inserting them one by one.
+
+void copyFlat(const SerializableMap& from, SerializableMap& to) {
+    static_cast<A::DefaultEntries&>(to) = from;
+    A::entries(to).editValueAt(0);
+}
+
+void copyFlat(const SerializableMapArray& from, SerializableMapArray& to) {
+    A::elements(to) = A::elements(from);
+    A::elements(to).editItemAt(0);
+}
+
+void copyKeys(const SerializableMap& from, SerializableMap& to) {
+    adoptNullItem(from, to);
+    appendEmpty(to, A::size(from), [&from](size_t i) { return A::entries(from).keyAt(i); });
+}
+
+void copyKeys(const SerializableMapArray& from, SerializableMapArray& to) {
+    appendEmpty(to, A::size(from));
+}
+
+/// Gives `to`, a null value, a new container of the kind that `from` holds, to be filled later.
 void copyShell(const SerializableValue& from, SerializableValue& to, CopySteps& steps) {
-    if (!holdsContainer(from)) {
-        SerializableValue copy(from);
-        to.swap(copy);
-        return;
-    }
     A::type(to) = A::type(from);
     if (A::type(from) == VALUE_TYPE_OBJECT) {
         A::map(to) = new SerializableMap;
@@ -72,26 +89,19 @@ void copyShell(const SerializableValue& from, SerializableValue& to, CopySteps& 
 }
 
 template <typename Container>
-void copyShells(const Container& from, Container& to, CopySteps& steps) {
-    for (size_t i = 0; i < A::size(from); ++i) copyShell(A::at(from, i), A::edit(to, i), steps);
-}
-
-void copyLevel(const SerializableMap& from, SerializableMap& to, CopySteps& steps) {
+void copyLevel(const Container& from, Container& to, CopySteps& steps) {
     const size_t count = A::size(from);
-    if (count != 0 && isFlat(from)) {
-        // Sharing the entries and editing them makes the platform copy all of them at once.
-        static_cast<A::DefaultEntries&>(to) = from;
-        A::entries(to).editValueAt(0);
-        return;
+    if (count != 0 && isFlat(from)) return copyFlat(from, to);
+    copyKeys(from, to);
+    for (size_t i = 0; i < count; ++i) {
+        const SerializableValue& value = A::at(from, i);
+        if (holdsContainer(value)) {
+            copyShell(value, A::edit(to, i), steps);
+        } else {
+            SerializableValue copy(value);
+            A::edit(to, i).swap(copy);
+        }
     }
-    adoptNullItem(from, to);
-    appendEmpty(to, count, [&from](size_t i) { return A::entries(from).keyAt(i); });
-    copyShells(from, to, steps);
-}
-
-void copyLevel(const SerializableMapArray& from, SerializableMapArray& to, CopySteps& steps) {
-    appendEmpty(to, A::size(from));
-    copyShells(from, to, steps);
 }
 
 void runCopySteps(CopySteps& steps) {

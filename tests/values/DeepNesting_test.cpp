@@ -19,7 +19,7 @@ namespace {
 
 constexpr size_t kMebibyte = 1 << 20;
 constexpr size_t kStackBytes = 256 * 1024;
-constexpr std::chrono::seconds kLinear(10);
+constexpr std::chrono::seconds kLinear(60);
 
 /// Runs `body` on a thread with a small stack.
 void onSmallStack(std::function<void()> body) {
