@@ -70,6 +70,12 @@ std::string debugResponse(const std::string& results) {
 
 class TouchCompanionCommands : public TouchCompanionRemoteTest {
   protected:
+    // A response without entries would not be readable.
+    void SetUp() override {
+        TouchCompanionRemoteTest::SetUp();
+        respond(R"({"any":1})");
+    }
+
     void respond(const std::string& text) { mService->response = mapOf(text); }
 };
 
@@ -81,11 +87,11 @@ TEST_F(TouchCompanionCommands, CommandWithNumbersIsSentByteForByte) {
     expectSentText(kSendCommandCode,
                    R"({"DEBUG_COMMAND":{"REQUEST":{"ACTION":"SEND_COMMAND","PARAMETERS":)"
                    R"({"NUM_OF_ELEMENTS":2,"SEND_COMMAND_NAME":"calibrate","VALUES":[3,16]}}}})");
-    EXPECT_THAT(clientLines(), ElementsAre("D sendCommand: char E",
-                                           "D sendCommand:: req = calibrate 3 0x10\n",
-                                           "D sendCommand: SUCCESS!! retval =0\n",
-                                           "D sendCommand: SUCCESS!! used_len =4\n",
-                                           "D sendCommand: char X retval =0"));
+    EXPECT_THAT(clientLines(),
+                ElementsAre("D sendCommand: char E", "D sendCommand:: req = calibrate 3 0x10\n",
+                            "D sendCommand: SUCCESS!! retval =0\n",
+                            "D sendCommand: SUCCESS!! used_len =4\n",
+                            "D sendCommand: char X retval =0"));
 }
 
 TEST_F(TouchCompanionCommands, CommandWithoutASpaceIsSentByteForByte) {
@@ -99,9 +105,8 @@ TEST_F(TouchCompanionCommands, CommandWithoutASpaceIsSentByteForByte) {
 TEST_F(TouchCompanionCommands, RecordFilterIsSentByteForByte) {
     respond(debugResponse("0"));
     EXPECT_EQ(0, mClient->setRecordFilter(0x1F));
-    expectSentText(kSendCommandCode,
-                   R"({"DEBUG_COMMAND":{"REQUEST":{"ACTION":"SET_RECORD_FILTER",)"
-                   R"("PARAMETERS":{"MASK":31}}}})");
+    expectSentText(kSendCommandCode, R"({"DEBUG_COMMAND":{"REQUEST":{"ACTION":"SET_RECORD_FILTER",)"
+                                     R"("PARAMETERS":{"MASK":31}}}})");
 }
 
 TEST_F(TouchCompanionCommands, PropertyIsSentByteForByte) {
@@ -133,7 +138,7 @@ TEST_F(TouchCompanionCommands, CommandIsANameAndTheNumbersBehindItsFirstSpace) {
             {"x\t1", R"("NUM_OF_ELEMENTS":0,"SEND_COMMAND_NAME":"x	1")"},
             {"x \t1", R"("NUM_OF_ELEMENTS":1,"SEND_COMMAND_NAME":"x","VALUES":[1])"},
     };
-    respond(debugResponse("{}"));
+    respond(debugResponse(R"({"any":1})"));
     for (const RequestRow& row : rows) {
         SCOPED_TRACE(row.text);
         mRemote->clearTransactions();
@@ -262,7 +267,7 @@ TEST_F(TouchCompanionCommands, OutValueSaysWhetherThereIsAText) {
              debugResponse(R"({"OUT_VALUE":2,"OUT_STRING":[1]})"),
              {0, ""},
              "2"},
-            {"no results", debugResponse("{}"), {0, "response success"}, "0"},
+            {"neither", debugResponse(R"({"any":1})"), {0, "response success"}, "0"},
     };
     for (const ResponseRow& row : rows) {
         SCOPED_TRACE(row.what);
@@ -279,13 +284,13 @@ TEST_F(TouchCompanionCommands, OutValueSaysWhetherThereIsAText) {
 
 TEST_F(TouchCompanionCommands, UnreadableResponseIsAFailedOne) {
     const std::string responses[] = {
-            "{}",
+            R"({"any":1})",
             R"({"DEBUG_COMMAND":7})",
-            R"({"DEBUG_COMMAND":{}})",
-            R"({"debug_command":{"RESPONSE":{"RESULTS":{}}}})",
-            R"({"DEBUG_COMMAND":{"RESULTS":{}}})",
+            R"({"DEBUG_COMMAND":[1]})",
+            R"({"debug_command":{"RESPONSE":{"RESULTS":{"OUT_VALUE":0}}}})",
+            R"({"DEBUG_COMMAND":{"RESULTS":{"OUT_VALUE":0}}})",
             R"({"DEBUG_COMMAND":{"RESPONSE":"x"}})",
-            R"({"DEBUG_COMMAND":{"RESPONSE":{}}})",
+            R"({"DEBUG_COMMAND":{"RESPONSE":{"any":1}}})",
             debugResponse("4"),
             debugResponse("[1]"),
     };
@@ -322,6 +327,14 @@ TEST_F(TouchCompanionCommands, FailedTransactionLeavesTheResultAlone) {
                             "D sendCommand: char X retval =1073741824"));
 }
 
+// The text of a map without entries cannot be read: that is a failure of the call, not of the response.
+TEST_F(TouchCompanionCommands, EmptyResponseIsAFailedCall) {
+    mService->response = SerializableMap();
+    EXPECT_EQ((Answer{0x4000000C, kUntouched}), send(mClient, "status"));
+    EXPECT_EQ(0x4000000C, mClient->setRecordFilter(1));
+    EXPECT_EQ(0x4000000C, mClient->setProperty("setRollingLogSize", "5"));
+}
+
 TEST_F(TouchCompanionCommands, NullCommandIsRefusedWithoutACall) {
     EXPECT_EQ((Answer{0x40000000, kUntouched}), send(mClient, nullptr));
     EXPECT_THAT(clientLines(), ElementsAre("D sendCommand: char E", "D sendCommand: req null"));
@@ -345,14 +358,15 @@ TEST_F(TouchCompanionCommands, RecordFilterOnlyLogsItsResult) {
 
 TEST_F(TouchCompanionCommands, RecordFilterFailsWithTheStatusOfTheResponse) {
     for (const std::string& response :
-         {std::string("{}"), debugResponse("{}"), debugResponse("[0]"), debugResponse("\"x\""),
+         {std::string(R"({"any":1})"), debugResponse(R"({"any":1})"), debugResponse("[0]"),
+          debugResponse("\"x\""),
           std::string(R"({"PROPERTY_COMMAND":{"RESPONSE":{"RESULTS":0}}})")}) {
         SCOPED_TRACE(response);
         respond(response);
         clearLog();
         EXPECT_EQ(0x4000000C, mClient->setRecordFilter(1));
-        EXPECT_THAT(clientLines(), ElementsAre("D setRecordFilter: E",
-                                               "D setRecordFilter: X retval =1073741836"));
+        EXPECT_THAT(clientLines(),
+                    ElementsAre("D setRecordFilter: E", "D setRecordFilter: X retval =1073741836"));
     }
 }
 
@@ -390,7 +404,7 @@ TEST_F(TouchCompanionCommands, PropertyPassesTheStatusOnAndReadsNoResponse) {
 }
 
 TEST_F(TouchCompanionCommands, UnknownPropertyIsRefusedWithoutACall) {
-    for (const std::string& name :
+    for (const std::string name :
          {"SetRollingLogSize", "setRollingLogSiz", "setRollingLogSize2", "setrollinglogsize", ""}) {
         SCOPED_TRACE(name);
         clearLog();
@@ -475,8 +489,8 @@ TEST_F(ResponseReader, ReadsANumber) {
             {"7", 7}, {"-7", -7}, {"2.9", 2}, {"\"12abc\"", 12}, {"0x10", 0}};
     for (const auto& [text, number] : rows) {
         SCOPED_TRACE(text);
-        SerializableMap response = mapOf(R"({"k":{"RESPONSE":{"RESULTS":)" + std::string(text) +
-                                         "}}}");
+        SerializableMap response =
+                mapOf(R"({"k":{"RESPONSE":{"RESULTS":)" + std::string(text) + "}}}");
         int result = 99;
         EXPECT_EQ(0, mClient->getResultFromResponseCmd(response, result, "k"));
         EXPECT_EQ(number, result);
@@ -497,13 +511,13 @@ TEST_F(ResponseReader, ReadsAMapAndAnArray) {
 
 TEST_F(ResponseReader, LeavesTheResultAloneWhenItIsNotThere) {
     const char* responses[] = {
-            "{}",
+            R"({"any":1})",
             R"({"k":1})",
             R"({"k":[1]})",
-            R"({"k":{}})",
+            R"({"k":{"any":1}})",
             R"({"k":{"RESPONSE":1}})",
             R"({"k":{"response":{"RESULTS":1}}})",
-            R"({"k":{"RESPONSE":{}}})",
+            R"({"k":{"RESPONSE":{"any":1}}})",
             R"({"k":{"RESPONSE":{"RESULTS":true}}})",
             R"({"K":{"RESPONSE":{"RESULTS":1}}})",
     };
@@ -600,9 +614,19 @@ TEST_F(NumberSplitter, MakesSignedNumbers) {
 
 TEST_F(NumberSplitter, ReadsOneHexadecimalNumber) {
     const std::pair<const char*, int> rows[] = {
-            {"1f", 31},    {"1F", 31},        {"0x1f", 31},         {"0X10", 16}, {" 10", 16},
-            {"10 20", 16}, {"-1", -1},        {"ffffffff", -1},     {"7g", 7},    {"zz", 0},
-            {"", 0},       {"100000001", 1},  {"80000000", -2147483647 - 1},
+            {"1f", 31},
+            {"1F", 31},
+            {"0x1f", 31},
+            {"0X10", 16},
+            {" 10", 16},
+            {"10 20", 16},
+            {"-1", -1},
+            {"ffffffff", -1},
+            {"7g", 7},
+            {"zz", 0},
+            {"", 0},
+            {"100000001", 1},
+            {"80000000", -2147483647 - 1},
     };
     for (const auto& [text, number] : rows) {
         EXPECT_EQ(number, hexadecimal(text)) << '"' << text << '"';
@@ -615,27 +639,30 @@ TEST_F(NumberSplitter, HexadecimalReaderTakesItsFirstCharacterEvenIfThatIsANul) 
 
 // ---- threads ----
 
+// Answers each command with its name.
+class EchoingService : public FakeTouchCompanionService {
+  public:
+    int sendCommand(SerializableMap& request, SerializableMap& answer) override {
+        SerializableMap& body = inner(inner(request, "DEBUG_COMMAND"), "REQUEST");
+        SerializableMap results;
+        results.add("OUT_VALUE", 1);
+        results.add("OUT_STRING", inner(body, "PARAMETERS").editValueFor("SEND_COMMAND_NAME"));
+        SerializableMap response;
+        response.add("RESULTS", results);
+        SerializableMap outer;
+        outer.add("RESPONSE", response);
+        answer.add("DEBUG_COMMAND", outer);
+        return 0;
+    }
+
+  private:
+    static SerializableMap& inner(SerializableMap& map, const char* key) {
+        return map.editValueFor(key).getValue<SerializableMap>();
+    }
+};
+
 TEST_F(TouchCompanionCommands, CommandsOfSeveralThreadsAreIndependent) {
-    mRemote->handle([](uint32_t, const android::Parcel& data, android::Parcel* reply) {
-        // The name of each command is its answer.
-        android::Parcel request;
-        request.appendFrom(&data, 0, data.dataSize());
-        request.setDataPosition(0);
-        request.enforceInterface(android::String16("pemaro.TouchService"));
-        SerializableMap map;
-        map.unserialize(request.readString8().c_str());
-        const std::string name = map.editValueFor("DEBUG_COMMAND")
-                                         .getValue<SerializableMap>()
-                                         .editValueFor("REQUEST")
-                                         .getValue<SerializableMap>()
-                                         .editValueFor("PARAMETERS")
-                                         .getValue<SerializableMap>()
-                                         .editValueFor("SEND_COMMAND_NAME")
-                                         .getValue<std::string>();
-        reply->writeInt32(0);
-        writeString8(*reply, debugResponse(R"({"OUT_VALUE":1,"OUT_STRING":")" + name + "\"}"));
-        return android::NO_ERROR;
-    });
+    mRemote->forwardTo(new EchoingService);
     std::vector<std::thread> threads;
     for (int thread = 0; thread < 4; ++thread) {
         threads.emplace_back([this, thread] {
