@@ -24,7 +24,7 @@ std::atomic<int> gDriverWrites{0};
 // Registered while the program's static objects are made; runs before the first test.
 class OpenDriver : public ::testing::Environment {
   public:
-    void SetUp() override { android::ProcessState::initWithDriver("/dev/zero"); }
+    void SetUp() override { openDriver(); }
 };
 
 [[maybe_unused]] const ::testing::Environment* const gOpenDriver =
@@ -43,6 +43,10 @@ int writeRead(binder_write_read& transfer) {
 }
 
 }  // namespace
+
+void openDriver() {
+    android::ProcessState::initWithDriver("/dev/zero");
+}
 
 int driverWrites() {
     return gDriverWrites;

@@ -12,6 +12,9 @@ namespace pemaro::test {
 // process. Local binders, parcels that carry them, proxies around local binders and shared memory
 // work in full.
 
+/// Opens /dev/zero as the driver: for programs without GoogleTest, where nothing does it for them.
+void openDriver();
+
 /// How often libbinder has handed its queued commands to the driver.
 int driverWrites();
 
