@@ -123,7 +123,7 @@ status_t replyAnswer(Service& service, const Parcel& data, Parcel& reply) {
 }
 
 status_t onConfigureVmRegion(Service& service, const Parcel& data, Parcel& reply) {
-    Rect region;
+    Rect region(0, 0, 0, 0);  // without arguments it would need libui's library
     for (auto field : kRegionFields) {
         region.*field = data.readInt32();
     }
