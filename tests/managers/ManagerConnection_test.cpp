@@ -1,0 +1,60 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "managers/ManagerConnection.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "tests/support/FakeServiceManager.h"
+#include "tests/support/LogLines.h"
+#include "tests/support/RecordingBinder.h"
+
+namespace pemaro::test {
+namespace {
+
+using android::IBinder;
+using android::sp;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+struct Client : public virtual android::RefBase {};
+
+// A service whose cast refuses every binder, which the platform's own casts never do.
+class OtherService : public android::RefBase {
+  public:
+    static sp<OtherService> asInterface(const sp<IBinder>&) { return nullptr; }
+
+    int subscribe(const sp<Client>&) { return ++calls; }
+    int unsubscribe(const sp<Client>&) { return ++calls; }
+
+    int calls = 0;
+};
+
+constexpr ManagerTexts kTexts = {"Tag", "service", "connected", "link failed"};
+
+TEST(ManagerConnection, RefusesABinderOfAnotherInterface) {
+    ScopedServiceManager services;
+    const sp<RecordingBinder> binder = new RecordingBinder;
+    services->add("service", binder);
+    const sp<Client> self = new Client;
+    const sp<OtherService> held = new OtherService;
+    sp<OtherService> service = held;
+    bool initialized = false;
+    ManagerConnection connection(kTexts, initialized, service, self.get());
+
+    clearLog();
+    EXPECT_EQ(STATUS_BAD_PARAMETER, connection.initWatched(nullptr));
+    EXPECT_THAT(linesOf("Tag"), ElementsAre("D init: E", "E wrong service interface?"));
+    EXPECT_FALSE(initialized);
+    // What was held before is let go, without a call.
+    EXPECT_EQ(nullptr, service);
+    EXPECT_EQ(0, held->calls);
+    EXPECT_EQ(0, binder->linkCalls());
+
+    // The step alone, of which the touch manager client makes its init().
+    clearLog();
+    EXPECT_EQ(STATUS_BAD_PARAMETER, connection.hold(binder));
+    EXPECT_THAT(linesOf("Tag"), ElementsAre("E wrong service interface?"));
+}
+
+}  // namespace
+}  // namespace pemaro::test

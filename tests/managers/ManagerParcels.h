@@ -1,0 +1,62 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <gmock/gmock.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <type_traits>
+#include <vector>
+
+#include "tests/support/ParcelBytes.h"
+
+namespace pemaro::test {
+
+// What the managers' requests and replies are made of.
+
+inline void nothing(android::Parcel&) {}
+
+inline ParcelWriter numbers(std::vector<int32_t> values) {
+    return [values](android::Parcel& parcel) {
+        for (int32_t value : values) {
+            parcel.writeInt32(value);
+        }
+    };
+}
+
+inline ParcelWriter names(std::vector<const char*> values) {
+    return [values](android::Parcel& parcel) {
+        for (const char* value : values) {
+            parcel.writeCString(value);
+        }
+    };
+}
+
+/// `count` records whose bytes tell where they are.
+template <typename Record>
+std::vector<Record> makeRecords(size_t count) {
+    std::vector<Record> records(count);
+    uint8_t* bytes = reinterpret_cast<uint8_t*>(records.data());
+    for (size_t i = 0; i < count * sizeof(Record); ++i) {
+        bytes[i] = static_cast<uint8_t>(i * 31 + i / 251);
+    }
+    return records;
+}
+
+/// Whether `data` points to the first `count` records of makeRecords().
+MATCHER_P(HoldsRecords, count, "") {
+    if (arg == nullptr) {
+        return false;
+    }
+    const auto expected = makeRecords<std::decay_t<decltype(*arg)>>(count);
+    return memcmp(arg, expected.data(), count * sizeof(*arg)) == 0;
+}
+
+/// Appends makeRecords() as raw bytes.
+template <typename Record>
+void writeRecords(android::Parcel& parcel, size_t count) {
+    parcel.write(makeRecords<Record>(count).data(), count * sizeof(Record));
+}
+
+}  // namespace pemaro::test

@@ -1,0 +1,342 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "pemaro/TouchManagerClient.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+#include <vector>
+
+#include "pemaro/Status.h"
+#include "tests/managers/ManagerMocks.h"
+#include "tests/managers/ManagerParcels.h"
+#include "tests/support/FakeServiceManager.h"
+#include "tests/support/FakeWaits.h"
+#include "tests/support/LogLines.h"
+#include "tests/support/RecordingBinder.h"
+
+namespace pemaro::test {
+namespace {
+
+using android::Parcel;
+using android::sp;
+using ::testing::_;
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::NiceMock;
+using ::testing::SizeIs;
+
+using Gesture = ITouchManagerClient::GestureData;
+
+constexpr char kService[] = "pemaro.TouchManagerService";
+constexpr char kTag[] = "TouchManagerClient";
+constexpr uint32_t kSubscribe = 1;
+constexpr uint32_t kUnsubscribe = 2;
+
+struct Event {
+    char callback;
+    Gesture* record;
+    void* context;
+};
+
+bool operator==(const Event& a, const Event& b) {
+    return a.callback == b.callback && a.record == b.record && a.context == b.context;
+}
+
+std::vector<Event> gEvents;
+
+void callbackA(Gesture* record, void* context) {
+    gEvents.push_back({'A', record, context});
+}
+
+void callbackB(Gesture* record, void* context) {
+    gEvents.push_back({'B', record, context});
+}
+
+std::string withAddress(const char* text, const void* address) {
+    char line[128];
+    snprintf(line, sizeof(line), text, address);
+    return line;
+}
+
+std::string eventLine(const TouchManagerClient* client) {
+    return withAddress("E Gesture event detected (client address = %p)", client);
+}
+
+class TouchManagerClientTest : public ::testing::Test {
+  protected:
+    void SetUp() override {
+        // The callback and the context outlive the clients of other tests.
+        const sp<TouchManagerClient> forget = new TouchManagerClient(nullptr, nullptr);
+        gEvents.clear();
+        mRemote->answer(numbers({0}));
+        clearLog();
+    }
+
+    void addService() { mServices->add(kService, mRemote); }
+
+    sp<TouchManagerClient> connect(TouchManagerClient::GestureCallback callback, void* context) {
+        addService();
+        const sp<TouchManagerClient> client = new TouchManagerClient(callback, context);
+        EXPECT_EQ(0, client->init());
+        mRemote->clearTransactions();
+        clearLog();
+        return client;
+    }
+
+    std::vector<uint32_t> codes() const {
+        std::vector<uint32_t> codes;
+        for (const auto& transaction : mRemote->transactions()) {
+            codes.push_back(transaction.code);
+        }
+        return codes;
+    }
+
+    static Bytes requestWith(const sp<TouchManagerClient>& client) {
+        return requestBytes(kService, [&](Parcel& p) { p.writeStrongBinder(client); });
+    }
+
+    ScopedServiceManager mServices;
+    const sp<RecordingBinder> mRemote = new RecordingBinder;
+    int mContext = 0;
+};
+
+// ---- construction ----
+
+TEST_F(TouchManagerClientTest, LogsItsConstructionAndDestruction) {
+    for (bool withCallback : {true, false}) {
+        clearLog();
+        sp<TouchManagerClient> client = withCallback ? new TouchManagerClient(callbackA, &mContext)
+                                                     : new TouchManagerClient;
+        const void* address = client.get();
+        client.clear();
+        EXPECT_THAT(linesOf(kTag),
+                    ElementsAre(withAddress("D TouchManagerClient(): this = %p", address),
+                                withAddress("D ~TouchManagerClient: E: this = %p", address),
+                                "D ~TouchManagerClient(): X"));
+    }
+}
+
+TEST(TouchManagerClientDeathTest, HasNoCallbackWhenTheLibraryIsLoaded) {
+    // In a process of its own, where no client was constructed before.
+    ::testing::FLAGS_gtest_death_test_style = "threadsafe";
+    EXPECT_EXIT(
+            {
+                const sp<TouchManagerClient> client = new TouchManagerClient;
+                clearLog();
+                client->gestureCallback(nullptr);
+                exit(linesOf(kTag) == Lines{eventLine(client.get()), "E callback is null"} ? 0 : 1);
+            },
+            ::testing::ExitedWithCode(0), "");
+}
+
+// ---- init ----
+
+TEST_F(TouchManagerClientTest, SubscribesItself) {
+    addService();
+    const sp<TouchManagerClient> client = new TouchManagerClient(callbackA, &mContext);
+    clearLog();
+    EXPECT_EQ(0, client->init());
+    EXPECT_THAT(
+            linesOf(kTag),
+            ElementsAre("D init: E", "D before subscribe: mTchMgrClient ref count = 1",
+                        "D after subscribe: mTchMgrClient ref count = 1", "E Init successful: X"));
+    ASSERT_THAT(codes(), ElementsAre(kSubscribe));
+    EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
+    EXPECT_EQ(1, mServices->lookups(kService));
+    EXPECT_EQ(0, mRemote->linkCalls());
+}
+
+TEST_F(TouchManagerClientTest, CountsTheReferenceThatTheServiceKeeps) {
+    const sp<NiceMock<MockTouchManagerService>> service = new NiceMock<MockTouchManagerService>;
+    sp<ITouchManagerClient> kept;
+    EXPECT_CALL(*service, subscribe(_)).WillOnce([&](const sp<ITouchManagerClient>& client) {
+        kept = client;
+        return 0;
+    });
+    mServices->add(kService, service);
+    const sp<TouchManagerClient> client = new TouchManagerClient;
+    clearLog();
+    EXPECT_EQ(0, client->init());
+    EXPECT_EQ(client, kept);
+    EXPECT_THAT(
+            linesOf(kTag),
+            ElementsAre("D init: E", "D before subscribe: mTchMgrClient ref count = 1",
+                        "D after subscribe: mTchMgrClient ref count = 2", "E Init successful: X"));
+}
+
+TEST_F(TouchManagerClientTest, AsksForTheServiceOnce) {
+    FakeWaits waits;
+    const sp<TouchManagerClient> client = new TouchManagerClient;
+    clearLog();
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->init());
+    EXPECT_THAT(linesOf(kTag), ElementsAre("D init: E", "E couldn't find the service"));
+    EXPECT_EQ(1, mServices->lookups(kService));
+    EXPECT_THAT(waits.sleeps(), IsEmpty());
+}
+
+TEST(TouchManagerClientAlone, NeedsAServiceManager) {
+    const sp<TouchManagerClient> client = new TouchManagerClient;
+    clearLog();
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->init());
+    EXPECT_THAT(linesOf(kTag), ElementsAre("D init: E", "E couldn't get default service manager"));
+}
+
+TEST_F(TouchManagerClientTest, KeepsTheServiceThatRefusesIt) {
+    addService();
+    mRemote->answer(numbers({STATUS_BROKEN_PIPE}));
+    const sp<TouchManagerClient> client = new TouchManagerClient;
+    clearLog();
+    EXPECT_EQ(STATUS_BROKEN_PIPE, client->init());
+    EXPECT_THAT(linesOf(kTag),
+                ElementsAre("D init: E", "D before subscribe: mTchMgrClient ref count = 1",
+                            "D after subscribe: mTchMgrClient ref count = 1",
+                            "E subscribing to service failed"));
+    // Its features can be used, and nothing is there to unsubscribe.
+    mRemote->answer(numbers({0}));
+    mRemote->clearTransactions();
+    EXPECT_EQ(0, client->enable(3));
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_EQ(0, client->enable(3));
+    EXPECT_THAT(codes(), ElementsAre(5u, 5u));
+}
+
+TEST_F(TouchManagerClientTest, FailsWhenSubscribingCannotBeSent) {
+    addService();
+    mRemote->fail(android::DEAD_OBJECT);
+    const sp<TouchManagerClient> client = new TouchManagerClient;
+    EXPECT_EQ(STATUS_UNKNOWN_ERROR, client->init());
+}
+
+TEST_F(TouchManagerClientTest, SubscribesAgainWhenInitialisedAgain) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    EXPECT_EQ(0, client->init());
+    EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
+    mRemote->answer(numbers({STATUS_UNSUPPORTED}));
+    EXPECT_EQ(STATUS_UNSUPPORTED, client->init());
+    EXPECT_THAT(codes(), ElementsAre(kSubscribe, kSubscribe));
+    // It is still subscribed from before.
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_THAT(codes(), ElementsAre(kSubscribe, kSubscribe, kUnsubscribe));
+}
+
+// ---- deinit ----
+
+TEST_F(TouchManagerClientTest, UnsubscribesItself) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_THAT(linesOf(kTag), ElementsAre("D deinit: E", "D deinit: X"));
+    ASSERT_THAT(codes(), ElementsAre(kUnsubscribe));
+    EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
+    // Once: the service was let go.
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_THAT(codes(), SizeIs(1));
+    EXPECT_EQ(STATUS_INVALID_STATE, client->enable(1));
+}
+
+TEST_F(TouchManagerClientTest, DoesNotMindAFailureToUnsubscribe) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    mRemote->fail(android::DEAD_OBJECT);
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_EQ(STATUS_INVALID_STATE, client->enable(1));
+}
+
+TEST_F(TouchManagerClientTest, CallsNobodyWhenItWasNeverInitialised) {
+    addService();
+    const sp<TouchManagerClient> client = new TouchManagerClient;
+    clearLog();
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_THAT(linesOf(kTag), ElementsAre("D deinit: E", "D deinit: X"));
+    EXPECT_THAT(mRemote->transactions(), IsEmpty());
+    EXPECT_EQ(0, mServices->lookups(kService));
+}
+
+TEST_F(TouchManagerClientTest, CanBeInitialisedAnew) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    client->deinit();
+    EXPECT_EQ(0, client->init());
+    EXPECT_THAT(codes(), ElementsAre(kUnsubscribe, kSubscribe));
+}
+
+TEST_F(TouchManagerClientTest, DoesNotUnsubscribeWhenDestroyed) {
+    sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    const int held = mRemote->getStrongCount();
+    client.clear();
+    EXPECT_THAT(mRemote->transactions(), IsEmpty());
+    EXPECT_EQ(held - 1, mRemote->getStrongCount());
+}
+
+// ---- gestures ----
+
+TEST_F(TouchManagerClientTest, HandsGesturesToTheCallback) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    Gesture record;
+    EXPECT_EQ(0, client->gestureCallback(&record));
+    EXPECT_EQ(0, client->gestureCallback(nullptr));
+    EXPECT_THAT(gEvents,
+                ElementsAre(Event{'A', &record, &mContext}, Event{'A', nullptr, &mContext}));
+    EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()), eventLine(client.get())));
+    EXPECT_THAT(mRemote->transactions(), IsEmpty());
+}
+
+TEST_F(TouchManagerClientTest, HandsOnTheRecordThatLiesInTheRequest) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    Parcel data;
+    Parcel reply;
+    writeToken(data, "pemaro.TouchManagerClient");
+    writeRecords<Gesture>(data, 1);
+    EXPECT_EQ(android::NO_ERROR, client->transact(1, data, &reply));
+    ASSERT_THAT(gEvents, SizeIs(1));
+    EXPECT_EQ(data.data() + data.dataSize() - sizeof(Gesture),
+              reinterpret_cast<const uint8_t*>(gEvents[0].record));
+    EXPECT_THAT(gEvents[0].record, HoldsRecords(1u));
+    EXPECT_EQ(parcelBytes(numbers({0})), bytesOf(reply));
+}
+
+TEST_F(TouchManagerClientTest, SharesTheCallbackOfTheLastClient) {
+    int contextB = 0;
+    const sp<TouchManagerClient> first = new TouchManagerClient(callbackA, &mContext);
+    const sp<TouchManagerClient> second = new TouchManagerClient(callbackB, &contextB);
+    const sp<TouchManagerClient> third = new TouchManagerClient;
+    Gesture record;
+    for (const sp<TouchManagerClient>& client : {first, second, third}) {
+        gEvents.clear();
+        EXPECT_EQ(0, client->gestureCallback(&record));
+        EXPECT_THAT(gEvents, ElementsAre(Event{'B', &record, &contextB}));
+    }
+}
+
+TEST_F(TouchManagerClientTest, DropsGesturesWithoutACallback) {
+    const sp<TouchManagerClient> client = connect(nullptr, &mContext);
+    EXPECT_EQ(0, client->gestureCallback(nullptr));
+    EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()), "E callback is null"));
+    EXPECT_THAT(mRemote->transactions(), IsEmpty());
+}
+
+TEST_F(TouchManagerClientTest, UnsubscribesAtEveryGestureWithoutAContext) {
+    const sp<TouchManagerClient> client = connect(callbackA, nullptr);
+    for (int i = 0; i < 2; ++i) {
+        clearLog();
+        EXPECT_EQ(0, client->gestureCallback(nullptr));
+        EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()),
+                                               "E JNI context is null...unsubscribing client"));
+        EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
+    }
+    EXPECT_THAT(gEvents, IsEmpty());
+    // The client does not count itself as unsubscribed.
+    client->deinit();
+    EXPECT_THAT(codes(), ElementsAre(kUnsubscribe, kUnsubscribe, kUnsubscribe));
+}
+
+TEST_F(TouchManagerClientTest, IgnoresAGestureWithoutAContextAndAService) {
+    const sp<TouchManagerClient> client = new TouchManagerClient(callbackA, nullptr);
+    clearLog();
+    EXPECT_EQ(0, client->gestureCallback(nullptr));
+    EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()),
+                                           "E JNI context is null...unsubscribing client"));
+}
+
+}  // namespace
+}  // namespace pemaro::test
