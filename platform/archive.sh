@@ -48,22 +48,23 @@ copy_one_line_sources() {
 copy_deb822_sources() {
     awk -v suites="^($SUITES)$" '
         function has(field, word) { return (" " value[field] " ") ~ ("[[:space:]]" word "[[:space:]]") }
-        function copy_paragraph(   i, n, word, ours, name) {
+        function copy_paragraph(   i, n, word, ours) {
             n = split(value["suites"], word)
             for (i = 1; i <= n; i++)
                 if (word[i] ~ suites)
                     ours = ours " " word[i]
             if (ours != "" && has("types", "deb") && has("components", "main") && !has("enabled", "(no|false|0|off)")) {
                 value["types"] = " deb deb-src"; value["suites"] = ours; value["components"] = " main"
-                for (name in value)
-                    print name ":" value[name]
+                for (i = 1; i <= fields; i++)
+                    print name[i] ":" value[name[i]]
                 print ""
             }
+            fields = 0
             delete value
         }
         /^#/ { next }
         /^[[:space:]]*$/ { copy_paragraph(); next }
         /^[[:space:]]/ { value[field] = value[field] "\n" $0; next }
-        { field = tolower($0); sub(/:.*/, "", field); sub(/^[^:]*:/, ""); value[field] = $0 }
+        { field = tolower($0); sub(/:.*/, "", field); sub(/^[^:]*:/, ""); value[field] = $0; name[++fields] = field }
         END { copy_paragraph() }' "$1"
 }

@@ -52,6 +52,12 @@ make_cache_folder() {
     ZELK_CACHE=$(realpath -- "$ZELK_CACHE")
 }
 
+# Only what these scripts made, should the folder hold anything else.
+remove_cache() {
+    (cd -- "$ZELK_CACHE" && rm -rf -- apt initramfs kernel lock logs platform sources)
+    rmdir -- "$ZELK_CACHE" 2>/dev/null || true
+}
+
 # Holds the lock until the (sub)shell that called it ends.
 lock_file() {
     local file=$1 what=$2 descriptor

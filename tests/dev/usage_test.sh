@@ -1,0 +1,59 @@
+#!/bin/bash
+# SPDX-License-Identifier: Apache-2.0
+# The command line of ./dev: help, and one clear line about whatever is wrong with it.
+# shellcheck disable=SC2317,SC2016,SC2153 # functions are called by name, text is expanded by others
+. "$(dirname -- "$0")/lib.sh"
+
+dev=$ROOT/dev
+commands=(setup build test demo vm clean)
+
+test_alone_prints_every_command() {
+    expect_status 0 "$dev"
+    for command in "${commands[@]}"; do
+        expect_contains "  $command " "$OUTPUT"
+    done
+}
+
+test_every_command_has_help() {
+    for command in "${commands[@]}"; do
+        expect_status 0 "$dev" "$command" --help
+        expect_contains "usage: ./dev $command" "$OUTPUT"
+        expect_status 0 "$dev" "$command" -h
+    done
+}
+
+test_wrong_usage_is_one_line_and_status_2() {
+    while IFS='|' read -r arguments message; do
+        # shellcheck disable=SC2086 # several arguments
+        expect_status 2 "$dev" $arguments
+        expect_one_error "$message"
+    done <<'ROWS'
+frobnicate|unknown command 'frobnicate'
+setup now|setup takes no argument
+build relaese|unknown preset 'relaese'
+build release nope|unknown preset 'nope'
+test --fast|unknown option '--fast'
+test -R|-R needs a regular expression
+demo 3|demo takes no argument
+vm|no command is given
+vm --|no command is given
+vm --timeout|--timeout needs a number
+vm --timeout 0 true|'0' is not a number of seconds
+vm --timeout=1h true|'1h' is not a number of seconds
+vm --verbose true|unknown option '--verbose'
+clean everything|clean takes no argument but --all
+ROWS
+}
+
+test_unknown_machine_for_the_command_is_wrong_usage() {
+    ZELK_VM=cloud expect_status 2 "$dev" vm true
+    expect_one_error "ZELK_VM is 'cloud'"
+}
+
+test_works_from_another_folder_and_through_a_link() {
+    ln -s "$dev" "$SCRATCH/link"
+    expect_status 0 "$SCRATCH/link"
+    expect_contains "usage: ./dev" "$OUTPUT"
+}
+
+run_tests
