@@ -126,10 +126,9 @@ bool readDecimal(const char*& at, Decimal& decimal) {
     }
 }
 
-/// Whether rounding this double to float gives the same as rounding the number it stands for.
+/// Whether rounding this double, which is 0 or within the range of a float's full precision, to float
+/// gives the same as rounding the number that it stands for.
 bool roundsOnce(double value) {
-    if (value == 0) return true;
-    if (value < FLT_MIN || value > FLT_MAX) return false;
     constexpr uint64_t kBelowFloat = (uint64_t{1} << 29) - 1;
     constexpr uint64_t kHalfway = uint64_t{1} << 28;
     uint64_t bits = 0;

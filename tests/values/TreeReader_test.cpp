@@ -118,6 +118,18 @@ TEST(MapReader, KeepsLastOfDuplicateKeys) {
     expectAccepted<SerializableMap>(kRows);
 }
 
+TEST(MapReader, KeepsLastOfManyDuplicateKeys) {
+    std::string text = "{";
+    for (int i = 0; i < 300; ++i) {
+        text += "\"k" + std::to_string(i % 7) + "\":" + std::to_string(i) + ",";
+    }
+    SerializableMap map;
+    EXPECT_EQ(map.unserialize(text + "\"z\":0}"), 0);
+    EXPECT_EQ(map.serialize(),
+              "{\"k0\":294,\"k1\":295,\"k2\":296,\"k3\":297,\"k4\":298,\"k5\":299,\"k6\":293,"
+              "\"z\":0}");
+}
+
 TEST(MapReader, DropsAKeyWithNothingBehindItsColon) {
     const Accepted kRows[] = {
             {"{\"a\":}", "13()"},
