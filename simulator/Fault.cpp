@@ -14,7 +14,7 @@
 namespace pemaro::simulator {
 namespace {
 
-constexpr const char* kOperations[] = {
+constexpr std::string_view kOperations[] = {
         "registerClient",
         "unregisterClient",
         "open",
@@ -39,12 +39,56 @@ constexpr const char* kOperations[] = {
         "saveSession",
         "restoreSession",
         "setAuth",
+        "touch.subscribe",
+        "touch.unsubscribe",
+        "touch.isSupported",
+        "touch.isEnabled",
+        "touch.enable",
+        "touch.disable",
+        "touch.configure_vm_region",
+        "gesture.subscribe",
+        "gesture.unsubscribe",
+        "gesture.enableWakeup",
+        "gesture.disableWakeup",
+        "gesture.startGestureDetection",
+        "gesture.stopGestureDetection",
+        "gesture.addGesture",
+        "gesture.deleteGesture",
+        "gesture.enableGesture",
+        "gesture.disableGesture",
+        "gesture.improveGestureTraining",
+        "gesture.getMaxPreDefinedGesture",
+        "gesture.getMaxUserDefinedGesture",
+        "hand.subscribe",
+        "hand.unsubscribe",
+        "hand.startEnrollment",
+        "hand.stopEnrollment",
+        "hand.scan",
+        "hand.startMatching",
+        "hand.stopMatching",
+        "hand.cancelScan",
+        "hand.setSecurity",
+        "hand.setProfileName",
+        "hand.deleteProfile",
+        "hand.renameProfile",
+        "hand.getMaxUser",
+        "hand.getProfileList",
+        "hand.enableWakeup",
+        "hand.disableWakeup",
 };
 
 constexpr long kMaxDelayMs = 3600 * 1000;
 
-bool isOperation(std::string_view name) {
-    return std::find(std::begin(kOperations), std::end(kOperations), name) != std::end(kOperations);
+/** False when `name` names no operation of any service. */
+bool readOperation(const std::string& name, Fault* fault) {
+    if (std::find(std::begin(kOperations), std::end(kOperations), name) == std::end(kOperations)) {
+        return false;
+    }
+    const size_t dot = name.find('.');
+    const bool isManager = dot != std::string::npos;
+    fault->service = isManager ? *serviceKindOf(name.substr(0, dot)) : ServiceKind::kCompanion;
+    fault->operation = isManager ? name.substr(dot + 1) : name;
+    return true;
 }
 
 bool parseStatus(const std::string& text, int* status) {
@@ -90,10 +134,10 @@ std::optional<Fault> Fault::parse(const std::string& text, std::string* problem)
         return std::nullopt;
     }
     Fault fault;
-    fault.operation = text.substr(0, equals);
+    const std::string name = text.substr(0, equals);
     const std::string what = text.substr(equals + 1);
-    if (!isOperation(fault.operation)) {
-        *problem = "the service has no operation '" + fault.operation + "'";
+    if (!readOperation(name, &fault)) {
+        *problem = "the service has no operation '" + name + "'";
         return std::nullopt;
     }
     const bool isBlock = fault.operation == "getCblk";

@@ -8,21 +8,26 @@
 #include <string>
 #include <vector>
 
+#include "simulator/ServiceKind.h"
+
 namespace pemaro::simulator {
 
 /**
- * A misbehaviour ordered for one operation of the service, in the text form
+ * A misbehaviour ordered for one operation of a service, in the text form
  *
  *     OPERATION=status:NUMBER     the operation does nothing and returns this status
  *     OPERATION=delay:500ms       it is late by this time (ms or s)
  *     OPERATION=die               the process ends at once, without an answer
  *     getCblk=null                there is no control block
  *
- * OPERATION is a member function of ITouchCompanionService; a name with two overloads means both.
+ * OPERATION is a member function of ITouchCompanionService, where a name with two overloads means
+ * both; or one of a manager's service behind the manager's name: touch.enable, gesture.addGesture,
+ * hand.scan.
  */
 struct Fault {
     enum class Kind { kStatus, kDelay, kDie, kNull };
 
+    ServiceKind service = ServiceKind::kCompanion;
     std::string operation;
     Kind kind = Kind::kStatus;
     int status = 0;
@@ -32,7 +37,7 @@ struct Fault {
     static std::optional<Fault> parse(const std::string& text, std::string* problem);
 };
 
-/** The faults in force. Any thread may call. */
+/** The faults in force for a service. Any thread may call. */
 class FaultTable {
   public:
     /** The process's exit status when it dies at an operation. */

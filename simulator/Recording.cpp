@@ -6,6 +6,8 @@
 #include <mutex>
 #include <utility>
 
+#include "simulator/MonotonicTime.h"
+
 namespace pemaro::simulator {
 namespace {
 
@@ -86,11 +88,8 @@ void Recording::Worker::runUnpaced() {
 }
 
 const std::vector<uint8_t>& Recording::Worker::drawNext() {
-    const auto now = Clock::now().time_since_epoch();
-    const auto timeNs = std::chrono::duration_cast<std::chrono::nanoseconds>(now).count();
     const auto sequence = static_cast<uint32_t>(produced.fetch_add(1));
-    return generator.draw(sequence, static_cast<uint64_t>(timeNs),
-                          filter->load(std::memory_order_relaxed));
+    return generator.draw(sequence, monotonicTimeNs(), filter->load(std::memory_order_relaxed));
 }
 
 /** False when the recording is to end. */

@@ -2,7 +2,6 @@
 
 /// zelk-touchstack: the simulated touch stack as a process of its own.
 
-#include <binder/IServiceManager.h>
 #include <binder/ProcessState.h>
 #include <fmt/core.h>
 #include <signal.h>
@@ -10,25 +9,26 @@
 
 #include <CLI/CLI.hpp>
 #include <cstdio>
+#include <set>
 #include <string>
 #include <vector>
 
-#include "simulator/TouchCompanionSimulator.h"
+#include "simulator/TouchStack.h"
 #include "tools/common/BinderDriver.h"
 #include "tools/common/CommandLine.h"
 
 using pemaro::simulator::Fault;
+using pemaro::simulator::ManagerOptions;
+using pemaro::simulator::ServiceKind;
 using pemaro::simulator::SimulatorOptions;
-using pemaro::simulator::TouchCompanionSimulator;
+using pemaro::simulator::TouchStack;
 using pemaro::tools::kExitFailure;
 using pemaro::tools::kExitSuccess;
 
 namespace {
 
-constexpr const char* kServiceName = "pemaro.TouchService";
-
 struct CommandLine {
-    SimulatorOptions options;
+    TouchStack::Options options;
     std::vector<Fault> faults;
     bool showLog = false;
 };
@@ -38,8 +38,14 @@ int fail(const std::string& problem) {
     return kExitFailure;
 }
 
-void addOptions(CLI::App& app, CommandLine& line, std::vector<std::string>& faults) {
-    SimulatorOptions& options = line.options;
+/** The texts of a command line that are looked at when all are there. */
+struct Texts {
+    std::vector<std::string> services;
+    std::vector<std::string> faults;
+};
+
+void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
+    SimulatorOptions& options = line.options.companion;
     app.add_option("--rate", options.rate, "Frames a second; 0 is as fast as the client takes them")
             ->check(CLI::Range(0.0, SimulatorOptions::kMaxRate))
             ->capture_default_str();
@@ -56,11 +62,46 @@ void addOptions(CLI::App& app, CommandLine& line, std::vector<std::string>& faul
                    "Where the configuration is saved and reloaded when no path is told");
     app.add_option("--auth", options.authText, "What clients authenticate with")
             ->capture_default_str();
-    app.add_option("--fault", faults,
+    app.add_option("--fault", texts.faults,
                    "A fault to order, as OPERATION=status:NUMBER, OPERATION=delay:500ms, "
-                   "OPERATION=die or getCblk=null; may be repeated")
+                   "OPERATION=die or getCblk=null; a manager's operation is touch.OPERATION, "
+                   "gesture.OPERATION or hand.OPERATION; may be repeated")
             ->allow_extra_args(false);
     app.add_flag("--log", line.showLog, "Show the platform's log lines");
+    app.add_option("--services", texts.services,
+                   "Serve only these: companion, touch, gesture, hand, separated by commas")
+            ->delimiter(',')
+            ->allow_extra_args(false);
+}
+
+void addManagerOptions(CLI::App& app, ManagerOptions& options) {
+    app.add_option("--gesture-rate", options.gestureRate,
+                   "Gestures a second of the touch and the gesture manager")
+            ->check(CLI::Range(0.0, ManagerOptions::kMaxRate))
+            ->capture_default_str();
+    app.add_option("--hand-rate", options.handRate,
+                   "Steps a second of an enrollment, a scan or a matching")
+            ->check(CLI::Range(0.0, ManagerOptions::kMaxRate))
+            ->capture_default_str();
+    app.add_option("--user-gestures", options.userGestures, "Gestures that can be defined")
+            ->check(CLI::Range(0u, ManagerOptions::kMaxUserGestures))
+            ->capture_default_str();
+    app.add_option("--hand-profiles", options.handProfiles, "Hands that can be enrolled")
+            ->check(CLI::Range(0u, ManagerOptions::kMaxHandProfiles))
+            ->capture_default_str();
+}
+
+void readServices(const std::vector<std::string>& names, std::set<ServiceKind>& services) {
+    if (!names.empty()) {
+        services.clear();
+    }
+    for (const std::string& name : names) {
+        const auto service = pemaro::simulator::serviceKindOf(name);
+        if (!service) {
+            throw CLI::ValidationError("--services", fmt::format("there is no '{}'", name));
+        }
+        services.insert(*service);
+    }
 }
 
 void readFaults(const std::vector<std::string>& texts, std::vector<Fault>& faults) {
@@ -82,17 +123,27 @@ void checkRing(const SimulatorOptions& options) {
     }
 }
 
-void describe(const CommandLine& line) {
-    const SimulatorOptions& options = line.options;
+void describeFrames(const SimulatorOptions& options) {
     const std::string rate = options.rate > 0 ? fmt::format("{:g} frames/s", options.rate)
                                               : std::string("as fast as they are taken");
-    fmt::print("serving     {}\n", kServiceName);
     fmt::print("frames      {} bytes, {}, {} fingers\n", options.frameBytes, rate, options.fingers);
     fmt::print("ring        {} frames, {} bytes\n", options.ringFrames,
                pemaro::kTouchCompanionRingOffset + size_t{options.frameBytes} * options.ringFrames);
     if (!options.configPath.empty()) {
         fmt::print("config      {}\n", options.configPath);
     }
+}
+
+void describe(const CommandLine& line) {
+    const TouchStack::Options& options = line.options;
+    for (const ServiceKind service : options.services) {
+        fmt::print("serving     {}\n", pemaro::simulator::registeredName(service));
+    }
+    if (options.services.count(ServiceKind::kCompanion) != 0) {
+        describeFrames(options.companion);
+    }
+    fmt::print("events      {:g} gestures/s, {:g} hand steps/s\n", options.managers.gestureRate,
+               options.managers.handRate);
     if (!line.faults.empty()) {
         fmt::print("faults      {}\n", line.faults.size());
     }
@@ -118,44 +169,45 @@ int serve(CommandLine& line) {
     if (!problem.empty()) {
         return fail(problem);
     }
-    line.options.narrate = [](const std::string& text) {
+    line.options.companion.narrate = line.options.managers.narrate = [](const std::string& text) {
         fmt::print("{}\n", text);
         fflush(stdout);
     };
-    android::sp<TouchCompanionSimulator> service = new TouchCompanionSimulator(line.options);
+    TouchStack stack(line.options);
     for (const Fault& fault : line.faults) {
-        service->faults().add(fault);
+        stack.order(fault);
     }
     android::ProcessState::self()->startThreadPool();
-    const android::status_t status =
-            android::defaultServiceManager()->addService(android::String16(kServiceName), service);
-    if (status != android::OK) {
-        return fail(
-                fmt::format("the service manager refused {}: {}", kServiceName, strerror(-status)));
+    const std::string refusal = stack.registerAll();
+    if (!refusal.empty()) {
+        return fail(refusal);
     }
     describe(line);
 
     int received = 0;
     sigwait(&signals, &received);
-    service->shutDown();
-    const TouchCompanionSimulator::Totals totals = service->totals();
-    fmt::print("stopped: {} recordings, {} frames, {} without room in the ring\n",
-               totals.recordings, totals.produced, totals.dropped);
+    stack.shutDown();
+    for (const std::string& text : stack.summary()) {
+        fmt::print("{}\n", text);
+    }
     return kExitSuccess;
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
-    CLI::App app("A simulated touch stack that serves " + std::string(kServiceName) +
-                         " over Binder until SIGINT or SIGTERM.",
-                 "zelk-touchstack");
+    CLI::App app(
+            "A simulated touch stack that serves the touch companion and the touch, gesture "
+            "and hand biometric managers over Binder until SIGINT or SIGTERM.",
+            "zelk-touchstack");
     CommandLine line;
-    std::vector<std::string> faults;
-    addOptions(app, line, faults);
+    Texts texts;
+    addOptions(app, line, texts);
+    addManagerOptions(app, line.options.managers);
     const auto done = pemaro::tools::parseCommandLine(app, argc, argv, [&] {
-        readFaults(faults, line.faults);
-        checkRing(line.options);
+        readServices(texts.services, line.options.services);
+        readFaults(texts.faults, line.faults);
+        checkRing(line.options.companion);
     });
     if (done) {
         return *done;
