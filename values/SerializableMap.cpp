@@ -41,8 +41,7 @@ void mergeNew(SerializableMap& to, Entries& from, const std::vector<size_t>& pos
 
 SerializableMap::SerializableMap() : DefaultKeyedVector(defaultValue()) {}
 
-SerializableMap::SerializableMap(const SerializableMap& other)
-        : DefaultKeyedVector(defaultValue()) {
+SerializableMap::SerializableMap(const SerializableMap& other) : DefaultKeyedVector(other) {
     copyTree(other, *this);
 }
 
