@@ -127,8 +127,11 @@ int record(const RecordOptions& options) {
         return tools::kExitFailure;
     }
     const int packetSize = facade->getPacketSize();
-    if (packetSize <= 0 || packetSize >= STATUS_UNKNOWN_ERROR) {
+    if (packetSize >= STATUS_UNKNOWN_ERROR) {
         return failStatus("getPacketSize", packetSize);
+    }
+    if (packetSize <= 0) {
+        return fail(fmt::format("the service tells a packet size of {} bytes", packetSize));
     }
     receiver.setPacketSize(static_cast<uint32_t>(packetSize));
     if (!options.output.empty() && !file.open(options.output)) {
