@@ -19,10 +19,9 @@ die_usage() {
     exit 2
 }
 
-# The last line of a log that tells what went wrong, else its last line.
-last_error() {
-    local log=$1
-    { grep -aE '^(E:|W:|.*[Ee]rror)' "$log" || tail -n 5 "$log"; } | tail -n 1
+# The first line of a log that tells what went wrong, else its last line.
+first_error() {
+    grep -a -m 1 -E '^E:|[Ee]rror' "$1" || tail -n 1 "$1"
 }
 
 # run_logged <sentence for a failure> <command …>: runs it with its output in a log, which is named when
@@ -31,7 +30,7 @@ run_logged() {
     local failure=$1 log=$ZELK_CACHE/logs/$2.log
     shift
     mkdir -p -- "$ZELK_CACHE/logs"
-    "$@" >"$log" 2>&1 </dev/null || die "$failure: $(last_error "$log") (log: $log)"
+    "$@" >"$log" 2>&1 </dev/null || die "$failure: $(first_error "$log") (log: $log)"
 }
 
 free_megabytes() {
