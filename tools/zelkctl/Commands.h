@@ -15,5 +15,8 @@ using Action = std::function<int()>;
  */
 void addPingCommand(CLI::App& app, Action& action);
 void addRecordCommand(CLI::App& app, Action& action);
+void addTouchCommands(CLI::App& app, Action& action);
+void addGestureCommands(CLI::App& app, Action& action);
+void addHandCommands(CLI::App& app, Action& action);
 
 }  // namespace pemaro::zelkctl

@@ -43,7 +43,7 @@ std::unique_ptr<Connection> Connection::open() {
     const sp<IBinder> service =
             android::defaultServiceManager()->checkService(String16(kServiceName));
     if (service == nullptr) {
-        fail(fmt::format("the service {} is not running", kServiceName));
+        failAbsent(kServiceName);
         return nullptr;
     }
     const sp<DeathNotice> notice = new DeathNotice();

@@ -18,6 +18,11 @@ inline int fail(const std::string& problem) {
     return tools::kExitFailure;
 }
 
+/** The same for a service that is not there. */
+inline int failAbsent(const std::string& service) {
+    return fail(fmt::format("the service {} is not running", service));
+}
+
 /** The same for an operation that returned a status. */
 inline int failStatus(const std::string& operation, int status) {
     return fail(operation + ": " + errStr(status));

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 
-/// zelkctl: the touch companion client as a command line.
+/// zelkctl: the clients as a command line.
 
 #include <signal.h>
 
@@ -16,6 +16,9 @@ int main(int argc, char** argv) {
     pemaro::zelkctl::Action action;
     pemaro::zelkctl::addPingCommand(app, action);
     pemaro::zelkctl::addRecordCommand(app, action);
+    pemaro::zelkctl::addTouchCommands(app, action);
+    pemaro::zelkctl::addGestureCommands(app, action);
+    pemaro::zelkctl::addHandCommands(app, action);
 
     if (const auto done = pemaro::tools::parseCommandLine(app, argc, argv)) {
         return *done;
