@@ -11,6 +11,7 @@
 
 #include "tests/companion/TouchCompanionClientTest.h"
 #include "tests/support/FakeClock.h"
+#include "tests/support/RecordingBinder.h"
 
 namespace pemaro::test {
 namespace {
@@ -169,6 +170,20 @@ TEST_F(TouchCompanionRecording, FailsWhenTheBlockCannotBeMapped) {
     EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
     EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk"));
     EXPECT_THAT(clientLines(), IsEmpty());
+}
+
+TEST_F(TouchCompanionRecording, FailsWhenTheBinderIsNoMemory) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(1);
+    forget();
+    const sp<RecordingBinder> other = new RecordingBinder;
+    mService->cblk = android::IMemory::asInterface(other);
+    for (const Bytes& garbage : {Bytes{}, Bytes{1, 2, 3}, Bytes(64, 0xff)}) {
+        other->answer(
+                [&](android::Parcel& reply) { reply.setData(garbage.data(), garbage.size()); });
+        EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
+    }
+    EXPECT_THAT(mService->calls(), Not(Contains("startRecord")));
 }
 
 TEST_F(TouchCompanionRecording, FailsWhenTheMemoryIsTooSmallForABlock) {
@@ -490,7 +505,8 @@ TEST_F(TouchCompanionRecording, CallsBackOnAThreadOfItsOwn) {
 
 TEST_F(TouchCompanionRecording, GoesOnAfterAPassWithoutFrames) {
     const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
-    while (mWaits.deadlines().size() < 2 * 63) {
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+    while (mWaits.deadlines().size() < 2 * 63 && std::chrono::steady_clock::now() < giveUp) {
         usleep(1000);
     }
     mRing.put();
@@ -522,16 +538,13 @@ TEST_F(TouchCompanionRecording, DeliversEveryFrameOfAFastWriter) {
     mWaits.onWait([](int) { std::this_thread::yield(); });
     StreamCheck check{mRing};
     const sp<TouchCompanionClient> client = record(mRing, StreamCheck::callback, &check);
-    for (uint32_t written = 0; written < kFrames;) {
-        if (mRing.put()) {
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+    for (uint32_t written = 0; check.seen < kFrames && std::chrono::steady_clock::now() < giveUp;) {
+        if (written < kFrames && mRing.put()) {
             ++written;
         } else {
             std::this_thread::yield();
         }
-    }
-    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
-    while (check.seen < kFrames && std::chrono::steady_clock::now() < giveUp) {
-        std::this_thread::yield();
     }
     EXPECT_EQ(0, client->stopRecord());
     EXPECT_EQ(kFrames, check.seen);

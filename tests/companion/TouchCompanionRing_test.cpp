@@ -218,6 +218,21 @@ TEST_F(TouchCompanionRing, WaitsUntilSixteenMillisecondsFromNow) {
     }
 }
 
+TEST_F(TouchCompanionRing, CarriesADeadlineIntoTheNextSecond) {
+    timespec before = {};
+    for (bool carried = false; !carried;) {
+        do {
+            usleep(1000);
+            clock_gettime(CLOCK_REALTIME, &before);
+        } while (before.tv_nsec < 984000000);
+        const size_t first = mWaits.deadlines().size();
+        acquire(kFrameSize);
+        const timespec deadline = mWaits.deadlines()[first];
+        carried = deadline.tv_sec == before.tv_sec + 1 && deadline.tv_nsec < 16000000;
+        ASSERT_LT(deadline.tv_nsec, 1000000000);
+    }
+}
+
 // A frame that arrives during a wait is seen at the next look, which one more wait follows.
 TEST_F(TouchCompanionRing, ReturnsOneWaitAfterTheOneThatBroughtFrames) {
     mWaits.onWait([&](int number) {
@@ -316,8 +331,9 @@ TEST_F(TouchCompanionClientTest, TimesOutAfterAboutASecond) {
 
 // One thread writes as fast as the ring lets it and another reads: no frame is lost, torn or seen twice.
 void streamThrough(TouchCompanionClient& client, FrameRing& ring, uint32_t frames) {
+    std::atomic<bool> stopped{false};
     std::thread writer([&] {
-        for (uint32_t written = 0; written < frames;) {
+        for (uint32_t written = 0; written < frames && !stopped;) {
             if (ring.put()) {
                 ++written;
             } else {
@@ -325,8 +341,10 @@ void streamThrough(TouchCompanionClient& client, FrameRing& ring, uint32_t frame
             }
         }
     });
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
     uint32_t number = ring.cblk().read;
-    for (uint32_t seen = 0; seen < frames;) {
+    uint32_t seen = 0;
+    while (seen < frames && std::chrono::steady_clock::now() < giveUp) {
         FrameBuffer buffer = {nullptr, 3 * kFrameSize, 0};
         if (client.acquireBuffer(&buffer) != 0) {
             continue;
@@ -338,6 +356,8 @@ void streamThrough(TouchCompanionClient& client, FrameRing& ring, uint32_t frame
         seen += buffer.frameCount;
         clearLog();
     }
+    EXPECT_EQ(frames, seen);
+    stopped = true;
     writer.join();
 }
 
