@@ -36,12 +36,9 @@ enum {
     GET_MAX_USERDEFINED_GESTURE,
 };
 
-// Log readers know these texts so; they stay: unsubscribe's entry has a colon and a blank, the
-// wake-up operations fail as "enable()" and "disable()", the limits fail without parentheses, and
-// what the transactions call ENABLE, DISABLE and VERIFY_GESTURE the operations call otherwise.
-constexpr ProxyRow kSubscribe = managerRow(SUBSCRIBE, "Bp::subscribe", "subscribe() error: %s");
-constexpr ProxyRow kUnsubscribe =
-        managerRow(UNSUBSCRIBE, "Bp: unsubscribe", "unsubscribe() error: %s");
+// Log readers know these texts so; they stay: the wake-up operations fail as "enable()" and
+// "disable()", the limits fail without parentheses, and what the transactions call ENABLE, DISABLE
+// and VERIFY_GESTURE the operations call otherwise.
 constexpr ProxyRow kEnableWakeup =
         managerRow(ENABLE_WAKEUP, "Bp::enableWakeup", "enable() error: %s");
 constexpr ProxyRow kDisableWakeup =
@@ -84,15 +81,11 @@ BpGestureManagerService::BpGestureManagerService(const sp<IBinder>& remote)
         : BpInterface<IGestureManagerService>(remote) {}
 
 int BpGestureManagerService::subscribe(const sp<IGestureManagerClient>& client) {
-    Call call(kSubscribe);
-    call.writeClient(client);
-    return call.transactForStatus(remote());
+    return Call(kSubscribe).transactWithClient(remote(), client);
 }
 
 int BpGestureManagerService::unsubscribe(const sp<IGestureManagerClient>& client) {
-    Call call(kUnsubscribe);
-    call.writeClient(client);
-    return call.transactForStatus(remote());
+    return Call(kUnsubscribe).transactWithClient(remote(), client);
 }
 
 int BpGestureManagerService::enableWakeup() {

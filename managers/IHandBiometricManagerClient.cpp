@@ -16,9 +16,7 @@ using android::status_t;
 
 namespace {
 
-enum {
-    INJECT_HANDBIOMETRIC = IBinder::FIRST_CALL_TRANSACTION,
-};
+constexpr uint32_t INJECT_HANDBIOMETRIC = IBinder::FIRST_CALL_TRANSACTION;
 
 constexpr ProxyRow kHandBiometricCallback = managerRow(
         INJECT_HANDBIOMETRIC, "Bp::handBiometricCallback", "handBiometricCallback() error: %s");
@@ -29,9 +27,8 @@ BpHandBiometricManagerClient::BpHandBiometricManagerClient(const sp<IBinder>& re
         : BpInterface<IHandBiometricManagerClient>(remote) {}
 
 int BpHandBiometricManagerClient::handBiometricCallback(HandBioData* data) {
-    ManagerCall call(LOG_TAG, kHandBiometricCallback, descriptor);
-    call.writeRecords(data, 1);
-    return call.transactForStatus(remote());
+    return ManagerCall(LOG_TAG, kHandBiometricCallback, descriptor)
+            .transactWithRecord(remote(), data);
 }
 
 IMPLEMENT_META_INTERFACE(HandBiometricManagerClient, "pemaro.HandBiometricManagerClient")

@@ -44,12 +44,8 @@ enum {
     DISABLE_WAKEUP,
 };
 
-// Log readers know these texts so; they stay: unsubscribe's entry has a colon and a blank, only the
-// subscriptions fail with parentheses, and the wake-up operations fail as "enable()" and
-// "disable()".
-constexpr ProxyRow kSubscribe = managerRow(SUBSCRIBE, "Bp::subscribe", "subscribe() error: %s");
-constexpr ProxyRow kUnsubscribe =
-        managerRow(UNSUBSCRIBE, "Bp: unsubscribe", "unsubscribe() error: %s");
+// Log readers know these texts so; they stay: only the subscriptions fail with parentheses, and the
+// wake-up operations fail as "enable()" and "disable()".
 constexpr ProxyRow kStartEnrollment =
         managerRow(START_ENROLLMENT, "Bp::startEnrollment", "startEnrollment error: %s");
 constexpr ProxyRow kStopEnrollment =
@@ -106,15 +102,11 @@ BpHandBiometricManagerService::BpHandBiometricManagerService(const sp<IBinder>& 
         : BpInterface<IHandBiometricManagerService>(remote) {}
 
 int BpHandBiometricManagerService::subscribe(const sp<IHandBiometricManagerClient>& client) {
-    Call call(kSubscribe);
-    call.writeClient(client);
-    return call.transactForStatus(remote());
+    return Call(kSubscribe).transactWithClient(remote(), client);
 }
 
 int BpHandBiometricManagerService::unsubscribe(const sp<IHandBiometricManagerClient>& client) {
-    Call call(kUnsubscribe);
-    call.writeClient(client);
-    return call.transactForStatus(remote());
+    return Call(kUnsubscribe).transactWithClient(remote(), client);
 }
 
 int BpHandBiometricManagerService::startEnrollment() {

@@ -16,9 +16,7 @@ using android::status_t;
 
 namespace {
 
-enum {
-    INJECT_GESTURE = IBinder::FIRST_CALL_TRANSACTION,
-};
+constexpr uint32_t INJECT_GESTURE = IBinder::FIRST_CALL_TRANSACTION;
 
 constexpr ProxyRow kGestureCallback =
         managerRow(INJECT_GESTURE, "Bp::gestureCallback", "gestureCallback() error: %s");
@@ -29,9 +27,7 @@ BpTouchManagerClient::BpTouchManagerClient(const sp<IBinder>& remote)
         : BpInterface<ITouchManagerClient>(remote) {}
 
 int BpTouchManagerClient::gestureCallback(GestureData* data) {
-    ManagerCall call(LOG_TAG, kGestureCallback, descriptor);
-    call.writeRecords(data, 1);
-    return call.transactForStatus(remote());
+    return ManagerCall(LOG_TAG, kGestureCallback, descriptor).transactWithRecord(remote(), data);
 }
 
 IMPLEMENT_META_INTERFACE(TouchManagerClient, "pemaro.TouchManagerClient")

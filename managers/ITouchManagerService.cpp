@@ -30,10 +30,6 @@ enum {
     CONFIGURE_VM_REGION,
 };
 
-// The entry of unsubscribe has a colon and a blank. Log readers know it so; it stays.
-constexpr ProxyRow kSubscribe = managerRow(SUBSCRIBE, "Bp::subscribe", "subscribe() error: %s");
-constexpr ProxyRow kUnsubscribe =
-        managerRow(UNSUBSCRIBE, "Bp: unsubscribe", "unsubscribe() error: %s");
 constexpr ProxyRow kIsSupported =
         managerRow(IS_SUPPORTED, "Bp::isSupported", "isSupported() error: %s");
 constexpr ProxyRow kIsEnabled = managerRow(IS_ENABLED, "Bp::isEnabled", "isEnabled() error: %s");
@@ -63,15 +59,11 @@ BpTouchManagerService::BpTouchManagerService(const sp<IBinder>& remote)
         : BpInterface<ITouchManagerService>(remote) {}
 
 int BpTouchManagerService::subscribe(const sp<ITouchManagerClient>& client) {
-    Call call(kSubscribe);
-    call.writeClient(client);
-    return call.transactForStatus(remote());
+    return Call(kSubscribe).transactWithClient(remote(), client);
 }
 
 int BpTouchManagerService::unsubscribe(const sp<ITouchManagerClient>& client) {
-    Call call(kUnsubscribe);
-    call.writeClient(client);
-    return call.transactForStatus(remote());
+    return Call(kUnsubscribe).transactWithClient(remote(), client);
 }
 
 int BpTouchManagerService::isSupported(int feature, bool& supported) {

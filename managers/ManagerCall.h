@@ -25,13 +25,13 @@ constexpr ProxyRow managerRow(uint32_t code, const char* entry, const char* tran
     return {code, entry, transportError, nullptr};
 }
 
+// The first two transactions of each service. The second one's entry has a colon and a blank; log
+// readers know it so, and it stays.
+constexpr ProxyRow kSubscribe = managerRow(1, "Bp::subscribe", "subscribe() error: %s");
+constexpr ProxyRow kUnsubscribe = managerRow(2, "Bp: unsubscribe", "unsubscribe() error: %s");
+
 struct ManagerCall : ProxyCall {
     using ProxyCall::ProxyCall;
-
-    template <typename Client>
-    void writeClient(const android::sp<Client>& client) {
-        request.writeStrongBinder(android::IInterface::asBinder(client));
-    }
 
     /// A negative count is more bytes than any request holds: then nothing is written.
     template <typename Record>
@@ -39,6 +39,20 @@ struct ManagerCall : ProxyCall {
         if (records != nullptr) {
             request.write(records, static_cast<size_t>(count) * sizeof(Record));
         }
+    }
+
+    /// For subscribing and unsubscribing.
+    template <typename Client>
+    int transactWithClient(android::IBinder* remote, const android::sp<Client>& client) {
+        request.writeStrongBinder(android::IInterface::asBinder(client));
+        return transactForStatus(remote);
+    }
+
+    /// For the callbacks.
+    template <typename Record>
+    int transactWithRecord(android::IBinder* remote, const Record* record) {
+        writeRecords(record, 1);
+        return transactForStatus(remote);
     }
 
     /// For the operations that answer with a number and the status.

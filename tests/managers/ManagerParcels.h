@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "tests/support/ParcelBytes.h"
+#include "tests/support/RecordingBinder.h"
 
 namespace pemaro::test {
 
@@ -31,6 +32,15 @@ inline ParcelWriter names(std::vector<const char*> values) {
             parcel.writeCString(value);
         }
     };
+}
+
+/// The codes of the transactions that reached `remote`, in order.
+inline std::vector<uint32_t> codesOf(const android::sp<RecordingBinder>& remote) {
+    std::vector<uint32_t> codes;
+    for (const RecordingBinder::Transaction& transaction : remote->transactions()) {
+        codes.push_back(transaction.code);
+    }
+    return codes;
 }
 
 /// `count` records whose bytes tell where they are.

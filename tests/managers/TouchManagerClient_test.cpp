@@ -4,7 +4,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <cstdio>
 #include <cstdlib>
 #include <string>
 #include <vector>
@@ -55,12 +54,6 @@ void callbackB(Gesture* record, void* context) {
     gEvents.push_back({'B', record, context});
 }
 
-std::string withAddress(const char* text, const void* address) {
-    char line[128];
-    snprintf(line, sizeof(line), text, address);
-    return line;
-}
-
 std::string eventLine(const TouchManagerClient* client) {
     return withAddress("E Gesture event detected (client address = %p)", client);
 }
@@ -86,13 +79,7 @@ class TouchManagerClientTest : public ::testing::Test {
         return client;
     }
 
-    std::vector<uint32_t> codes() const {
-        std::vector<uint32_t> codes;
-        for (const auto& transaction : mRemote->transactions()) {
-            codes.push_back(transaction.code);
-        }
-        return codes;
-    }
+    std::vector<uint32_t> codes() const { return codesOf(mRemote); }
 
     static Bytes requestWith(const sp<TouchManagerClient>& client) {
         return requestBytes(kService, [&](Parcel& p) { p.writeStrongBinder(client); });

@@ -6,7 +6,6 @@
 #include <gtest/gtest.h>
 
 #include <chrono>
-#include <cstdio>
 #include <functional>
 #include <string>
 #include <thread>
@@ -31,12 +30,6 @@ using ::testing::Each;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
-
-std::string withAddress(const char* text, const void* address) {
-    char line[128];
-    snprintf(line, sizeof(line), text, address);
-    return line;
-}
 
 // What distinguishes the two clients.
 
@@ -132,15 +125,7 @@ class WatchedManagerClient : public ::testing::Test {
         return client;
     }
 
-    static std::vector<uint32_t> codes(const sp<RecordingBinder>& remote) {
-        std::vector<uint32_t> codes;
-        for (const auto& transaction : remote->transactions()) {
-            codes.push_back(transaction.code);
-        }
-        return codes;
-    }
-
-    std::vector<uint32_t> codes() const { return codes(mRemote); }
+    std::vector<uint32_t> codes() const { return codesOf(mRemote); }
     static Lines lines() { return linesOf(T::kTag); }
 
     static Bytes requestWith(const sp<Client>& client) {
@@ -439,7 +424,7 @@ TYPED_TEST(WatchedManagerClient, ReconnectsByDeinitAndInit) {
     restarted->answer(numbers({0}));
     this->mServices->add(TypeParam::kService, restarted);
     EXPECT_EQ(0, client->init());
-    EXPECT_THAT(this->codes(restarted), ElementsAre(kSubscribe));
+    EXPECT_THAT(codesOf(restarted), ElementsAre(kSubscribe));
     EXPECT_EQ(0, this->operation(client));
     restarted->die();
     EXPECT_EQ(2, this->mCaller.deaths);

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tests/support/LogLines.h"
 
+#include <cstdio>
+
 #include "tests/support/LogRecorder.h"
 
 namespace pemaro::test {
@@ -26,6 +28,12 @@ Lines linesOf(const std::string& tag) {
         }
     }
     return result;
+}
+
+std::string withAddress(const char* format, const void* address) {
+    char line[256];
+    snprintf(line, sizeof(line), format, address);
+    return line;
 }
 
 void clearLog() {

@@ -12,6 +12,9 @@ using Lines = std::vector<std::string>;
 /// "D Bp::open", "E init() error: Broken pipe".
 Lines linesOf(const std::string& tag);
 
+/// `format`, a text with one %p, as it is logged with `address`.
+std::string withAddress(const char* format, const void* address);
+
 /// The recorder begins anew.
 void clearLog();
 
