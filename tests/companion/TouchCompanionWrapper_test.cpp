@@ -390,36 +390,31 @@ TEST_F(OlderFacade, DescribesNoFormat) {
 
 // ---- the interfaces as they are declared ----
 
+// The positions that both have.
+template <typename Interface>
+void expectCommonOrder() {
+    using OfParams = int (Interface::*)(ISerializableParams4*);
+    using GetBinary = int (Interface::*)(void*, unsigned long*);
+    using SetBinary = int (Interface::*)(const void*, unsigned long);
+    EXPECT_EQ(2, slotOf(&Interface::getClassID));
+    EXPECT_EQ(3, slotOf(&Interface::init));
+    EXPECT_EQ(4, slotOf(&Interface::setRecordOutput));
+    EXPECT_EQ(5, slotOf(&Interface::startRecord));
+    EXPECT_EQ(6, slotOf(&Interface::stopRecord));
+    EXPECT_EQ(7, slotOf<OfParams>(&Interface::getConfigParams));
+    EXPECT_EQ(8, slotOf<OfParams>(&Interface::setConfigParams));
+    EXPECT_EQ(9, slotOf<GetBinary>(&Interface::getConfigParams));
+    EXPECT_EQ(10, slotOf<SetBinary>(&Interface::setConfigParams));
+}
+
 TEST(CompanionFacadeInterfaces, DeclareTheirOperationsInTheOrderOfTheTable) {
-    using GetMap = int (Facade::*)(ISerializableParams4*);
-    using GetBinary = int (Facade::*)(void*, unsigned long*);
-    using SetBinary = int (Facade::*)(const void*, unsigned long);
-    EXPECT_EQ(2, slotOf(&Facade::getClassID));
-    EXPECT_EQ(3, slotOf(&Facade::init));
-    EXPECT_EQ(4, slotOf(&Facade::setRecordOutput));
-    EXPECT_EQ(5, slotOf(&Facade::startRecord));
-    EXPECT_EQ(6, slotOf(&Facade::stopRecord));
-    EXPECT_EQ(7, slotOf<GetMap>(&Facade::getConfigParams));
-    EXPECT_EQ(8, slotOf<GetMap>(&Facade::setConfigParams));
-    EXPECT_EQ(9, slotOf<GetBinary>(&Facade::getConfigParams));
-    EXPECT_EQ(10, slotOf<SetBinary>(&Facade::setConfigParams));
+    expectCommonOrder<Facade>();
     EXPECT_EQ(11, slotOf(&Facade::getPacketSize));
     EXPECT_EQ(12, slotOf(&Facade::inspect));
     EXPECT_EQ(13, slotOf(&Facade::setRecordFilter));
     EXPECT_EQ(14, slotOf(&Facade::sendCommand));
 
-    using GetMapOld = int (FacadeOld::*)(ISerializableParams4*);
-    using GetBinaryOld = int (FacadeOld::*)(void*, unsigned long*);
-    using SetBinaryOld = int (FacadeOld::*)(const void*, unsigned long);
-    EXPECT_EQ(2, slotOf(&FacadeOld::getClassID));
-    EXPECT_EQ(3, slotOf(&FacadeOld::init));
-    EXPECT_EQ(4, slotOf(&FacadeOld::setRecordOutput));
-    EXPECT_EQ(5, slotOf(&FacadeOld::startRecord));
-    EXPECT_EQ(6, slotOf(&FacadeOld::stopRecord));
-    EXPECT_EQ(7, slotOf<GetMapOld>(&FacadeOld::getConfigParams));
-    EXPECT_EQ(8, slotOf<GetMapOld>(&FacadeOld::setConfigParams));
-    EXPECT_EQ(9, slotOf<GetBinaryOld>(&FacadeOld::getConfigParams));
-    EXPECT_EQ(10, slotOf<SetBinaryOld>(&FacadeOld::setConfigParams));
+    expectCommonOrder<FacadeOld>();
     EXPECT_EQ(11, slotOf(&FacadeOld::getFormatDescription));
     EXPECT_EQ(12, slotOf(&FacadeOld::getPacketSize));
     EXPECT_EQ(13, slotOf(&FacadeOld::inspect));
