@@ -327,9 +327,11 @@ TEST_F(TouchCompanionDelivery, HandsOneFrameToTheCallbackAndReleasesIt) {
 }
 
 TEST_F(TouchCompanionDelivery, EndsAPassWithoutFramesWithItsStatus) {
+    const size_t waitsBefore =
+            mWaits.deadlines().size();  // the thread of the set-up may have waited
     mClient->processData();
     EXPECT_EQ(0u, mFrames.count());
-    EXPECT_EQ(63u, mWaits.deadlines().size());
+    EXPECT_EQ(waitsBefore + 63, mWaits.deadlines().size());
     const Lines lines = clientLines();
     ASSERT_GE(lines.size(), 3u);
     EXPECT_EQ("E acquireBuffer: totalWaitTime exceeds, TIME_OUT", lines[lines.size() - 3]);
