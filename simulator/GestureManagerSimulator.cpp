@@ -185,11 +185,11 @@ int GestureManagerSimulator::improveGestureTraining(Sample* sample, int& result)
 
 int GestureManagerSimulator::mostSimilar(const Stroke& stroke) const {
     int best = kNone;
-    double similarity = kSimilarEnough;
+    double similarity = 0;
     for (const auto& [number, gesture] : mGestures) {
         for (const Stroke& sample : gesture.samples) {
             const double similar = strokeSimilarity(stroke, sample);
-            if (gesture.enabled && similar >= similarity) {
+            if (gesture.enabled && similar >= kSimilarEnough && similar > similarity) {
                 best = number;
                 similarity = similar;
             }

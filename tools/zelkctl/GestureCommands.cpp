@@ -114,13 +114,14 @@ void addLimitsCommand(CLI::App& gesture, Action& action) {
 void addGestureCommands(CLI::App& app, Action& action) {
     CLI::App* gesture = app.add_subcommand("gesture", "Talk to the gesture manager");
     gesture->require_subcommand(1);
-    addSwitchCommand<GestureManager>(*gesture, action, "wakeup", "Whether gestures wake the device",
-                                     "wake-up", {"on", "enableWakeup", &Client::enableWakeup},
-                                     {"off", "disableWakeup", &Client::disableWakeup});
     addSwitchCommand<GestureManager>(
-            *gesture, action, "detect", "Whether gestures are looked for", "detection",
-            {"start", "startGestureDetection", &Client::startGestureDetection},
-            {"stop", "stopGestureDetection", &Client::stopGestureDetection});
+            *gesture, action, "wakeup", "Whether gestures wake the device",
+            {"on", "enableWakeup", &Client::enableWakeup, "wake-up on"},
+            {"off", "disableWakeup", &Client::disableWakeup, "wake-up off"});
+    addSwitchCommand<GestureManager>(
+            *gesture, action, "detect", "Whether gestures are looked for",
+            {"start", "startGestureDetection", &Client::startGestureDetection, "detection started"},
+            {"stop", "stopGestureDetection", &Client::stopGestureDetection, "detection stopped"});
     addAddCommand(*gesture, action);
     addNumberCommand<GestureManager>(*gesture, action, "delete", "Forget a defined gesture",
                                      "gesture", "deleteGesture", &Client::deleteGesture);

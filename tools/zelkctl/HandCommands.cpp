@@ -202,8 +202,8 @@ void addHandCommands(CLI::App& app, Action& action) {
     addNameCommand(*hand, action, "delete", "Forget a profile", "deleteProfile",
                    &Client::deleteProfile, "deleted");
     addSwitchCommand<HandManager>(*hand, action, "wakeup", "Whether a hand wakes the device",
-                                  "wake-up", {"on", "enableWakeup", &Client::enableWakeup},
-                                  {"off", "disableWakeup", &Client::disableWakeup});
+                                  {"on", "enableWakeup", &Client::enableWakeup, "wake-up on"},
+                                  {"off", "disableWakeup", &Client::disableWakeup, "wake-up off"});
     addManagerWatchCommand<HandManager>(*hand, action, "Print each event that is reported");
 }
 

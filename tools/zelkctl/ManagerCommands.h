@@ -39,18 +39,19 @@ void addNumberCommand(CLI::App& manager, Action& action, const char* name, const
     });
 }
 
-/** One of the two words that a switch takes, and what it does. */
+/** One of the two words that a switch takes, and what it does and prints. */
 template <typename Client>
 struct SwitchWord {
     const char* word;
     const char* operationName;
     int (Client::*operation)();
+    const char* done;
 };
 
-/** A command that takes one of two words; prints "WHAT WORD". */
+/** A command that takes one of two words. */
 template <typename Manager>
 void addSwitchCommand(CLI::App& manager, Action& action, const char* name, const char* help,
-                      const char* what, SwitchWord<typename Manager::Client> on,
+                      SwitchWord<typename Manager::Client> on,
                       SwitchWord<typename Manager::Client> off) {
     using Client = typename Manager::Client;
     auto word = std::make_shared<std::string>();
@@ -63,8 +64,7 @@ void addSwitchCommand(CLI::App& manager, Action& action, const char* name, const
             const SwitchWord<Client>& chosen = *word == on.word ? on : off;
             return operate<Manager>(
                     chosen.operationName,
-                    [&](Client& client) { return (client.*chosen.operation)(); },
-                    fmt::format("{} {}", what, chosen.word));
+                    [&](Client& client) { return (client.*chosen.operation)(); }, chosen.done);
         };
     });
 }
