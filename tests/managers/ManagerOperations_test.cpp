@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -49,6 +50,10 @@ struct Row {
     ParcelWriter values;  // what precedes the status in the reply
     const char* failure;  // up to the message
 };
+
+void PrintTo(const Row& row, std::ostream* out) {
+    *out << row.name;
+}
 
 const char kTouch[] = "TouchManager";
 const char kGesture[] = "GestureManager";

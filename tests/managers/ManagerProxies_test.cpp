@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -89,6 +90,10 @@ struct Row {
     const char* entry;
     const char* failure;  // up to the reason
 };
+
+void PrintTo(const Row& row, std::ostream* out) {
+    *out << row.name;
+}
 
 const char kTouch[] = "TouchManagerService";
 const char kGesture[] = "GestureManagerService";

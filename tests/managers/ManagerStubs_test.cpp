@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -87,6 +88,10 @@ struct Row {
     ParcelWriter values;  // what precedes the status in the reply
     Lines log;
 };
+
+void PrintTo(const Row& row, std::ostream* out) {
+    *out << row.name;
+}
 
 const char kTouch[] = "TouchManagerService";
 const char kGesture[] = "GestureManagerService";

@@ -454,16 +454,26 @@ TYPED_TEST(WatchedManagerClient, HearsOfADeathOnAnotherThread) {
 
 // A callback may come in on the thread that waits for an operation's reply, and let go of the
 // service.
-TYPED_TEST(WatchedManagerClient, SurvivesDeinitDuringAnOperation) {
-    const auto client = this->connect(this->makeClient());
-    this->mRemote->handle([&](uint32_t code, const Parcel&, Parcel* reply) {
+TYPED_TEST(WatchedManagerClient, HoldsTheServiceUntilAnOperationReturns) {
+    sp<RecordingBinder> remote = new RecordingBinder;
+    remote->answer(numbers({0}));
+    this->mServices->add(TypeParam::kService, remote);
+    const auto client = this->makeClient();
+    ASSERT_EQ(0, client->init());
+
+    const android::wp<RecordingBinder> watch = remote;
+    remote->handle([&](uint32_t code, const Parcel&, Parcel* reply) {
         if (code != kUnsubscribe) {
             client->deinit();
+            EXPECT_NE(nullptr, watch.promote());
         }
         reply->writeInt32(STATUS_NOT_FOUND);
         return android::NO_ERROR;
     });
+    this->mServices->remove(TypeParam::kService);
+    remote.clear();
     EXPECT_EQ(STATUS_NOT_FOUND, this->operation(client));
+    EXPECT_EQ(nullptr, watch.promote());
     EXPECT_EQ(STATUS_INVALID_STATE, this->operation(client));
 }
 
