@@ -11,13 +11,13 @@ namespace pemaro::test {
 TEST(ServiceCommand, FindsTheService) {
     EXPECT_EQ("Service pemaro.TouchService: not found\n",
               run({platformBinary("service"), "check", "pemaro.TouchService"}).output);
-    TouchStack touchStack;
+    TouchStack touchStack({"--services", "companion"});
     EXPECT_EQ("Service pemaro.TouchService: found\n",
               run({platformBinary("service"), "check", "pemaro.TouchService"}).output);
 }
 
 TEST(ServiceCommand, ListsTheServiceWithoutItsInterface) {
-    TouchStack touchStack;
+    TouchStack touchStack({"--services", "companion"});
     const RunResult list = run({platformBinary("service"), "list"});
     EXPECT_EQ(0, list.status);
     EXPECT_EQ(
@@ -28,7 +28,7 @@ TEST(ServiceCommand, ListsTheServiceWithoutItsInterface) {
 }
 
 TEST(ServiceCommand, CannotCallWhatTellsNoInterface) {
-    TouchStack touchStack;
+    TouchStack touchStack({"--services", "companion"});
     // 20 would be getPacketSize.
     const RunResult call = run({platformBinary("service"), "call", "pemaro.TouchService", "20"});
     EXPECT_EQ(10, call.status);
@@ -38,7 +38,7 @@ TEST(ServiceCommand, CannotCallWhatTellsNoInterface) {
 }
 
 TEST(ServiceCommand, LeavesTheServiceAsItWas) {
-    TouchStack touchStack;
+    TouchStack touchStack({"--services", "companion"});
     for (const char* code : {"0", "1", "20", "28", "29", "1598968902"}) {
         run({platformBinary("service"), "call", "pemaro.TouchService", code, "i32", "7"});
     }

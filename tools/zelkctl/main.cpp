@@ -9,7 +9,7 @@
 
 int main(int argc, char** argv) {
     CLI::App app("Talks to the touch service through libzelkclient.", "zelkctl");
-    app.require_subcommand(1);
+    app.require_subcommand(0, 1);
     bool showLog = false;
     app.add_flag("--log", showLog, "Show the platform's log lines on stderr");
 
@@ -20,7 +20,12 @@ int main(int argc, char** argv) {
     pemaro::zelkctl::addGestureCommands(app, action);
     pemaro::zelkctl::addHandCommands(app, action);
 
-    if (const auto done = pemaro::tools::parseCommandLine(app, argc, argv)) {
+    const auto done = pemaro::tools::parseCommandLine(app, argc, argv, [&action] {
+        if (!action) {
+            throw CLI::ValidationError("a command is required");
+        }
+    });
+    if (done) {
         return *done;
     }
     pemaro::tools::showPlatformLog(showLog);

@@ -1,0 +1,107 @@
+// SPDX-License-Identifier: Apache-2.0
+// What the programs make of their command lines, on a machine with or without a Binder driver.
+
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "tests/support/ChildProcess.h"
+
+namespace pemaro::test {
+
+namespace {
+
+// A command line, its words separated by spaces.
+RunResult runLine(const std::string& line) {
+    std::istringstream stream(line);
+    std::vector<std::string> words;
+    for (std::string word; stream >> word;) {
+        words.push_back(word);
+    }
+    words[0] = ZELK_BIN_DIR "/" + words[0];
+    return run(words);
+}
+
+struct Misuse {
+    const char* line;
+    const char* error;
+};
+
+class Usage : public ::testing::TestWithParam<Misuse> {};
+
+}  // namespace
+
+TEST_P(Usage, IsRefusedInOneLine) {
+    const RunResult result = runLine(GetParam().line);
+    EXPECT_EQ(2, result.status);
+    EXPECT_EQ("", result.output);
+    EXPECT_EQ(GetParam().error + std::string(" (--help tells more)\n"), result.errors);
+}
+
+INSTANTIATE_TEST_SUITE_P(
+        Zelkctl, Usage,
+        ::testing::Values(
+                Misuse{"zelkctl", "zelkctl: a command is required"},
+                Misuse{"zelkctl --log", "zelkctl: a command is required"},
+                Misuse{"zelkctl fly", "zelkctl: The following argument was not expected: fly"},
+                Misuse{"zelkctl ping now", "zelkctl: The following argument was not expected: now"},
+                Misuse{"zelkctl record --frames many",
+                       "zelkctl: --frames: Value many not in range 1 to 1000000000000"},
+                Misuse{"zelkctl record --frames 0",
+                       "zelkctl: --frames: Value 0 not in range 1 to 1000000000000"},
+                Misuse{"zelkctl record --frames -5",
+                       "zelkctl: --frames: Value -5 not in range 1 to 1000000000000"},
+                Misuse{"zelkctl record --frames",
+                       "zelkctl: --frames: 1 required UINT:UINT in [1 - 1000000000000] missing"},
+                Misuse{"zelkctl record --seconds 0",
+                       "zelkctl: --seconds: Value 0 not in range 0.001000 to 1000000.000000"},
+                Misuse{"zelkctl record --speed",
+                       "zelkctl: The following argument was not expected: --speed"}));
+
+INSTANTIATE_TEST_SUITE_P(
+        TouchStack, Usage,
+        ::testing::Values(
+                Misuse{"zelk-touchstack now",
+                       "zelk-touchstack: The following argument was not expected: now"},
+                Misuse{"zelk-touchstack --rate -1",
+                       "zelk-touchstack: --rate: Value -1 not in range 0.000000 to 100000.000000"},
+                Misuse{"zelk-touchstack --frame-bytes 39",
+                       "zelk-touchstack: --frame-bytes: Value 39 not in range 40 to 1048576"},
+                Misuse{"zelk-touchstack --ring-frames 0",
+                       "zelk-touchstack: --ring-frames: Value 0 not in range 1 to 65536"},
+                Misuse{"zelk-touchstack --frame-bytes 1048576 --ring-frames 257",
+                       "zelk-touchstack: --ring-frames: a ring may take 256 MiB at most"},
+                Misuse{"zelk-touchstack --fault open",
+                       "zelk-touchstack: --fault: a fault is OPERATION=WHAT, not 'open'"},
+                Misuse{"zelk-touchstack --fault open=die --fault fly=die",
+                       "zelk-touchstack: --fault: the service has no operation 'fly'"}));
+
+TEST(Help, IsNoFailure) {
+    for (const char* line : {"zelkctl --help", "zelkctl record --help", "zelk-touchstack --help"}) {
+        const RunResult result = runLine(line);
+        EXPECT_EQ(0, result.status);
+        EXPECT_EQ("", result.errors);
+        EXPECT_NE(std::string::npos, result.output.find("Usage: ")) << result.output;
+    }
+}
+
+TEST(NoDriver, IsToldInOneLine) {
+    if (access("/dev/binder", F_OK) == 0) {
+        GTEST_SKIP() << "this machine has a Binder driver";
+    }
+    const std::string problem =
+            ": cannot use the Binder driver /dev/binder: No such file or directory\n";
+    for (const char* line : {"zelkctl ping", "zelkctl record"}) {
+        const RunResult result = runLine(line);
+        EXPECT_EQ(1, result.status);
+        EXPECT_EQ("zelkctl" + problem, result.errors);
+    }
+    const RunResult result = runLine("zelk-touchstack");
+    EXPECT_EQ(1, result.status);
+    EXPECT_EQ("zelk-touchstack" + problem, result.errors);
+}
+
+}  // namespace pemaro::test
