@@ -6,13 +6,13 @@
 #include <sanitizer/lsan_interface.h>
 
 #include <cstdlib>
+#include <memory>
 #include <string>
+#include <utility>
 
-#include "pemaro/ISerializableParams3.h"
-#include "pemaro/ISerializableParams4.h"
 #include "pemaro/ITouchCompanionFacade.h"
 #include "pemaro/ITouchCompanionFacadeOld.h"
-#include "pemaro/TouchCompanionFactory.h"
+#include "tests/companion/FactoryObject.h"
 #include "tests/companion/TouchCompanionRemoteTest.h"
 
 namespace pemaro::test {
@@ -42,16 +42,9 @@ class Ownership : public TouchCompanionRemoteTest {
     }
 
     template <typename Interface>
-    static Interface* make(int classID) {
-        void* instance = nullptr;
-        EXPECT_EQ(0, VEXPemaroCreateInstance(classID, classID << 16, &instance));
-        return static_cast<Interface*>(instance);
-    }
-
-    template <typename Interface>
-    static void release(Interface* object, Caller caller) {
-        if (caller == Caller::kReleases) {
-            delete object;
+    static void release(std::unique_ptr<Interface> object, Caller caller) {
+        if (caller == Caller::kForgets) {
+            object.release();
         }
     }
 };
@@ -73,37 +66,33 @@ TEST_F(Ownership, TextOfACommandIsTheCallers) {
 
 TEST_F(Ownership, ParameterObjectIsTheCallers) {
     expectLeakOnlyIfForgotten([](Caller caller) {
-        auto* params = make<ISerializableParams4>(4);
-        std::string key = "gain";
-        std::string value(100, '3');
-        params->setValue(key, value);
-        release(params, caller);
+        auto params = make<ISerializableParams4>(4);
+        store(*params, "gain", std::string(100, '3'));
+        release(std::move(params), caller);
     });
 }
 
 TEST_F(Ownership, OlderParameterObjectIsTheCallers) {
     expectLeakOnlyIfForgotten([](Caller caller) {
-        auto* params = make<ISerializableParams3>(3);
-        std::string key = "gain";
-        std::string value(100, '3');
-        params->setParam(key, value);
-        release(params, caller);
+        auto params = make<ISerializableParams3>(3);
+        store(*params, "gain", std::string(100, '3'));
+        release(std::move(params), caller);
     });
 }
 
 TEST_F(Ownership, FacadeIsTheCallers) {
     expectLeakOnlyIfForgotten([](Caller caller) {
-        auto* facade = make<ITouchCompanionFacade>(2048);
+        auto facade = make<ITouchCompanionFacade>(2048);
         facade->init(nullptr, nullptr);
-        release(facade, caller);
+        release(std::move(facade), caller);
     });
 }
 
 TEST_F(Ownership, OlderFacadeIsTheCallers) {
     expectLeakOnlyIfForgotten([](Caller caller) {
-        auto* facade = make<ITouchCompanionFacadeOld>(1792);
+        auto facade = make<ITouchCompanionFacadeOld>(1792);
         facade->init(nullptr, nullptr);
-        release(facade, caller);
+        release(std::move(facade), caller);
     });
 }
 

@@ -11,7 +11,7 @@
 #include <memory>
 #include <string>
 
-#include "pemaro/TouchCompanionFactory.h"
+#include "tests/companion/FactoryObject.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/VirtualSlot.h"
 
@@ -23,13 +23,6 @@ using ::testing::IsEmpty;
 
 using Params4 = ISerializableParams4;
 using Params3 = ISerializableParams3;
-
-template <typename Interface>
-std::unique_ptr<Interface> make(int classID) {
-    void* instance = nullptr;
-    EXPECT_EQ(0, VEXPemaroCreateInstance(classID, classID << 16, &instance));
-    return std::unique_ptr<Interface>(static_cast<Interface*>(instance));
-}
 
 // What both interfaces have, by position. The destructor takes two, so position n counted from the
 // destructor as the first is slot n.
@@ -49,11 +42,11 @@ int getValue(Params4& p, const std::string& key, std::string& value) {
     return (p.*memberAt<int (Params4::*)(const std::string&, std::string&)>(6))(key, value);
 }
 
-int store(Params4& p, std::string key, std::string value) {
+int storeByPosition(Params4& p, std::string key, std::string value) {
     return (p.*memberAt<int (Params4::*)(std::string&, std::string&)>(7))(key, value);
 }
 
-int store(Params3& p, std::string key, std::string value) {
+int storeByPosition(Params3& p, std::string key, std::string value) {
     return (p.*memberAt<int (Params3::*)(std::string&, std::string&)>(6))(key, value);
 }
 
@@ -102,7 +95,7 @@ TYPED_TEST(ParameterObject, BeginsEmpty) {
 }
 
 TYPED_TEST(ParameterObject, HoldsOneEntryAfterOneStore) {
-    EXPECT_EQ(0, store(*this->mParams, "gain", "3"));
+    EXPECT_EQ(0, storeByPosition(*this->mParams, "gain", "3"));
     EXPECT_EQ(1, TestFixture::S::size(*this->mParams));
     EXPECT_EQ("gain", this->keyAt(0));
     EXPECT_EQ("3", this->valueAt(0));
@@ -113,10 +106,10 @@ TYPED_TEST(ParameterObject, HoldsOneEntryAfterOneStore) {
 }
 
 TYPED_TEST(ParameterObject, SortsByKeyAndReplaces) {
-    store(*this->mParams, "b", "1");
-    store(*this->mParams, "a", "2");
-    store(*this->mParams, "B", "3");
-    EXPECT_EQ(0, store(*this->mParams, "b", "4"));
+    storeByPosition(*this->mParams, "b", "1");
+    storeByPosition(*this->mParams, "a", "2");
+    storeByPosition(*this->mParams, "B", "3");
+    EXPECT_EQ(0, storeByPosition(*this->mParams, "b", "4"));
     EXPECT_EQ(3, TestFixture::S::size(*this->mParams));
     EXPECT_EQ("B=3", this->keyAt(0) + "=" + this->valueAt(0));
     EXPECT_EQ("a=2", this->keyAt(1) + "=" + this->valueAt(1));
@@ -125,7 +118,7 @@ TYPED_TEST(ParameterObject, SortsByKeyAndReplaces) {
 
 TYPED_TEST(ParameterObject, StoresStringsWhateverTheyLookLike) {
     for (const char* text : {"3", "true", "", "{\"a\":1}", "1.5"}) {
-        EXPECT_EQ(0, store(*this->mParams, "key", text));
+        EXPECT_EQ(0, storeByPosition(*this->mParams, "key", text));
         EXPECT_EQ(text, this->valueAt(0));
         EXPECT_EQ(VALUE_TYPE_STRING, mapBehind(*this->mParams).getType("key")) << text;
     }
@@ -142,7 +135,7 @@ TYPED_TEST(ParameterObject, ReadsNoTextOfAContainer) {
 }
 
 TYPED_TEST(ParameterObject, HasNoValueAtABadPosition) {
-    store(*this->mParams, "gain", "3");
+    storeByPosition(*this->mParams, "gain", "3");
     std::string value;
     EXPECT_DEATH(TestFixture::S::valueAt(*this->mParams, 1, value),
                  "index>=size\\(\\)\\|SerializableMap\\|.*: index=1 out of range \\(1\\)");
@@ -154,13 +147,13 @@ TYPED_TEST(ParameterObject, HasNoValueAtABadPosition) {
 // released twice is found by AddressSanitizer.
 TYPED_TEST(ParameterObject, IsDestroyedThroughItsTable) {
     std::unique_ptr<TypeParam> object = make<TypeParam>(TestFixture::kClassID);
-    store(*object, "key", std::string(1000, 'x'));
+    storeByPosition(*object, "key", std::string(1000, 'x'));
     TypeParam* const raw = object.release();
     (raw->*memberAt<void (TypeParam::*)()>(1))();
 }
 
 TYPED_TEST(ParameterObject, KeepsItsMapRightBehindTheTable) {
-    store(*this->mParams, "gain", "3");
+    storeByPosition(*this->mParams, "gain", "3");
     const char* const object = reinterpret_cast<const char*>(this->mParams.get());
     const char* const map = reinterpret_cast<const char*>(&mapBehind(*this->mParams));
     EXPECT_EQ(static_cast<ptrdiff_t>(sizeof(void*)), map - object);
@@ -172,8 +165,8 @@ TYPED_TEST(ParameterObject, KeepsItsMapRightBehindTheTable) {
 class ParameterLookup : public ParameterObject<Params4> {};
 
 TEST_F(ParameterLookup, ReadsTheTextUnderAKey) {
-    store(*mParams, "gain", "3");
-    store(*mParams, "name", "pen");
+    storeByPosition(*mParams, "gain", "3");
+    storeByPosition(*mParams, "name", "pen");
     std::string value;
     EXPECT_EQ(0, getValue(*mParams, "name", value));
     EXPECT_EQ("pen", value);
@@ -189,7 +182,7 @@ TEST_F(ParameterLookup, LogsThatAValueHasNoText) {
 }
 
 TEST_F(ParameterLookup, HasNoValueUnderAnAbsentKey) {
-    store(*mParams, "gain", "3");
+    storeByPosition(*mParams, "gain", "3");
     std::string value;
     EXPECT_DEATH(getValue(*mParams, "Gain", value), "i<0\\|SerializableMap\\|.*: key not found");
 }

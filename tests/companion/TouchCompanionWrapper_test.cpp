@@ -10,11 +10,9 @@
 #include <memory>
 #include <string>
 
-#include "pemaro/ISerializableParams3.h"
-#include "pemaro/ISerializableParams4.h"
 #include "pemaro/ITouchCompanionFacade.h"
 #include "pemaro/ITouchCompanionFacadeOld.h"
-#include "pemaro/TouchCompanionFactory.h"
+#include "tests/companion/FactoryObject.h"
 #include "tests/companion/TouchCompanionRemoteTest.h"
 #include "tests/support/VirtualSlot.h"
 
@@ -29,13 +27,6 @@ using FacadeOld = ITouchCompanionFacadeOld;
 using DataCallback = void (*)(int, void*, unsigned long, void*);
 
 constexpr char kFacadeTag[] = "SerializableMap";
-
-template <typename Interface>
-std::unique_ptr<Interface> make(int classID) {
-    void* instance = nullptr;
-    EXPECT_EQ(0, VEXPemaroCreateInstance(classID, classID << 16, &instance));
-    return std::unique_ptr<Interface>(static_cast<Interface*>(instance));
-}
 
 // The operations that both facades have, by position. The destructor takes two slots, so position n,
 // the destructor being the first, is slot n.
@@ -224,9 +215,7 @@ TYPED_TEST(CompanionFacade, KeepsAClientThatFoundNoService) {
     EXPECT_EQ(0x4000000B, this->mFacade.getConfigParams(nullptr, &length));
     const auto params = make<ISerializableParams4>(4);
     EXPECT_EQ(0, this->mFacade.getConfigParams(params.get()));
-    std::string key = "gain";
-    std::string value;
-    params->setValue(key, value);
+    store(*params, "gain", "");
     EXPECT_EQ(0x4000000B, this->mFacade.getConfigParams(params.get()));
     this->mFacade.destroy();
     EXPECT_THAT(this->mService->calls(), IsEmpty());
@@ -253,11 +242,10 @@ TYPED_TEST(CompanionFacade, FillsAParameterObject) {
     this->connectFacade();
     this->mService->params = mapOf(R"({"gain":3})");
     const auto params = make<ISerializableParams4>(4);
-    std::string key = "gain";
-    std::string value;
-    ASSERT_EQ(0, params->setValue(key, value));
+    ASSERT_EQ(0, store(*params, "gain", ""));
     EXPECT_EQ(0, this->mFacade.getConfigParams(params.get()));
     EXPECT_EQ(R"(getConfigParams({"gain":""}))", this->onlyCall());
+    std::string value;
     EXPECT_EQ(0, params->getValue("gain", value));
     EXPECT_EQ("3", value);
 }
@@ -266,12 +254,12 @@ TYPED_TEST(CompanionFacade, FillsAnOlderParameterObjectAsWell) {
     this->connectFacade();
     this->mService->params = mapOf(R"({"gain":3,"name":"pen"})");
     const auto params = make<ISerializableParams3>(3);
-    std::string key = "gain";
-    std::string value;
-    ASSERT_EQ(0, params->setParam(key, value));
+    ASSERT_EQ(0, store(*params, "gain", ""));
     EXPECT_EQ(0,
               this->mFacade.getConfigParams(reinterpret_cast<ISerializableParams4*>(params.get())));
     ASSERT_EQ(2, params->size());
+    std::string key;
+    std::string value;
     EXPECT_EQ(0, params->getKey(1, key));
     EXPECT_EQ("name", key);
     EXPECT_EQ(0, params->getValue(1, value));
@@ -283,9 +271,7 @@ TYPED_TEST(CompanionFacade, CallsNothingOfAParameterObject) {
     this->connectFacade();
     this->mService->params = mapOf(R"({"gain":3})");
     const auto params = make<ISerializableParams4>(4);
-    std::string key = "gain";
-    std::string value;
-    ASSERT_EQ(0, params->setValue(key, value));
+    ASSERT_EQ(0, store(*params, "gain", ""));
     void* table;
     void* const none = nullptr;
     void* const object = params.get();
@@ -293,6 +279,7 @@ TYPED_TEST(CompanionFacade, CallsNothingOfAParameterObject) {
     memcpy(object, &none, sizeof(none));
     EXPECT_EQ(0, this->mFacade.getConfigParams(params.get()));
     memcpy(object, &table, sizeof(table));
+    std::string value;
     EXPECT_EQ(0, params->getValue("gain", value));
     EXPECT_EQ("3", value);
 }
@@ -308,9 +295,7 @@ TYPED_TEST(CompanionFacade, PassesTheStatusOfAParameterReadOn) {
     this->connectFacade();
     this->mService->setStatus("getConfigParams", STATUS_NOT_FOUND);
     const auto params = make<ISerializableParams4>(4);
-    std::string key = "gain";
-    std::string value = "x";
-    params->setValue(key, value);
+    store(*params, "gain", "");
     EXPECT_EQ(STATUS_NOT_FOUND, this->mFacade.getConfigParams(params.get()));
 }
 
@@ -325,9 +310,7 @@ TYPED_TEST(CompanionFacade, SetsNoParameterObject) {
     EXPECT_EQ(0x4000000E, this->mFacade.setConfigParams(nullptr));
     this->connectFacade();
     const auto params = make<ISerializableParams4>(4);
-    std::string key = "gain";
-    std::string value = "3";
-    params->setValue(key, value);
+    store(*params, "gain", "3");
     EXPECT_EQ(0x4000000E, this->mFacade.setConfigParams(params.get()));
     EXPECT_EQ(0x4000000E, this->mFacade.setConfigParams(nullptr));
     this->expectNothingSent();
