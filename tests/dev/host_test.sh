@@ -1,7 +1,7 @@
 #!/bin/bash
 # SPDX-License-Identifier: Apache-2.0
 # What ./dev asks of the host, and which packages it misses.
-# shellcheck disable=SC2317,SC2016,SC2153 # functions are called by name, text is expanded by others
+# shellcheck disable=SC2317,SC2016,SC2153,SC2123 # functions are called by name, text is expanded by others
 . "$(dirname -- "$0")/lib.sh"
 . "$ROOT/platform/lib.sh"
 . "$ROOT/platform/packages.sh"
