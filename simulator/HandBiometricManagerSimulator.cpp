@@ -9,8 +9,6 @@ namespace pemaro::simulator {
 namespace {
 
 constexpr double kAskedSimilarity[] = {60, 75, 85, 95};
-constexpr double kCareful = 0.05;
-constexpr double kCareless = 0.4;
 constexpr uint32_t kEnrollmentSteps = 5;
 constexpr uint32_t kStepsPerWakeup = 10;
 /// A person who is never enrolled.
@@ -56,7 +54,7 @@ void HandBiometricManagerSimulator::stepEnrollment() {
         report(newEvent(HandEvent::kEnrollmentStarted));
         return;
     }
-    const HandImage image = seeHand(mPersons, kCareful, mSequence);
+    const HandImage image = seeHand(mPersons, kCarefulNoise, mSequence);
     if (mStep > kEnrollmentSteps) {
         enroll(image);
         return;
@@ -88,7 +86,7 @@ void HandBiometricManagerSimulator::enroll(const HandImage& image) {
 void HandBiometricManagerSimulator::stepScan() {
     auto record = newEvent(mStep == 0 ? HandEvent::kScanStarted : HandEvent::kScanDone);
     if (mStep != 0) {
-        record->image = seeHand(kStranger, kCareful, mSequence);
+        record->image = seeHand(kStranger, kCarefulNoise, mSequence);
         mActivity = Activity::kIdle;
     }
     report(record);
@@ -111,7 +109,7 @@ HandImage HandBiometricManagerSimulator::nextHandToMatch() {
     const size_t turn = mStep / 2 % (2 * mProfiles.size() + 1);
     const bool stranger = turn == 2 * mProfiles.size();
     return seeHand(stranger ? kStranger : mProfiles[turn / 2].person,
-                   turn % 2 == 0 ? kCareful : kCareless, mSequence);
+                   turn % 2 == 0 ? kCarefulNoise : kCarelessNoise, mSequence);
 }
 
 void HandBiometricManagerSimulator::judge(const HandImage& image) {

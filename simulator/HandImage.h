@@ -13,7 +13,11 @@ constexpr size_t kHandRows = 124;
 /** What the panel sees of a hand: the pattern of its veins, row by row, around 128. */
 using HandImage = std::array<uint8_t, kHandColumns * kHandRows>;
 
-/** The hand of a person, laid on the panel so carelessly that about `noise` (0 to 1) of what is seen
+/// What is not the hand when it is laid on the panel with care, and carelessly.
+constexpr double kCarefulNoise = 0.05;
+constexpr double kCarelessNoise = 0.43;
+
+/** The hand of a person, laid on the panel so that about `noise` (0 to 1) of what is seen
  * is not the hand. Each variation is another time. */
 HandImage seeHand(uint32_t person, double noise, uint32_t variation);
 

@@ -1,18 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 // Recordings, over and over, use up nothing in either process.
 
-#include <dirent.h>
 #include <gtest/gtest.h>
 #include <sys/types.h>
 #include <unistd.h>
 
-#include <algorithm>
-#include <fstream>
-#include <iterator>
-#include <string>
-
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FrameCollector.h"
+#include "tests/driver/ProcessUsage.h"
 
 using android::sp;
 
@@ -22,62 +17,22 @@ namespace {
 
 constexpr int kWarmUps = 10;
 constexpr int kRounds = 100;
-// Binder's threads and the heaps of the allocator come and go by a few; a leak is one a round.
 constexpr int kLeeway = kRounds / 5;
-
-int countEntries(const std::string& folder) {
-    int count = 0;
-    DIR* directory = opendir(folder.c_str());
-    while (directory != nullptr && readdir(directory) != nullptr) {
-        ++count;
-    }
-    if (directory != nullptr) {
-        closedir(directory);
-    }
-    return count;
-}
-
-int countLines(const std::string& path) {
-    std::ifstream file(path);
-    return static_cast<int>(std::count(std::istreambuf_iterator<char>(file),
-                                       std::istreambuf_iterator<char>(), '\n'));
-}
-
-struct Usage {
-    explicit Usage(pid_t pid) {
-        const std::string process = "/proc/" + std::to_string(pid);
-        threads = countEntries(process + "/task");
-        descriptors = countEntries(process + "/fd");
-        mappings = countLines(process + "/maps");
-    }
-
-    int threads;
-    int descriptors;
-    int mappings;
-};
-
-void expectNoGrowth(const Usage& before, const Usage& after) {
-    EXPECT_GT(before.threads, 0);
-    EXPECT_GT(before.mappings, 0);
-    EXPECT_LT(after.threads, before.threads + kLeeway);
-    EXPECT_LT(after.descriptors, before.descriptors + kLeeway);
-    EXPECT_LT(after.mappings, before.mappings + kLeeway);
-}
 
 template <typename Round>
 void expectNoGrowthOver(pid_t service, Round round) {
     for (int i = 0; i < kWarmUps; ++i) {
         round();
     }
-    const Usage clientBefore(getpid());
-    const Usage serviceBefore(service);
+    const ProcessUsage clientBefore(getpid());
+    const ProcessUsage serviceBefore(service);
     for (int i = 0; i < kRounds; ++i) {
         round();
     }
     SCOPED_TRACE("client");
-    expectNoGrowth(clientBefore, Usage(getpid()));
+    expectNoGrowth(clientBefore, ProcessUsage(getpid()), kLeeway);
     SCOPED_TRACE("service");
-    expectNoGrowth(serviceBefore, Usage(service));
+    expectNoGrowth(serviceBefore, ProcessUsage(service), kLeeway);
 }
 
 }  // namespace

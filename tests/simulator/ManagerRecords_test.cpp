@@ -125,7 +125,7 @@ TEST(HandRecord, HasTheSizeThatCrossesBinder) {
 TEST(HandRecord, ReadsBackWhatWasSealedAndNothingElse) {
     auto record = std::make_unique<HandRecord>();
     record->event = HandEvent::kMatched;
-    record->image = seeHand(1, 0.05, 1);
+    record->image = seeHand(1, kCarefulNoise, 1);
     strcpy(record->profile, "Anna");
     sealHandRecord(record.get());
     EXPECT_EQ(0, memcmp("ZTHR", record.get(), 4));
@@ -150,21 +150,23 @@ TEST(HandRecord, RefusesANameWithoutAnEnd) {
 
 TEST(HandImage, CarefulHandsPassEveryLevelCarelessOnesTheFirstTwoStrangersNone) {
     for (uint32_t person = 0; person < 10; ++person) {
-        const HandImage enrolled = seeHand(person, 0.05, person);
-        EXPECT_LE(95, handSimilarity(enrolled, seeHand(person, 0.05, 100 + person)));
-        const double careless = handSimilarity(enrolled, seeHand(person, 0.4, 200 + person));
+        const HandImage enrolled = seeHand(person, kCarefulNoise, person);
+        EXPECT_LE(95, handSimilarity(enrolled, seeHand(person, kCarefulNoise, 100 + person)));
+        const double careless =
+                handSimilarity(enrolled, seeHand(person, kCarelessNoise, 200 + person));
         EXPECT_LE(75, careless) << person;
         EXPECT_GT(85, careless) << person;
         for (uint32_t other = 0; other < 10; ++other) {
             if (other != person) {
-                EXPECT_GT(60, handSimilarity(enrolled, seeHand(other, 0.05, 300))) << other;
+                EXPECT_GT(60, handSimilarity(enrolled, seeHand(other, kCarefulNoise, 300)))
+                        << other;
             }
         }
     }
 }
 
 TEST(HandImage, ResemblesItselfAndNotAnEmptyOne) {
-    const HandImage image = seeHand(3, 0.05, 1);
+    const HandImage image = seeHand(3, kCarefulNoise, 1);
     EXPECT_DOUBLE_EQ(100, handSimilarity(image, image));
     EXPECT_EQ(0, handSimilarity(image, HandImage{}));
 }

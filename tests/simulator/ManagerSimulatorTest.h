@@ -11,6 +11,7 @@
 #include "simulator/ServiceKind.h"
 #include "tests/support/FakeServiceManager.h"
 #include "tests/support/RecordCollector.h"
+#include "tests/support/RecordingBinder.h"
 
 namespace pemaro::simulator {
 
@@ -20,7 +21,10 @@ template <typename Simulator, typename Client>
 class ManagerSimulatorTest : public testing::Test {
   protected:
     ManagerSimulatorTest(ServiceKind kind, const android::sp<Client>& aClient) : client(aClient) {
-        services->add(registeredName(kind), service);
+        // A binder of this process cannot be watched for its death; this one stands before it.
+        const android::sp<test::RecordingBinder> remote = new test::RecordingBinder;
+        remote->forwardTo(service);
+        services->add(registeredName(kind), remote);
         EXPECT_EQ(0, client->init());
     }
 

@@ -8,8 +8,10 @@
 #include <utils/Errors.h>
 
 #include <atomic>
+#include <chrono>
 #include <future>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "pemaro/Status.h"

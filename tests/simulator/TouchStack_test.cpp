@@ -6,6 +6,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "pemaro/GestureManagerClient.h"
 #include "pemaro/TouchManagerClient.h"
 #include "tests/support/FakeServiceManager.h"
 

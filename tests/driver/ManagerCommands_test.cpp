@@ -1,0 +1,298 @@
+// SPDX-License-Identifier: Apache-2.0
+// zelkctl's commands for the managers against the simulated ones: what they print and return.
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <stdlib.h>
+
+#include <fstream>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "tests/driver/DriverSetting.h"
+
+using testing::HasSubstr;
+using testing::MatchesRegex;
+
+namespace pemaro::test {
+
+namespace {
+
+constexpr size_t kGestureBytes = 72144;
+constexpr size_t kHandBytes = 10016;
+
+using Words = std::vector<std::string>;
+
+RunResult zelkctl(Words arguments) {
+    arguments.insert(arguments.begin(), binary("zelkctl"));
+    return run(arguments);
+}
+
+// A command, its exit status, and all that it prints to stdout, or to stderr when it fails.
+struct Row {
+    Words command;
+    int status;
+    std::string text;
+};
+
+void expectRows(const std::vector<Row>& rows) {
+    for (const Row& row : rows) {
+        const RunResult result = zelkctl(row.command);
+        const bool succeeds = row.status == 0;
+        const std::string name = testing::PrintToString(row.command);
+        EXPECT_EQ(row.status, result.status) << name;
+        EXPECT_EQ(succeeds ? row.text : "", result.output) << name;
+        EXPECT_EQ(succeeds ? "" : "zelkctl: " + row.text, result.errors) << name;
+    }
+}
+
+// Files of a test, gone when it ends.
+class Files {
+  public:
+    Files() { EXPECT_NE(nullptr, mkdtemp(&mFolder[0])); }
+    ~Files() { run({"rm", "-rf", mFolder}); }
+
+    std::string path(const std::string& name) const { return mFolder + "/" + name; }
+
+    std::string write(const std::string& name, const std::string& content) const {
+        std::ofstream(path(name), std::ios::binary) << content;
+        return path(name);
+    }
+
+    std::string read(const std::string& name) const {
+        std::ifstream file(path(name), std::ios::binary);
+        return {std::istreambuf_iterator<char>(file), {}};
+    }
+
+  private:
+    std::string mFolder = "/tmp/zelkctl.XXXXXX";
+};
+
+Words stackOptions(const std::string& service) {
+    return {"--services", service, "--gesture-rate", "50", "--hand-rate", "50"};
+}
+
+}  // namespace
+
+TEST(ManagerCommands, OfTheTouchManager) {
+    TouchStack stack(stackOptions("touch"));
+    expectRows({
+            {{"touch", "features"},
+             0,
+             "         1  disabled\n         2  disabled\n         3  disabled\n         4  "
+             "disabled\n"},
+            {{"touch", "enable", "3"}, 0, "feature 3 enabled\n"},
+            {{"touch", "features", "--first", "3", "--last", "4", "--json"},
+             0,
+             "[{\"feature\":3,\"enabled\":true},{\"feature\":4,\"enabled\":false}]\n"},
+            {{"touch", "disable", "3"}, 0, "feature 3 disabled\n"},
+            {{"touch", "features", "--first", "7", "--last", "8"},
+             0,
+             "no feature from 7 to 8 is supported\n"},
+            {{"touch", "features", "--first", "7", "--last", "8", "--json"}, 0, "[]\n"},
+            {{"touch", "enable", "5"}, 1, "enable: Action/command is unsupported\n"},
+            {{"touch", "disable", "-1"}, 1, "disable: Action/command is unsupported\n"},
+            {{"touch", "region", "-1", "2", "300", "400"}, 0, "region -1,2 to 300,400 on\n"},
+            {{"touch", "region", "0", "0", "3", "4", "--off"}, 0, "region 0,0 to 3,4 off\n"},
+            {{"touch", "region", "3", "0", "3", "4", "--on"},
+             1,
+             "configure_vm_region: Bad parameter\n"},
+    });
+    EXPECT_TRUE(stack.awaitLine("touch: region -1,2 to 300,400 on"));
+    EXPECT_TRUE(stack.awaitLine("touch: region 0,0 to 3,4 off"));
+}
+
+TEST(ManagerCommands, OfTheGestureManager) {
+    TouchStack stack(stackOptions("gesture"));
+    Files files;
+    ASSERT_EQ(0, zelkctl({"gesture", "detect", "start"}).status);
+    ASSERT_EQ(0, zelkctl({"gesture", "watch", "-n", "20", "-o", files.path("seen")}).status);
+    const std::string seen = files.read("seen");
+    ASSERT_EQ(20 * kGestureBytes, seen.size());
+    const std::string one = files.write("one", seen.substr(0, kGestureBytes));
+    const std::string two = files.write("two", seen.substr(2 * kGestureBytes, 2 * kGestureBytes));
+    const std::string cut = files.write("cut", seen.substr(0, kGestureBytes + 5));
+    const std::string zeros = files.write("zeros", std::string(kGestureBytes, '\0'));
+    const std::string many = files.write("many", std::string(257 * kGestureBytes, '\0'));
+    expectRows({
+            {{"gesture", "limits"}, 0, "predefined    8\nuser-defined  10\n"},
+            {{"gesture", "limits", "--json"}, 0, "{\"predefined\":8,\"userDefined\":10}\n"},
+            {{"gesture", "wakeup", "on"}, 0, "wake-up on\n"},
+            {{"gesture", "wakeup", "off"}, 0, "wake-up off\n"},
+            {{"gesture", "detect", "stop"}, 0, "detection stopped\n"},
+            {{"gesture", "detect", "start"}, 0, "detection started\n"},
+            {{"gesture", "add", one}, 0, "gesture 9 added\n"},
+            {{"gesture", "add", two, two}, 0, "gesture 10 added\n"},
+            {{"gesture", "verify", one}, 0, "gesture 9\n"},
+            {{"gesture", "disable", "9"}, 0, "gesture 9 disabled\n"},
+            {{"gesture", "verify", one}, 1, "verifyGesture: Not Found\n"},
+            {{"gesture", "enable", "9"}, 0, "gesture 9 enabled\n"},
+            {{"gesture", "delete", "9"}, 0, "gesture 9 deleted\n"},
+            {{"gesture", "delete", "9"}, 1, "deleteGesture: Not Found\n"},
+            {{"gesture", "delete", "1"}, 1, "deleteGesture: Action/command is unsupported\n"},
+            {{"gesture", "add", zeros}, 1, "addGesture: Invalid format\n"},
+            {{"gesture", "add", files.path("seen")},
+             1,
+             "addGesture: An unknown error has occurred (20 records are 1442880 bytes, and a "
+             "transaction carries 14 records at most; nothing was added)\n"},
+            {{"gesture", "add", cut},
+             1,
+             cut + " holds 5 bytes more than whole records of 72144 bytes\n"},
+            {{"gesture", "add", many},
+             1,
+             many + " makes it more than 256 records of 72144 bytes\n"},
+            {{"gesture", "verify", two}, 1, two + " makes it more than 1 record of 72144 bytes\n"},
+            {{"gesture", "add", files.write("empty", "")}, 1, files.path("empty") + " is empty\n"},
+            {{"gesture", "verify", "/no/such"},
+             1,
+             "cannot open /no/such: No such file or directory\n"},
+            {{"gesture", "add", "/tmp"}, 1, "cannot read /tmp: Is a directory\n"},
+    });
+    EXPECT_TRUE(stack.process().isRunning());
+}
+
+TEST(ManagerCommands, OfTheHandBiometricManager) {
+    TouchStack stack(stackOptions("hand"));
+    Files files;
+    const RunResult enrolled =
+            zelkctl({"hand", "enroll", "-n", "7", "-o", files.path("events"), "--json"});
+    EXPECT_EQ(0, enrolled.status);
+    EXPECT_EQ(7 * kHandBytes, files.read("events").size());
+    for (const std::string& line : splitLines(enrolled.output)) {
+        EXPECT_THAT(line, MatchesRegex("\\{\"time\":[0-9]+\\.[0-9]{3},\"size\":10016,"
+                                       "\"digest\":\"[0-9a-f]{8}\"\\}"));
+    }
+    expectRows({
+            {{"hand", "profiles"}, 0, "hand 1\n1 of 5 profiles\n"},
+            {{"hand", "name", "Anna"}, 0, "profile Anna named\n"},
+            {{"hand", "rename", "Anna", "B\"\\\n"}, 0, "profile Anna renamed B\"\\?\n"},
+            {{"hand", "profiles", "--json"},
+             0,
+             "{\"profiles\":[\"B\\\"\\\\\\u000a\"],\"max\":5}\n"},
+            {{"hand", "profiles"}, 0, "B\"\\?\n1 of 5 profiles\n"},
+            {{"hand", "rename", "Carl", "Dora"}, 1, "renameProfile: Not Found\n"},
+            {{"hand", "delete", "Carl"}, 1, "deleteProfile: Not Found\n"},
+            {{"hand", "delete", "B\"\\\n"}, 0, "profile B\"\\? deleted\n"},
+            {{"hand", "name", "Emil"}, 1, "setProfileName: Invalid state\n"},
+            {{"hand", "profiles", "--json"}, 0, "{\"profiles\":[],\"max\":5}\n"},
+            {{"hand", "security", "3"}, 0, "security level 3\n"},
+            {{"hand", "security", "-2"}, 1, "setSecurity: Bad parameter\n"},
+            {{"hand", "match"}, 0, "matching started\n"},
+            {{"hand", "scan"}, 1, "scan: Invalid state\n"},
+            {{"hand", "enroll", "-n", "1"}, 1, "startEnrollment: Invalid state\n"},
+            {{"hand", "match", "--stop"}, 0, "matching stopped\n"},
+            {{"hand", "enroll", "--stop"}, 1, "stopEnrollment: Invalid state\n"},
+            {{"hand", "cancel"}, 1, "cancelScan: Invalid state\n"},
+            {{"hand", "match"}, 0, "matching started\n"},
+            {{"hand", "cancel"}, 0, "cancelled\n"},
+            {{"hand", "scan"}, 0, "scan started\n"},
+            {{"hand", "wakeup", "on"}, 0, "wake-up on\n"},
+            {{"hand", "wakeup", "off"}, 0, "wake-up off\n"},
+    });
+}
+
+// ---- watching ----
+
+namespace {
+
+struct WatchRow {
+    const char* manager;
+    Words letEventsFlow;
+    const char* service;
+};
+
+class ManagerWatch : public testing::TestWithParam<WatchRow> {};
+
+}  // namespace
+
+TEST_P(ManagerWatch, GoesOnWithTheRestartedServiceUntilInterrupted) {
+    const WatchRow& row = GetParam();
+    auto stack = std::make_unique<TouchStack>(stackOptions(row.manager));
+    ASSERT_EQ(0, zelkctl(row.letEventsFlow).status);
+    ChildProcess watch({binary("zelkctl"), row.manager, "watch"});
+    ASSERT_TRUE(watch.awaitOutput(" bytes  "));
+    stack->kill();
+    ASSERT_TRUE(watch.awaitOutput("  the service died\n"));
+
+    stack = std::make_unique<TouchStack>(stackOptions(row.manager));
+    ASSERT_TRUE(watch.awaitOutput("  the service is back\n"));
+    const size_t before = splitLines(watch.output()).size();
+    ASSERT_EQ(0, zelkctl(row.letEventsFlow).status);
+    while (watch.isRunning() && splitLines(watch.output()).size() < before + 2) {
+    }
+    watch.signal(SIGINT);
+    EXPECT_EQ(0, watch.wait());
+    const std::string left = std::string(row.manager) + ": a subscriber unsubscribed, 0 now";
+    EXPECT_TRUE(stack->awaitLine(left));
+    EXPECT_THAT(splitLines(watch.output()).back(),
+                MatchesRegex("[0-9:]{8}\\.[0-9]{3}  (72144|10016) bytes  [0-9a-f]{8}"));
+}
+
+TEST_P(ManagerWatch, EndsByItselfAfterSecondsWithoutEvents) {
+    TouchStack stack(stackOptions(GetParam().manager));
+    const RunResult watch = zelkctl({GetParam().manager, "watch", "--seconds", "0.3"});
+    EXPECT_EQ(0, watch.status);
+    EXPECT_EQ("", watch.output);
+    EXPECT_EQ("", watch.errors);
+}
+
+INSTANTIATE_TEST_SUITE_P(
+        All, ManagerWatch,
+        testing::Values(
+                WatchRow{"touch", {"touch", "enable", "1"}, "pemaro.TouchManagerService"},
+                WatchRow{"gesture", {"gesture", "detect", "start"}, "pemaro.GestureManagerService"},
+                WatchRow{"hand", {"hand", "match"}, "pemaro.HandBiometricManagerService"}),
+        [](const auto& info) { return std::string(info.param.manager); });
+
+TEST(ManagerCommands, TellThatTheServiceIsNotThere) {
+    TouchStack stack({"--services", "touch"});
+    ChildProcess gesture({binary("zelkctl"), "gesture", "limits"});
+    ChildProcess hand({binary("zelkctl"), "hand", "watch"});
+    EXPECT_EQ(1, gesture.wait());
+    EXPECT_EQ(
+            "zelkctl: waiting for the service pemaro.GestureManagerService\n"
+            "zelkctl: the service pemaro.GestureManagerService is not running\n",
+            gesture.errors());
+    EXPECT_EQ(1, hand.wait());
+    EXPECT_THAT(hand.errors(),
+                HasSubstr("the service pemaro.HandBiometricManagerService is not running\n"));
+}
+
+TEST(ManagerCommands, WaitForAServiceThatIsAboutToCome) {
+    ChildProcess limits({binary("zelkctl"), "gesture", "limits", "--json"});
+    TouchStack stack({"--services", "gesture"});
+    EXPECT_EQ(0, limits.wait());
+    EXPECT_EQ("{\"predefined\":8,\"userDefined\":10}\n", limits.output());
+}
+
+TEST(ManagerCommands, TellTheStatusOfAFaultyService) {
+    TouchStack stack({"--fault", "touch.subscribe=status:0x40000006", "--fault",
+                      "gesture.getMaxPreDefinedGesture=status:0x40000015", "--fault",
+                      "hand.scan=die"});
+    expectRows({
+            {{"touch", "watch"}, 1, "init: Error allocating memory\n"},
+            {{"gesture", "limits"}, 1, "getMaxPreDefinedGesture: Timeout has occurred\n"},
+            {{"hand", "scan"}, 1, "scan: An unknown error has occurred\n"},
+    });
+}
+
+TEST(ManagerCommands, FindAnUnwritableOutputBeforeTheyWatch) {
+    TouchStack stack(stackOptions("hand"));
+    expectRows({{{"hand", "enroll", "-n", "1", "-o", "/no/such/file"},
+                 1,
+                 "cannot open /no/such/file: No such file or directory\n"}});
+    EXPECT_EQ(std::string::npos, stack.process().output().find("startEnrollment"));
+}
+
+TEST(ManagerCommands, StopWhenTheirOutputIsFull) {
+    TouchStack stack(stackOptions("touch"));
+    ASSERT_EQ(0, zelkctl({"touch", "enable", "1"}).status);
+    expectRows({{{"touch", "watch", "-o", "/dev/full"},
+                 1,
+                 "cannot write /dev/full: No space left on device (it holds the records of 0 "
+                 "events)\n"}});
+}
+
+}  // namespace pemaro::test
