@@ -6,9 +6,12 @@
 #include <signal.h>
 #include <stdlib.h>
 
+#include <chrono>
 #include <fstream>
+#include <iterator>
 #include <memory>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "tests/driver/DriverSetting.h"
@@ -200,7 +203,6 @@ namespace {
 struct WatchRow {
     const char* manager;
     Words letEventsFlow;
-    const char* service;
 };
 
 class ManagerWatch : public testing::TestWithParam<WatchRow> {};
@@ -218,9 +220,10 @@ TEST_P(ManagerWatch, GoesOnWithTheRestartedServiceUntilInterrupted) {
 
     stack = std::make_unique<TouchStack>(stackOptions(row.manager));
     ASSERT_TRUE(watch.awaitOutput("  the service is back\n"));
-    const size_t before = splitLines(watch.output()).size();
+    const size_t before = watch.output().size();
     ASSERT_EQ(0, zelkctl(row.letEventsFlow).status);
-    while (watch.isRunning() && splitLines(watch.output()).size() < before + 2) {
+    while (watch.isRunning() && watch.output().size() == before) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
     }
     watch.signal(SIGINT);
     EXPECT_EQ(0, watch.wait());
@@ -238,13 +241,11 @@ TEST_P(ManagerWatch, EndsByItselfAfterSecondsWithoutEvents) {
     EXPECT_EQ("", watch.errors);
 }
 
-INSTANTIATE_TEST_SUITE_P(
-        All, ManagerWatch,
-        testing::Values(
-                WatchRow{"touch", {"touch", "enable", "1"}, "pemaro.TouchManagerService"},
-                WatchRow{"gesture", {"gesture", "detect", "start"}, "pemaro.GestureManagerService"},
-                WatchRow{"hand", {"hand", "match"}, "pemaro.HandBiometricManagerService"}),
-        [](const auto& info) { return std::string(info.param.manager); });
+INSTANTIATE_TEST_SUITE_P(All, ManagerWatch,
+                         testing::Values(WatchRow{"touch", {"touch", "enable", "1"}},
+                                         WatchRow{"gesture", {"gesture", "detect", "start"}},
+                                         WatchRow{"hand", {"hand", "match"}}),
+                         [](const auto& info) { return std::string(info.param.manager); });
 
 TEST(ManagerCommands, TellThatTheServiceIsNotThere) {
     TouchStack stack({"--services", "touch"});
