@@ -15,6 +15,10 @@ using Action = std::function<int()>;
  */
 void addPingCommand(CLI::App& app, Action& action);
 void addRecordCommand(CLI::App& app, Action& action);
+void addRecordFileCommand(CLI::App& app, Action& action);
+void addDeviceCommands(CLI::App& app, Action& action);
+void addConfigCommands(CLI::App& app, Action& action);
+void addSessionCommands(CLI::App& app, Action& action);
 void addTouchCommands(CLI::App& app, Action& action);
 void addGestureCommands(CLI::App& app, Action& action);
 void addHandCommands(CLI::App& app, Action& action);

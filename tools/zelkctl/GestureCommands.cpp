@@ -6,6 +6,7 @@
 #include "tools/zelkctl/Commands.h"
 #include "tools/zelkctl/GestureFile.h"
 #include "tools/zelkctl/ManagerCommands.h"
+#include "tools/zelkctl/Transaction.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -14,8 +15,6 @@ using Client = GestureManagerClient;
 using Gesture = IGestureManagerClient::GestureData;
 using Files = std::vector<std::string>;
 
-/// What one transaction can carry at most: libbinder maps this much for a process.
-constexpr size_t kTransactionBytes = (1 << 20) - 2 * 4096;
 /// Many more than a transaction can carry, and few enough to be read.
 constexpr size_t kMaxRecords = 256;
 
@@ -113,7 +112,7 @@ void addLimitsCommand(CLI::App& gesture, Action& action) {
 
 void addGestureCommands(CLI::App& app, Action& action) {
     CLI::App* gesture = app.add_subcommand("gesture", "Talk to the gesture manager");
-    gesture->require_subcommand(1);
+    gesture->require_subcommand(0, 1);
     addSwitchCommand<GestureManager>(
             *gesture, action, "wakeup", "Whether gestures wake the device",
             {"on", "enableWakeup", &Client::enableWakeup, "wake-up on"},

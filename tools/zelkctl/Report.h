@@ -28,4 +28,9 @@ inline int failStatus(const std::string& operation, int status) {
     return fail(operation + ": " + errStr(status));
 }
 
+/** The same with what it was about. */
+inline int failStatus(const std::string& operation, int status, const std::string& detail) {
+    return fail(fmt::format("{}: {} ({})", operation, errStr(status), detail));
+}
+
 }  // namespace pemaro::zelkctl

@@ -16,6 +16,10 @@ int main(int argc, char** argv) {
     pemaro::zelkctl::Action action;
     pemaro::zelkctl::addPingCommand(app, action);
     pemaro::zelkctl::addRecordCommand(app, action);
+    pemaro::zelkctl::addRecordFileCommand(app, action);
+    pemaro::zelkctl::addDeviceCommands(app, action);
+    pemaro::zelkctl::addConfigCommands(app, action);
+    pemaro::zelkctl::addSessionCommands(app, action);
     pemaro::zelkctl::addTouchCommands(app, action);
     pemaro::zelkctl::addGestureCommands(app, action);
     pemaro::zelkctl::addHandCommands(app, action);

@@ -1,0 +1,52 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/Json.h"
+
+#include <rapidjson/encodings.h>
+#include <rapidjson/memorystream.h>
+
+namespace pemaro::zelkctl {
+namespace {
+
+std::string asUtf8(const std::string& bytes) {
+    using Utf8 = rapidjson::UTF8<>;
+    std::string text;
+    for (size_t i = 0; i < bytes.size();) {
+        rapidjson::MemoryStream rest(&bytes[i], bytes.size() - i);
+        rapidjson::StringBuffer character;
+        if (Utf8::Validate(rest, character) && rest.Tell() <= bytes.size() - i) {
+            text.append(character.GetString(), character.GetSize());
+            i += rest.Tell();
+        } else {
+            text += "\xEF\xBF\xBD";
+            i += 1;
+        }
+    }
+    return text;
+}
+
+}  // namespace
+
+void JsonObject::addName(const std::string& name) {
+    const std::string text = asUtf8(name);
+    mWriter.Key(text.data(), static_cast<rapidjson::SizeType>(text.size()));
+}
+
+JsonObject& JsonObject::add(const std::string& name, int64_t value) {
+    addName(name);
+    mWriter.Int64(value);
+    return *this;
+}
+
+JsonObject& JsonObject::add(const std::string& name, const std::string& value) {
+    addName(name);
+    const std::string text = asUtf8(value);
+    mWriter.String(text.data(), static_cast<rapidjson::SizeType>(text.size()));
+    return *this;
+}
+
+std::string JsonObject::text() {
+    mWriter.EndObject();
+    return mBuffer.GetString();
+}
+
+}  // namespace pemaro::zelkctl

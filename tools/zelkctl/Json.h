@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <rapidjson/stringbuffer.h>
+#include <rapidjson/writer.h>
+
+#include <cstdint>
+#include <string>
+
+namespace pemaro::zelkctl {
+
+/**
+ * A JSON object on one line, its members in the order in which they are added.
+ *
+ *     JsonObject().add("session", 3).text()    // {"session":3}
+ */
+class JsonObject {
+  public:
+    JsonObject() : mWriter(mBuffer) { mWriter.StartObject(); }
+
+    JsonObject& add(const std::string& name, int64_t value);
+    /** Bytes that are no UTF-8 are replaced, each by U+FFFD: JSON has no place for them. */
+    JsonObject& add(const std::string& name, const std::string& value);
+
+    /** The whole object; nothing can be added any more. */
+    std::string text();
+
+  private:
+    void addName(const std::string& name);
+
+    rapidjson::StringBuffer mBuffer;
+    rapidjson::Writer<rapidjson::StringBuffer> mWriter;
+};
+
+}  // namespace pemaro::zelkctl
