@@ -62,6 +62,33 @@ INSTANTIATE_TEST_SUITE_P(
                        "zelkctl: The following argument was not expected: --speed"}));
 
 INSTANTIATE_TEST_SUITE_P(
+        ManagerCommands, Usage,
+        ::testing::Values(
+                Misuse{"zelkctl touch", "zelkctl: a command is required"},
+                Misuse{"zelkctl gesture", "zelkctl: a command is required"},
+                Misuse{"zelkctl hand", "zelkctl: a command is required"},
+                Misuse{"zelkctl touch fly",
+                       "zelkctl: The following argument was not expected: fly"},
+                Misuse{"zelkctl touch enable", "zelkctl: NUMBER is required"},
+                Misuse{"zelkctl touch enable x", "zelkctl: Could not convert: NUMBER = x"},
+                Misuse{"zelkctl touch region 1 2 3", "zelkctl: BOTTOM is required"},
+                Misuse{"zelkctl touch region 1 2 3 4 --on --off", "zelkctl: --on excludes --off"},
+                Misuse{"zelkctl touch watch --count 0",
+                       "zelkctl: --count: Value 0 not in range 1 to 1000000000000"},
+                Misuse{"zelkctl gesture wakeup", "zelkctl: on|off is required"},
+                Misuse{"zelkctl gesture wakeup maybe", "zelkctl: on|off: maybe not in {on,off}"},
+                Misuse{"zelkctl gesture detect on", "zelkctl: start|stop: on not in {start,stop}"},
+                Misuse{"zelkctl gesture add", "zelkctl: FILE is required"},
+                Misuse{"zelkctl gesture verify", "zelkctl: FILE is required"},
+                Misuse{"zelkctl gesture delete 1 2",
+                       "zelkctl: The following argument was not expected: 2"},
+                Misuse{"zelkctl hand security high", "zelkctl: Could not convert: LEVEL = high"},
+                Misuse{"zelkctl hand rename Anna", "zelkctl: SECOND is required"},
+                Misuse{"zelkctl hand enroll --stop --count 3", "zelkctl: --count excludes --stop"},
+                Misuse{"zelkctl hand scan --stop",
+                       "zelkctl: The following argument was not expected: --stop"}));
+
+INSTANTIATE_TEST_SUITE_P(
         TouchStack, Usage,
         ::testing::Values(
                 Misuse{"zelk-touchstack now",
@@ -76,6 +103,13 @@ INSTANTIATE_TEST_SUITE_P(
                        "zelk-touchstack: --ring-frames: a ring may take 256 MiB at most"},
                 Misuse{"zelk-touchstack --fault open",
                        "zelk-touchstack: --fault: a fault is OPERATION=WHAT, not 'open'"},
+                Misuse{"zelk-touchstack --services hand,foot",
+                       "zelk-touchstack: --services: there is no 'foot'"},
+                Misuse{"zelk-touchstack --gesture-rate 1001",
+                       "zelk-touchstack: --gesture-rate: Value 1001 not in range 0.000000 to "
+                       "1000.000000"},
+                Misuse{"zelk-touchstack --fault touch.scan=die",
+                       "zelk-touchstack: --fault: the service has no operation 'touch.scan'"},
                 Misuse{"zelk-touchstack --fault open=die --fault fly=die",
                        "zelk-touchstack: --fault: the service has no operation 'fly'"}));
 
@@ -94,7 +128,8 @@ TEST(NoDriver, IsToldInOneLine) {
     }
     const std::string problem =
             ": cannot use the Binder driver /dev/binder: No such file or directory\n";
-    for (const char* line : {"zelkctl ping", "zelkctl record"}) {
+    for (const char* line : {"zelkctl ping", "zelkctl record", "zelkctl touch watch",
+                             "zelkctl gesture limits", "zelkctl hand profiles"}) {
         const RunResult result = runLine(line);
         EXPECT_EQ(1, result.status);
         EXPECT_EQ("zelkctl" + problem, result.errors);

@@ -189,7 +189,7 @@ void addRenameCommand(CLI::App& hand, Action& action) {
 
 void addHandCommands(CLI::App& app, Action& action) {
     CLI::App* hand = app.add_subcommand("hand", "Talk to the hand biometric manager");
-    hand->require_subcommand(1);
+    hand->require_subcommand(0, 1);
     for (const Activity& activity : kActivities) {
         addActivityCommand(*hand, action, activity);
     }

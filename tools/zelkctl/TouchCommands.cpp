@@ -124,7 +124,7 @@ void addRegionCommand(CLI::App& touch, Action& action) {
 
 void addTouchCommands(CLI::App& app, Action& action) {
     CLI::App* touch = app.add_subcommand("touch", "Talk to the touch manager");
-    touch->require_subcommand(1);
+    touch->require_subcommand(0, 1);
     addFeaturesCommand(*touch, action);
     addNumberCommand<TouchManager>(*touch, action, "enable", "Switch a feature on", "feature",
                                    "enable", &Client::enable);
