@@ -9,6 +9,8 @@
 namespace pemaro::simulator {
 namespace {
 
+constexpr const char* kDebug = "DEBUG_COMMAND";
+constexpr const char* kProperty = "PROPERTY_COMMAND";
 constexpr int kDefaultDumpBytes = 65536;
 constexpr int kMaxDumpBytes = 262144;
 
@@ -49,27 +51,27 @@ bool getNumbers(const SerializableMap& params, std::vector<int>& numbers) {
     return true;
 }
 
-SerializableMap wrapResults(const SerializableValue& results) {
+SerializableMap wrapResults(const char* outer, const SerializableValue& results) {
     SerializableMap body;
     body.add("RESULTS", results);
     SerializableMap wrapped;
     wrapped.add("RESPONSE", body);
     SerializableMap response;
-    response.add("DEBUG_COMMAND", wrapped);
+    response.add(outer, wrapped);
     return response;
 }
 
 }  // namespace
 
 int CommandInterpreter::answer(const SerializableMap& request, SerializableMap& response) {
-    const bool isProperty = request.indexOfKey("PROPERTY_COMMAND") >= 0;
+    const bool isProperty = request.indexOfKey(kProperty) >= 0;
     SerializableMap command;
     SerializableMap body;
-    if (!getMap(request, isProperty ? "PROPERTY_COMMAND" : "DEBUG_COMMAND", command) ||
+    if (!getMap(request, isProperty ? kProperty : kDebug, command) ||
         !getMap(command, "REQUEST", body)) {
         return STATUS_INVALID_FORMAT;
     }
-    return isProperty ? answerProperty(body) : answerDebug(body, response);
+    return isProperty ? answerProperty(body, response) : answerDebug(body, response);
 }
 
 int CommandInterpreter::answerDebug(const SerializableMap& body, SerializableMap& response) {
@@ -84,7 +86,7 @@ int CommandInterpreter::answerDebug(const SerializableMap& body, SerializableMap
             return STATUS_ERROR_PARSING_PARAMETER;
         }
         mDevice.setFilter(mask);
-        response = wrapResults(0);
+        response = wrapResults(kDebug, 0);
         return STATUS_NO_ERROR;
     }
     std::string name;
@@ -101,12 +103,12 @@ int CommandInterpreter::answerDebug(const SerializableMap& body, SerializableMap
         SerializableMap results;
         results.add("OUT_STRING", text);
         results.add("OUT_VALUE", static_cast<int>(text.size()));
-        response = wrapResults(results);
+        response = wrapResults(kDebug, results);
     }
     return status;
 }
 
-int CommandInterpreter::answerProperty(const SerializableMap& body) {
+int CommandInterpreter::answerProperty(const SerializableMap& body, SerializableMap& response) {
     std::string action;
     SerializableMap params;
     std::vector<int> numbers;
@@ -116,7 +118,15 @@ int CommandInterpreter::answerProperty(const SerializableMap& body) {
     if (!getMap(body, "PARAMETERS", params) || !getNumbers(params, numbers)) {
         return STATUS_ERROR_PARSING_PARAMETER;
     }
-    return numbers.size() == 1 ? mDevice.setRollingLogSize(numbers[0]) : STATUS_INVALID_ARGUMENTS;
+    if (numbers.size() != 1) {
+        return STATUS_INVALID_ARGUMENTS;
+    }
+    const int status = mDevice.setRollingLogSize(numbers[0]);
+    if (status == STATUS_NO_ERROR) {
+        // Nobody looks at it, but a response without entries could not be read.
+        response = wrapResults(kProperty, 0);
+    }
+    return status;
 }
 
 int CommandInterpreter::runCommand(const std::string& name, const std::vector<int>& numbers,

@@ -31,7 +31,7 @@ class CommandInterpreter {
 
   private:
     int answerDebug(const SerializableMap& body, SerializableMap& response);
-    int answerProperty(const SerializableMap& body);
+    int answerProperty(const SerializableMap& body, SerializableMap& response);
     int runCommand(const std::string& name, const std::vector<int>& numbers, std::string* text);
     std::string selftest() const;
 

@@ -97,6 +97,8 @@ TEST_F(CommandInterpreterTest, SetsTheRecordFilter) {
 TEST_F(CommandInterpreterTest, SetsTheRollingLogSize) {
     EXPECT_EQ(0, answer(property("{\"NUM_OF_ELEMENTS\":1,\"SEND_COMMAND_NAME\":"
                                  "\"setRollingLogSize\",\"VALUES\":[1024]}")));
+    // Nobody reads this, but a client refuses a response without entries.
+    EXPECT_EQ("{\"PROPERTY_COMMAND\":{\"RESPONSE\":{\"RESULTS\":0}}}", response.serialize());
     EXPECT_NE(std::string::npos, device.properties().serialize().find("\"rollingLogSize\":1024"));
 }
 
