@@ -29,13 +29,15 @@ int withClient(Body body) {
     return client == nullptr ? tools::kExitFailure : body(*client);
 }
 
-/** One operation of a client, and what is printed when it succeeded. */
+/** One operation of a client, and what is printed when it succeeded; `detail` is told with its
+ * failure. */
 template <typename Operation>
-int operateClient(const std::string& name, Operation operation, const std::string& done) {
+int operateClient(const char* name, Operation operation, const std::string& done,
+                  const std::string& detail = "") {
     return withClient([&](TouchCompanionClient& client) {
         const int status = operation(client);
         if (status != STATUS_NO_ERROR) {
-            return failStatus(name, status);
+            return failStatus(name, status, detail);
         }
         fmt::print("{}\n", done);
         return tools::kExitSuccess;

@@ -62,19 +62,23 @@ Params wantedParams(const Keys& keys) {
 }
 
 /** A parameter object hands out no maps and arrays; a client does, in their text form. */
-int readContainer(const std::string& key, std::string& value) {
+int readContainers(const Keys& keys, Values& values) {
     const android::sp<TouchCompanionClient> client = Connection::openClient();
     if (client == nullptr) {
         return tools::kExitFailure;
     }
     SerializableMap params;
-    params.add(key, std::string(kWanted));
+    for (const std::string& key : keys) {
+        params.add(key, std::string(kWanted));
+    }
     const int status = client->getConfigParams(params);
     if (status != STATUS_NO_ERROR) {
-        return failStatus("getConfigParams", status, key);
+        return failStatus("getConfigParams", status, joined(keys));
     }
-    SerializableValue found = params.valueFor(key);
-    value = found.serialize();
+    for (const std::string& key : keys) {
+        SerializableValue found = params.valueFor(key);
+        values[key] = found.serialize();
+    }
     return tools::kExitSuccess;
 }
 
@@ -84,17 +88,15 @@ int readValues(ITouchCompanionFacade& facade, const Keys& keys, Values& values) 
     if (status != STATUS_NO_ERROR) {
         return failStatus("getConfigParams", status, joined(keys));
     }
+    Keys containers;
     for (int i = 0; i < params->size(); ++i) {
         std::string key;
-        std::string value;
         params->getKeyAt(i, key);
-        if (params->getValueAt(i, value) != STATUS_NO_ERROR &&
-            readContainer(key, value) != tools::kExitSuccess) {
-            return tools::kExitFailure;
+        if (params->getValueAt(i, values[key]) != STATUS_NO_ERROR) {
+            containers.push_back(key);
         }
-        values[key] = value;
     }
-    return tools::kExitSuccess;
+    return containers.empty() ? tools::kExitSuccess : readContainers(containers, values);
 }
 
 void printValues(const Keys& keys, const Values& values, bool json) {
@@ -227,7 +229,7 @@ void addServiceFileCommand(CLI::App& config, Action& action, const char* name, c
 
 void addConfigCommands(CLI::App& app, Action& action) {
     CLI::App* config = app.add_subcommand("config", "Read and write the configuration");
-    config->require_subcommand(1);
+    config->require_subcommand(0, 1);
     addGetCommand(*config, action);
     addFileCommand(*config, action, "dump", "Write the binary configuration to a file", dump);
     addFileCommand(*config, action, "load", "Replace the binary configuration from a file", load);

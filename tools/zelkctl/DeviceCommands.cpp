@@ -66,11 +66,11 @@ int setProperty(const std::string& name, const std::string& value) {
         return tools::kExitFailure;
     }
     return operateClient(
-            "setProperty " + name,
+            "setProperty",
             [&](TouchCompanionClient& client) {
                 return client.setProperty(name.c_str(), value.c_str());
             },
-            fmt::format("{} set to {}", name, value));
+            fmt::format("{} set to {}", name, value), name);
 }
 
 int sendEvent(const std::string& typeText, const std::string& paramText) {
@@ -141,7 +141,7 @@ void addPropertyCommand(CLI::App& app, Action& action) {
     auto name = std::make_shared<std::string>();
     auto value = std::make_shared<std::string>();
     CLI::App* property = app.add_subcommand("property", "Change a property");
-    property->require_subcommand(1);
+    property->require_subcommand(0, 1);
     CLI::App* command = property->add_subcommand("set", "Set a property to a number");
     command->add_option("NAME", *name, "The property: setRollingLogSize")->required();
     command->add_option("VALUE", *value, "A number, or several in one argument")->required();

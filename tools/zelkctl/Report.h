@@ -23,14 +23,10 @@ inline int failAbsent(const std::string& service) {
     return fail(fmt::format("the service {} is not running", service));
 }
 
-/** The same for an operation that returned a status. */
-inline int failStatus(const std::string& operation, int status) {
-    return fail(operation + ": " + errStr(status));
-}
-
-/** The same with what it was about. */
-inline int failStatus(const std::string& operation, int status, const std::string& detail) {
-    return fail(fmt::format("{}: {} ({})", operation, errStr(status), detail));
+/** The same for an operation that returned a status, and what it was about, if that helps. */
+inline int failStatus(const std::string& operation, int status, const std::string& detail = "") {
+    return fail(fmt::format("{}: {}{}", operation, errStr(status),
+                            detail.empty() ? "" : " (" + detail + ")"));
 }
 
 }  // namespace pemaro::zelkctl

@@ -40,7 +40,7 @@ int restore(const std::string& text) {
 
 void addSessionCommands(CLI::App& app, Action& action) {
     CLI::App* session = app.add_subcommand("session", "Keep the service's settings for later");
-    session->require_subcommand(1);
+    session->require_subcommand(0, 1);
 
     auto json = std::make_shared<bool>(false);
     CLI::App* command =
