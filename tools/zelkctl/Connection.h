@@ -3,11 +3,11 @@
 
 #include "pemaro/Binder.h"
 
-#include <atomic>
 #include <memory>
 
 #include "pemaro/ITouchCompanionFacade.h"
 #include "pemaro/TouchCompanionClient.h"
+#include "tools/zelkctl/ServiceWatch.h"
 
 namespace pemaro::zelkctl {
 
@@ -20,10 +20,8 @@ class Connection {
   public:
     static std::unique_ptr<Connection> open();
 
-    ~Connection();
-
     /** Whether the service's process ended since open(). */
-    bool serviceDied() const;
+    bool serviceDied() const { return mService->died(); }
 
     /** An initialised facade from the exported factory, as a program outside the tree gets it. */
     static std::unique_ptr<ITouchCompanionFacade> openFacade(
@@ -33,13 +31,9 @@ class Connection {
     static android::sp<TouchCompanionClient> openClient();
 
   private:
-    class DeathNotice;
+    explicit Connection(std::unique_ptr<ServiceWatch> service);
 
-    Connection(const android::sp<android::IBinder>& service,
-               const android::sp<DeathNotice>& notice);
-
-    const android::sp<android::IBinder> mService;
-    const android::sp<DeathNotice> mNotice;
+    const std::unique_ptr<ServiceWatch> mService;
 };
 
 }  // namespace pemaro::zelkctl

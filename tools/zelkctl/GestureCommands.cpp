@@ -5,6 +5,7 @@
 
 #include "tools/zelkctl/Commands.h"
 #include "tools/zelkctl/GestureFile.h"
+#include "tools/zelkctl/Json.h"
 #include "tools/zelkctl/ManagerCommands.h"
 #include "tools/zelkctl/Transaction.h"
 
@@ -75,7 +76,10 @@ int showLimits(bool json) {
             return failStatus("getMaxUserDefinedGesture", status);
         }
         if (json) {
-            fmt::print("{{\"predefined\":{},\"userDefined\":{}}}\n", predefined, userDefined);
+            fmt::print("{}\n", JsonObject()
+                                       .add("predefined", predefined)
+                                       .add("userDefined", userDefined)
+                                       .text());
         } else {
             fmt::print("predefined    {}\nuser-defined  {}\n", predefined, userDefined);
         }

@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "tools/zelkctl/Json.h"
 #include "tools/zelkctl/ManagerCommands.h"
 
 namespace pemaro::zelkctl {
@@ -57,21 +58,6 @@ std::string printable(std::string name) {
     return name;
 }
 
-std::string quoted(const std::string& name) {
-    std::string text = "\"";
-    for (const char c : name) {
-        if (c == '"' || c == '\\') {
-            text += '\\';
-        }
-        if (static_cast<unsigned char>(c) < ' ') {
-            text += fmt::format("\\u{:04x}", static_cast<int>(c));
-        } else {
-            text += c;
-        }
-    }
-    return text + "\"";
-}
-
 void printProfiles(const std::vector<std::string>& names, unsigned int most, bool json) {
     if (!json) {
         for (const std::string& name : names) {
@@ -80,11 +66,7 @@ void printProfiles(const std::vector<std::string>& names, unsigned int most, boo
         fmt::print("{} of {} profiles\n", names.size(), most);
         return;
     }
-    std::string list;
-    for (const std::string& name : names) {
-        list += (list.empty() ? "" : ",") + quoted(name);
-    }
-    fmt::print("{{\"profiles\":[{}],\"max\":{}}}\n", list, most);
+    fmt::print("{}\n", JsonObject().add("profiles", names).add("max", most).text());
 }
 
 int showProfiles(bool json) {

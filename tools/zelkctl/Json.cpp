@@ -39,9 +39,23 @@ JsonObject& JsonObject::add(const std::string& name, int64_t value) {
 
 JsonObject& JsonObject::add(const std::string& name, const std::string& value) {
     addName(name);
-    const std::string text = asUtf8(value);
-    mWriter.String(text.data(), static_cast<rapidjson::SizeType>(text.size()));
+    addText(value);
     return *this;
+}
+
+JsonObject& JsonObject::add(const std::string& name, const std::vector<std::string>& values) {
+    addName(name);
+    mWriter.StartArray();
+    for (const std::string& value : values) {
+        addText(value);
+    }
+    mWriter.EndArray();
+    return *this;
+}
+
+void JsonObject::addText(const std::string& bytes) {
+    const std::string text = asUtf8(bytes);
+    mWriter.String(text.data(), static_cast<rapidjson::SizeType>(text.size()));
 }
 
 std::string JsonObject::text() {

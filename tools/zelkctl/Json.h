@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <string>
+#include <vector>
 
 namespace pemaro::zelkctl {
 
@@ -21,12 +22,14 @@ class JsonObject {
     JsonObject& add(const std::string& name, int64_t value);
     /** Bytes that are no UTF-8 are replaced, each by U+FFFD: JSON has no place for them. */
     JsonObject& add(const std::string& name, const std::string& value);
+    JsonObject& add(const std::string& name, const std::vector<std::string>& values);
 
     /** The whole object; nothing can be added any more. */
     std::string text();
 
   private:
     void addName(const std::string& name);
+    void addText(const std::string& bytes);
 
     rapidjson::StringBuffer mBuffer;
     rapidjson::Writer<rapidjson::StringBuffer> mWriter;

@@ -4,6 +4,7 @@
 #include <binder/IServiceManager.h>
 #include <binder/ProcessState.h>
 
+#include <atomic>
 #include <thread>
 
 #include "tools/common/BinderDriver.h"
@@ -20,6 +21,15 @@ constexpr std::chrono::milliseconds kLookupPeriod(50);
 constexpr std::chrono::milliseconds kQuietFor(1500);
 
 }  // namespace
+
+class ServiceWatch::DeathNotice : public IBinder::DeathRecipient {
+  public:
+    void binderDied(const android::wp<IBinder>& /* who */) override { mDied = true; }
+    bool died() const { return mDied; }
+
+  private:
+    std::atomic<bool> mDied{false};
+};
 
 std::unique_ptr<ServiceWatch> ServiceWatch::await(const char* name,
                                                   std::optional<std::chrono::seconds> patience,
@@ -58,6 +68,10 @@ ServiceWatch::ServiceWatch(const sp<IBinder>& service, const sp<DeathNotice>& no
 
 ServiceWatch::~ServiceWatch() {
     mService->unlinkToDeath(mNotice);
+}
+
+bool ServiceWatch::died() const {
+    return mNotice->died();
 }
 
 bool startBinder() {

@@ -3,23 +3,12 @@
 
 #include "pemaro/Binder.h"
 
-#include <atomic>
 #include <chrono>
 #include <functional>
 #include <memory>
 #include <optional>
 
 namespace pemaro::zelkctl {
-
-/** Notes the death of one service. */
-class DeathNotice : public android::IBinder::DeathRecipient {
-  public:
-    void binderDied(const android::wp<android::IBinder>& /* who */) override { mDied = true; }
-    bool died() const { return mDied; }
-
-  private:
-    std::atomic<bool> mDied{false};
-};
 
 /**
  * A service that is there and alive, found with zelkctl's own patience instead of the platform's,
@@ -41,9 +30,11 @@ class ServiceWatch {
 
     ~ServiceWatch();
 
-    bool died() const { return mNotice->died(); }
+    bool died() const;
 
   private:
+    class DeathNotice;
+
     ServiceWatch(const android::sp<android::IBinder>& service,
                  const android::sp<DeathNotice>& notice);
 
