@@ -3,6 +3,8 @@
 
 #include <gtest/gtest.h>
 
+#include <fstream>
+#include <iterator>
 #include <thread>
 
 #include "simulator/Frame.h"
@@ -79,6 +81,22 @@ void FrameCollector::take(const void* frame, size_t bytes) {
     const std::chrono::milliseconds pause = mPause;
     guard.unlock();
     std::this_thread::sleep_for(pause);
+}
+
+int countFrames(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    const std::string recorded{std::istreambuf_iterator<char>(file), {}};
+    int count = 0;
+    for (size_t start = 0; start < recorded.size(); ++count) {
+        simulator::FrameHeader header{};
+        if (!simulator::readFrameHeader(&recorded[start], recorded.size() - start, &header) ||
+            header.length > recorded.size() - start ||
+            simulator::frameFault(&recorded[start], header.length) != nullptr) {
+            return -1;
+        }
+        start += header.length;
+    }
+    return count;
 }
 
 }  // namespace pemaro::test

@@ -54,4 +54,7 @@ class FrameCollector {
     std::string mFirstFault;
 };
 
+/// The number of whole and intact frames in a file, or -1 when there is anything else in it.
+int countFrames(const std::string& path);
+
 }  // namespace pemaro::test

@@ -4,16 +4,14 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <signal.h>
-#include <stdlib.h>
 
 #include <chrono>
-#include <fstream>
-#include <iterator>
 #include <memory>
 #include <string>
 #include <thread>
 #include <vector>
 
+#include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
 
 using testing::HasSubstr;
@@ -25,53 +23,6 @@ namespace {
 
 constexpr size_t kGestureBytes = 72144;
 constexpr size_t kHandBytes = 10016;
-
-using Words = std::vector<std::string>;
-
-RunResult zelkctl(Words arguments) {
-    arguments.insert(arguments.begin(), binary("zelkctl"));
-    return run(arguments);
-}
-
-// A command, its exit status, and all that it prints to stdout, or to stderr when it fails.
-struct Row {
-    Words command;
-    int status;
-    std::string text;
-};
-
-void expectRows(const std::vector<Row>& rows) {
-    for (const Row& row : rows) {
-        const RunResult result = zelkctl(row.command);
-        const bool succeeds = row.status == 0;
-        const std::string name = testing::PrintToString(row.command);
-        EXPECT_EQ(row.status, result.status) << name;
-        EXPECT_EQ(succeeds ? row.text : "", result.output) << name;
-        EXPECT_EQ(succeeds ? "" : "zelkctl: " + row.text, result.errors) << name;
-    }
-}
-
-// Files of a test, gone when it ends.
-class Files {
-  public:
-    Files() { EXPECT_NE(nullptr, mkdtemp(&mFolder[0])); }
-    ~Files() { run({"rm", "-rf", mFolder}); }
-
-    std::string path(const std::string& name) const { return mFolder + "/" + name; }
-
-    std::string write(const std::string& name, const std::string& content) const {
-        std::ofstream(path(name), std::ios::binary) << content;
-        return path(name);
-    }
-
-    std::string read(const std::string& name) const {
-        std::ifstream file(path(name), std::ios::binary);
-        return {std::istreambuf_iterator<char>(file), {}};
-    }
-
-  private:
-    std::string mFolder = "/tmp/zelkctl.XXXXXX";
-};
 
 Words stackOptions(const std::string& service) {
     return {"--services", service, "--gesture-rate", "50", "--hand-rate", "50"};

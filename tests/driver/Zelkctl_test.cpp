@@ -4,19 +4,18 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <signal.h>
-#include <stdlib.h>
 #include <sys/mount.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <cerrno>
 #include <cstring>
-#include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
 
-#include "simulator/Frame.h"
+#include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
+#include "tests/driver/FrameCollector.h"
 
 using testing::HasSubstr;
 using testing::MatchesRegex;
@@ -24,11 +23,6 @@ using testing::MatchesRegex;
 namespace pemaro::test {
 
 namespace {
-
-RunResult zelkctl(std::vector<std::string> arguments) {
-    arguments.insert(arguments.begin(), binary("zelkctl"));
-    return run(arguments);
-}
 
 std::string lastLine(const std::string& text) {
     const std::vector<std::string> lines = splitLines(text);
@@ -40,40 +34,13 @@ off_t fileSize(const std::string& path) {
     return stat(path.c_str(), &info) == 0 ? info.st_size : -1;
 }
 
-// The number of whole and intact frames in a file, or -1 when there is anything else in it.
-int countFrames(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    const std::string recorded{std::istreambuf_iterator<char>(file), {}};
-    int count = 0;
-    for (size_t start = 0; start < recorded.size(); ++count) {
-        simulator::FrameHeader header{};
-        if (!simulator::readFrameHeader(&recorded[start], recorded.size() - start, &header) ||
-            header.length > recorded.size() - start ||
-            simulator::frameFault(&recorded[start], header.length) != nullptr) {
-            return -1;
-        }
-        start += header.length;
-    }
-    return count;
-}
-
-// A folder that is gone, with all that it holds, when the test ends.
-class Folder {
+// Files on a disk of 64 KiB.
+class TinyDisk : public Files {
   public:
-    Folder() { EXPECT_NE(nullptr, mkdtemp(&mPath[0])); }
-    ~Folder() {
-        umount2(mPath.c_str(), MNT_DETACH);
-        run({"rm", "-rf", mPath});
+    TinyDisk() {
+        EXPECT_EQ(0, mount("tmpfs", folder().c_str(), "tmpfs", 0, "size=64k")) << strerror(errno);
     }
-
-    std::string file(const std::string& name) const { return mPath + "/" + name; }
-
-    void mountTinyDisk() {
-        ASSERT_EQ(0, mount("tmpfs", mPath.c_str(), "tmpfs", 0, "size=64k")) << strerror(errno);
-    }
-
-  private:
-    std::string mPath = "/tmp/zelkctl.XXXXXX";
+    ~TinyDisk() { umount2(folder().c_str(), MNT_DETACH); }
 };
 
 }  // namespace
@@ -105,18 +72,18 @@ TEST(Zelkctl, ShowsTheLogOnRequest) {
 }
 
 TEST(Zelkctl, RecordsTheFramesAskedFor) {
-    Folder folder;
+    Files folder;
     TouchStack touchStack({"--rate", "0", "--frame-bytes", "1000"});
     const RunResult record =
-            zelkctl({"record", "--frames", "300", "--output", folder.file("frames")});
+            zelkctl({"record", "--frames", "300", "--output", folder.path("frames")});
     EXPECT_EQ(0, record.status);
     EXPECT_EQ("", record.errors);
     EXPECT_THAT(lastLine(record.output),
                 MatchesRegex("recorded 300 frames, [0-9]+ bytes in [0-9.]+ s, [0-9.]+ frames/s, "
                              "0 lost in 0 gaps, 0 corrupt"));
     EXPECT_THAT(record.output,
-                HasSubstr(" " + std::to_string(fileSize(folder.file("frames"))) + " bytes in "));
-    EXPECT_EQ(300, countFrames(folder.file("frames")));
+                HasSubstr(" " + std::to_string(fileSize(folder.path("frames"))) + " bytes in "));
+    EXPECT_EQ(300, countFrames(folder.path("frames")));
     EXPECT_TRUE(touchStack.process().awaitOutput(" stopped: "));
 }
 
@@ -133,9 +100,9 @@ TEST(Zelkctl, RecordsForTheSecondsAskedFor) {
 
 TEST(Zelkctl, StopsTheRecordingWhenInterrupted) {
     for (int signal : {SIGINT, SIGTERM}) {
-        Folder folder;
+        Files folder;
         TouchStack touchStack({"--rate", "200"});
-        ChildProcess record({binary("zelkctl"), "record", "--output", folder.file("frames")});
+        ChildProcess record({binary("zelkctl"), "record", "--output", folder.path("frames")});
         ASSERT_TRUE(record.awaitOutput(" frames/s "));
         record.signal(signal);
         EXPECT_EQ(0, record.wait());
@@ -144,7 +111,7 @@ TEST(Zelkctl, StopsTheRecordingWhenInterrupted) {
         const std::string name = "client " + std::to_string(record.pid());
         EXPECT_TRUE(touchStack.process().awaitOutput(name + " stopped: "));
         EXPECT_TRUE(touchStack.awaitLine(name + " unregistered"));
-        EXPECT_GT(countFrames(folder.file("frames")), 0);
+        EXPECT_GT(countFrames(folder.path("frames")), 0);
     }
 }
 
@@ -159,14 +126,13 @@ TEST(Zelkctl, FindsAnUnwritableOutputBeforeItRecords) {
 }
 
 TEST(Zelkctl, StopsTheRecordingWhenTheDiskIsFull) {
-    Folder folder;
-    ASSERT_NO_FATAL_FAILURE(folder.mountTinyDisk());
+    TinyDisk folder;
     TouchStack touchStack({"--rate", "0", "--frame-bytes", "5000"});
-    ChildProcess record({binary("zelkctl"), "record", "--output", folder.file("frames")});
+    ChildProcess record({binary("zelkctl"), "record", "--output", folder.path("frames")});
     EXPECT_EQ(1, record.wait());
-    const int whole = countFrames(folder.file("frames"));
+    const int whole = countFrames(folder.path("frames"));
     EXPECT_EQ(13, whole);  // 64 KiB
-    EXPECT_EQ("zelkctl: cannot write " + folder.file("frames") +
+    EXPECT_EQ("zelkctl: cannot write " + folder.path("frames") +
                       ": No space left on device (it holds 13 whole frames)\n",
               record.errors());
     const std::string name = "client " + std::to_string(record.pid());

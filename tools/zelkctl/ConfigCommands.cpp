@@ -220,7 +220,8 @@ void addServiceFileCommand(CLI::App& config, Action& action, const char* name, c
             return operateClient(
                     operationName,
                     [&](TouchCompanionClient& client) { return (client.*operation)(file); },
-                    fmt::format("configuration {}{}{}", done, file == nullptr ? "" : ": ", *path));
+                    fmt::format("configuration {}{}{}", done, file == nullptr ? "" : ": ", *path),
+                    *path);
         };
     });
 }

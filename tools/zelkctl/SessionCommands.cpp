@@ -33,7 +33,7 @@ int restore(const std::string& text) {
             [&](TouchCompanionClient& client) {
                 return client.restoreSession(static_cast<int>(*session));
             },
-            fmt::format("session {} restored", *session));
+            fmt::format("session {} restored", *session), std::to_string(*session));
 }
 
 }  // namespace
