@@ -7,8 +7,10 @@ PACKAGES_PLATFORM=(android-libutils-dev android-libcutils-dev android-liblog-dev
     android-platform-system-core-headers android-platform-frameworks-native-headers aidl xz-utils)
 # Compilers; clang with its runtime and symbolizer is for the address sanitizer.
 PACKAGES_BUILD=(g++ cmake ninja-build clang libclang-rt-14-dev llvm)
-# The exported interface is compared by libabigail, and compiled with the device's C++ library as well.
-PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev abigail-tools libc++-14-dev libc++abi-14-dev)
+# The exported interface is compared by libabigail, and compiled with the device's C++ library as well; zsh
+# runs its completion.
+PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev abigail-tools libc++-14-dev libc++abi-14-dev
+    zsh)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
 PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev mandoc)
 # The machine that runs a kernel with the Binder driver.

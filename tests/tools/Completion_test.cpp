@@ -1,0 +1,109 @@
+// SPDX-License-Identifier: Apache-2.0
+// The completions know what zelkctl knows, neither less nor more.
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <regex>
+#include <string>
+#include <vector>
+
+#include "tests/support/ChildProcess.h"
+#include "tests/tools/HelpTree.h"
+
+namespace pemaro::test {
+
+namespace {
+
+WordSet asSet(const std::vector<std::string>& words) {
+    return {words.begin(), words.end()};
+}
+
+// What bash offers for the last of these words, which is being typed.
+std::vector<std::string> completeInBash(const std::string& words, const std::string& typed) {
+    const RunResult result =
+            run({"bash", "--norc", "-c",
+                 ". " ZELK_TOOLS_DIR "/completions/zelkctl.bash\n"
+                 "COMP_WORDS=(zelkctl " +
+                         words + " '" + typed +
+                         "')\n"
+                         "COMP_CWORD=$((${#COMP_WORDS[@]} - 1))\n"
+                         "_zelkctl\n"
+                         "((${#COMPREPLY[@]} == 0)) || printf '%s\\n' \"${COMPREPLY[@]}\"\n"});
+    EXPECT_EQ(0, result.status);
+    EXPECT_EQ("", result.errors);
+    return splitLines(result.output);
+}
+
+// What zsh is told of a command: the options, and the commands behind it.
+HelpEntry completeInZsh(const std::string& path) {
+    std::string function = "_zelkctl" + (path.empty() ? "" : "-" + path);
+    std::replace(function.begin(), function.end(), ' ', '-');
+    const RunResult result = run({"zsh", "-f", "-c",
+                                  "_arguments() { print -rl -- \"$@\"; state=command }\n"
+                                  "_describe() { print -rl -- 'command '${(P)^@[-1]} }\n"
+                                  ". " ZELK_TOOLS_DIR "/completions/_zelkctl\n" +
+                                          function + "\n"});
+    EXPECT_EQ(0, result.status) << function;
+    EXPECT_EQ("", result.errors) << function;
+    static const std::regex option("(?:\\([^)]*\\))?(--[a-z-]+)\\[.*");
+    static const std::regex command("command ([a-z-]+):.*");
+    HelpEntry entry;
+    for (const std::string& line : splitLines(result.output)) {
+        std::smatch match;
+        if (std::regex_match(line, match, option)) {
+            entry.options.insert(match[1]);
+        } else if (std::regex_match(line, match, command)) {
+            entry.commands.insert(match[1]);
+        }
+    }
+    return entry;
+}
+
+}  // namespace
+
+TEST(BashCompletion, OffersTheCommandsAndOptionsOfTheHelp) {
+    for (const auto& [path, entry] : readHelpTree("zelkctl")) {
+        EXPECT_EQ(entry.options, asSet(completeInBash(path, "-"))) << path;
+        if (!entry.commands.empty()) {
+            WordSet all = entry.commands;
+            all.insert(entry.options.begin(), entry.options.end());
+            EXPECT_EQ(all, asSet(completeInBash(path, ""))) << path;
+        }
+    }
+}
+
+TEST(BashCompletion, FollowsTheCommandLine) {
+    const struct {
+        const char* words;
+        const char* typed;
+        WordSet offered;
+    } rows[] = {
+            {"", "rec", {"record", "record-file"}},
+            {"--log", "p", {"ping", "property", "packet-size"}},
+            {"gesture wakeup", "o", {"on", "off"}},
+            {"gesture detect", "s", {"start", "stop"}},
+            {"property set", "s", {"setRollingLogSize"}},
+            {"record --frames 5", "--o", {"--output"}},
+            {"record --frames", "", {}},
+            {"config load",
+             ZELK_TOOLS_DIR "/com",
+             {ZELK_TOOLS_DIR "/common", ZELK_TOOLS_DIR "/completions"}},
+            {"touch watch --output", ZELK_TOOLS_DIR "/dem", {ZELK_TOOLS_DIR "/demo"}},
+            {"touch watch -o", ZELK_TOOLS_DIR "/dem", {ZELK_TOOLS_DIR "/demo"}},
+            {"fly", "-", {"--help"}},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ(row.offered, asSet(completeInBash(row.words, row.typed))) << row.words;
+    }
+}
+
+TEST(ZshCompletion, OffersTheCommandsAndOptionsOfTheHelp) {
+    for (const auto& [path, entry] : readHelpTree("zelkctl")) {
+        const HelpEntry offered = completeInZsh(path);
+        EXPECT_EQ(entry.options, offered.options) << path;
+        EXPECT_EQ(entry.commands, offered.commands) << path;
+    }
+}
+
+}  // namespace pemaro::test

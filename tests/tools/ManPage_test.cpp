@@ -1,0 +1,87 @@
+// SPDX-License-Identifier: Apache-2.0
+// The manual pages tell what the programs' help lists, neither less nor more.
+
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <map>
+#include <regex>
+#include <sstream>
+#include <string>
+
+#include "tests/tools/HelpTree.h"
+
+namespace pemaro::test {
+
+namespace {
+
+std::ifstream openPage(const std::string& name) {
+    std::ifstream page(ZELK_TOOLS_DIR "/man/" + name);
+    EXPECT_TRUE(page.is_open()) << name;
+    return page;
+}
+
+void addOptions(const std::string& line, WordSet& options) {
+    static const std::regex option("Fl -([a-z-]+)");
+    for (std::sregex_iterator next(line.begin(), line.end(), option), end; next != end; ++next) {
+        options.insert("--" + (*next)[1].str());
+    }
+}
+
+// The commands of a page, each with the options of its heading.
+std::map<std::string, WordSet> documentedCommands(const std::string& name) {
+    static const std::regex heading("\\.It Cm ([a-z-]+(?: [a-z-]+)?)(?: .*)?");
+    std::map<std::string, WordSet> commands;
+    std::ifstream page = openPage(name);
+    for (std::string line; std::getline(page, line);) {
+        std::smatch match;
+        if (std::regex_match(line, match, heading)) {
+            WordSet& options = commands[match[1]];
+            EXPECT_TRUE(options.empty()) << match[1] << " is there twice";
+            options.insert("--help");
+            addOptions(line, options);
+        }
+    }
+    return commands;
+}
+
+// The options that have an item of their own.
+WordSet documentedOptions(const std::string& name) {
+    WordSet options;
+    std::ifstream page = openPage(name);
+    for (std::string line; std::getline(page, line);) {
+        if (line.rfind(".It Fl ", 0) == 0) {
+            addOptions(line, options);
+        }
+    }
+    return options;
+}
+
+}  // namespace
+
+TEST(ManPage, OfZelkctlTellsEachCommandWithItsOptions) {
+    std::map<std::string, WordSet> listed;
+    for (const auto& [path, entry] : readHelpTree("zelkctl")) {
+        if (entry.commands.empty()) {
+            listed[path] = entry.options;
+        }
+    }
+    EXPECT_EQ(listed, documentedCommands("zelkctl.1"));
+}
+
+TEST(ManPage, OfZelkctlExplainsTheOptionsOfTheProgram) {
+    const WordSet documented = documentedOptions("zelkctl.1");
+    const HelpTree tree = readHelpTree("zelkctl");
+    for (const char* path : {"", "record", "record-file", "touch watch"}) {
+        for (const std::string& option : tree.at(path).options) {
+            EXPECT_EQ(1u, documented.count(option)) << path << " " << option;
+        }
+    }
+}
+
+TEST(ManPage, OfTheTouchStackTellsEachOption) {
+    EXPECT_EQ(readHelpTree("zelk-touchstack").at("").options,
+              documentedOptions("zelk-touchstack.1"));
+}
+
+}  // namespace pemaro::test
