@@ -62,6 +62,31 @@ INSTANTIATE_TEST_SUITE_P(
                        "zelkctl: The following argument was not expected: --speed"}));
 
 INSTANTIATE_TEST_SUITE_P(
+        CompanionCommands, Usage,
+        ::testing::Values(
+                Misuse{"zelkctl command", "zelkctl: TEXT is required"},
+                Misuse{"zelkctl command calibrate 3",
+                       "zelkctl: The following argument was not expected: 3"},
+                Misuse{"zelkctl filter", "zelkctl: MASK is required"},
+                Misuse{"zelkctl property", "zelkctl: a command is required"},
+                Misuse{"zelkctl property get",
+                       "zelkctl: The following argument was not expected: get"},
+                Misuse{"zelkctl property set setRollingLogSize", "zelkctl: VALUE is required"},
+                Misuse{"zelkctl event 7", "zelkctl: PARAM is required"},
+                Misuse{"zelkctl inspect now",
+                       "zelkctl: The following argument was not expected: now"},
+                Misuse{"zelkctl auth", "zelkctl: TEXT is required"},
+                Misuse{"zelkctl config", "zelkctl: a command is required"},
+                Misuse{"zelkctl config get", "zelkctl: KEY is required"},
+                Misuse{"zelkctl config load", "zelkctl: FILE is required"},
+                Misuse{"zelkctl config save a b",
+                       "zelkctl: The following argument was not expected: b"},
+                Misuse{"zelkctl session", "zelkctl: a command is required"},
+                Misuse{"zelkctl session restore", "zelkctl: ID is required"},
+                Misuse{"zelkctl record-file --seconds 0 frames",
+                       "zelkctl: --seconds: Value 0 not in range 0.001000 to 1000000.000000"}));
+
+INSTANTIATE_TEST_SUITE_P(
         ManagerCommands, Usage,
         ::testing::Values(
                 Misuse{"zelkctl touch", "zelkctl: a command is required"},
@@ -128,8 +153,9 @@ TEST(NoDriver, IsToldInOneLine) {
     }
     const std::string problem =
             ": cannot use the Binder driver /dev/binder: No such file or directory\n";
-    for (const char* line : {"zelkctl ping", "zelkctl record", "zelkctl touch watch",
-                             "zelkctl gesture limits", "zelkctl hand profiles"}) {
+    for (const char* line :
+         {"zelkctl ping", "zelkctl record", "zelkctl inspect", "zelkctl record-file frames",
+          "zelkctl touch watch", "zelkctl gesture limits", "zelkctl hand profiles"}) {
         const RunResult result = runLine(line);
         EXPECT_EQ(1, result.status);
         EXPECT_EQ("zelkctl" + problem, result.errors);
@@ -137,6 +163,15 @@ TEST(NoDriver, IsToldInOneLine) {
     const RunResult result = runLine("zelk-touchstack");
     EXPECT_EQ(1, result.status);
     EXPECT_EQ("zelk-touchstack" + problem, result.errors);
+}
+
+TEST(Numbers, AreLookedAtBeforeTheDriver) {
+    for (const char* line : {"zelkctl filter x", "zelkctl event 1 x", "zelkctl session restore x",
+                             "zelkctl property set setRollingLogSize x"}) {
+        const RunResult result = runLine(line);
+        EXPECT_EQ(1, result.status);
+        EXPECT_NE(std::string::npos, result.errors.find(": Error parsing parameter (")) << line;
+    }
 }
 
 }  // namespace pemaro::test
