@@ -165,12 +165,56 @@ TEST(NoDriver, IsToldInOneLine) {
     EXPECT_EQ("zelk-touchstack" + problem, result.errors);
 }
 
-TEST(Numbers, AreLookedAtBeforeTheDriver) {
-    for (const char* line : {"zelkctl filter x", "zelkctl event 1 x", "zelkctl session restore x",
-                             "zelkctl property set setRollingLogSize x"}) {
-        const RunResult result = runLine(line);
-        EXPECT_EQ(1, result.status);
-        EXPECT_NE(std::string::npos, result.errors.find(": Error parsing parameter (")) << line;
+// What the command line itself cannot know to be wrong is a failure, found before the driver is
+// touched.
+TEST(Arguments, AreLookedAtBeforeAnythingIsSent) {
+    const auto noNumber = [](const std::string& command, const std::string& argument,
+                             const std::string& range) {
+        return command + ": Error parsing parameter (" + argument + " is no number from " + range +
+               ")";
+    };
+    const std::string any = "-2147483648 to 4294967295";
+    const std::string mask = "0 to 4294967295";
+    const std::string badName = "command: Invalid command (a name has no \" and no \\)";
+    const struct {
+        std::vector<std::string> words;
+        std::string error;
+    } rows[] = {
+            {{"command", "calibrate 3 x"}, noNumber("command", "number: 'x'", any)},
+            {{"command", "status "}, noNumber("command", "number: ''", any)},
+            {{"command", "calibrate 1  2"}, noNumber("command", "number: ''", any)},
+            {{"command", "calibrate 4294967296"}, noNumber("command", "number: '4294967296'", any)},
+            {{"command", ""}, "command: Invalid command (it has no name)"},
+            {{"command", " 5"}, "command: Invalid command (it has no name)"},
+            {{"command", "a\",\"b"}, badName},
+            {{"command", "a\\"}, badName},
+            {{"filter", "0x1g"}, noNumber("filter", "MASK: '0x1g'", mask)},
+            {{"filter", "-1"}, noNumber("filter", "MASK: '-1'", mask)},
+            {{"filter", ""}, noNumber("filter", "MASK: ''", mask)},
+            {{"property", "set", "setRollingLogSize", "1k"},
+             noNumber("property set", "number: '1k'", any)},
+            {{"event", "x", "1"}, noNumber("event", "TYPE: 'x'", any)},
+            {{"event", "1", "x"}, noNumber("event", "PARAM: 'x'", any)},
+            {{"session", "restore", "2147483648"},
+             noNumber("session restore", "ID: '2147483648'", "-2147483648 to 2147483647")},
+            {{"config", "get", "gain", "a\""}, "config get: Bad parameter (KEY: 'a\"' is no key)"},
+            {{"config", "get", "a\\"}, "config get: Bad parameter (KEY: 'a\\' is no key)"},
+            {{"config", "get", ""}, "config get: Bad parameter (KEY: '' is no key)"},
+            {{"config", "load", "/no/such/file"},
+             "config load: Error opening file (/no/such/file: No such file or directory)"},
+            {{"config", "load", "/"}, "config load: Error reading file (/: Is a directory)"},
+            {{"config", "load", "/dev/zero"},
+             "config load: Data size exceeds size of buffer (/dev/zero has more than 1039360 "
+             "bytes, "
+             "the most that a transaction carries)"},
+    };
+    for (const auto& row : rows) {
+        std::vector<std::string> words = row.words;
+        words.insert(words.begin(), ZELK_BIN_DIR "/zelkctl");
+        const RunResult result = run(words);
+        EXPECT_EQ(1, result.status) << row.error;
+        EXPECT_EQ("", result.output);
+        EXPECT_EQ("zelkctl: " + row.error + "\n", result.errors);
     }
 }
 
