@@ -12,6 +12,7 @@
 #include <string>
 #include <vector>
 
+#include "pemaro/BpTouchCompanionService.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
 #include "tests/support/FakeServiceManager.h"
@@ -236,6 +237,52 @@ TEST_F(TouchCompanionSimulatorTest, HasAnAnalogFrontEnd) {
     EXPECT_EQ("300000", params.editValueFor("frequency").serialize());
     EXPECT_EQ(0, service->getAFEParams(channels));
     EXPECT_EQ(0u, channels.serialize().find("[{\"channel\":0,"));
+}
+
+// The text form of a map has its gaps: what a client is to read has to survive it.
+TEST_F(TouchCompanionSimulatorTest, AnswersWithTextsThatAProxyCanRead) {
+    service = new TouchCompanionSimulator(options);
+    const sp<ITouchCompanionService> proxy =
+            new BpTouchCompanionService(android::IInterface::asBinder(service));
+    SerializableMap properties;
+    EXPECT_EQ(0, proxy->getProperties(properties));
+    EXPECT_EQ(
+            "{\"authenticated\":false,\"events\":0,\"recordFilter\":3,\"rollingLogSize\":256,"
+            "\"sessions\":0}",
+            properties.serialize());
+    SerializableMap params;
+    EXPECT_EQ(0, proxy->getAFEParams(params));
+    EXPECT_EQ("{\"drive.voltage\":3.300000,\"frequency\":250000,\"integration.cycles\":16}",
+              params.serialize());
+    EXPECT_EQ(0, proxy->setAFEParams(params));
+    SerializableMapArray channels;
+    EXPECT_EQ(0, proxy->getAFEParams(channels));
+    SerializableMap last;
+    EXPECT_EQ(0, channels.get(3).getValue(last));
+    EXPECT_EQ(4u, last.size());
+    EXPECT_EQ("3", last.editValueFor("channel").serialize());
+    SerializableMap wanted;
+    for (const char* key : {"device.name", "edge.zones", "gain", "palm.rejection", "panel.size"}) {
+        wanted.add(key, std::string("?"));
+    }
+    EXPECT_EQ(0, proxy->getConfigParams(wanted));
+    EXPECT_EQ(
+            "{\"device.name\":\"simulated touch panel\",\"edge.zones\":[0,120,240],"
+            "\"gain\":1.500000,\"palm.rejection\":true,"
+            "\"panel.size\":{\"height\":2400,\"width\":1080}}",
+            wanted.serialize());
+    for (const char* text :
+         {"{\"DEBUG_COMMAND\":{\"REQUEST\":{\"ACTION\":\"SET_RECORD_FILTER\","
+          "\"PARAMETERS\":{\"MASK\":1}}}}",
+          "{\"PROPERTY_COMMAND\":{\"REQUEST\":{\"ACTION\":\"STR_SET_ROLLINGLOG_SIZE\","
+          "\"PARAMETERS\":{\"NUM_OF_ELEMENTS\":1,\"SEND_COMMAND_NAME\":\"setRollingLogSize\","
+          "\"VALUES\":[8]}}}}"}) {
+        SerializableMap request;
+        SerializableMap response;
+        EXPECT_EQ(0, request.unserialize(text));
+        EXPECT_EQ(0, proxy->sendCommand(request, response)) << text;
+        EXPECT_EQ(1u, response.size()) << text;
+    }
 }
 
 }  // namespace pemaro::simulator
