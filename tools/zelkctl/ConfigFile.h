@@ -7,7 +7,7 @@
 
 namespace pemaro::zelkctl {
 
-/** How a file fared: the status that says what is wrong in general, and what it is in particular. */
+/** How a file fared: a status that names the kind of failure, and what it was in particular. */
 struct FileResult {
     int status = STATUS_NO_ERROR;
     std::string detail;
