@@ -133,7 +133,6 @@ TEST(ManagerCommands, OfTheHandBiometricManager) {
             {{"hand", "security", "-2"}, 1, "setSecurity: Bad parameter\n"},
             {{"hand", "match"}, 0, "matching started\n"},
             {{"hand", "scan"}, 1, "scan: Invalid state\n"},
-            {{"hand", "enroll", "-n", "1"}, 1, "startEnrollment: Invalid state\n"},
             {{"hand", "match", "--stop"}, 0, "matching stopped\n"},
             {{"hand", "enroll", "--stop"}, 1, "stopEnrollment: Invalid state\n"},
             {{"hand", "cancel"}, 1, "cancelScan: Invalid state\n"},
@@ -220,10 +219,12 @@ TEST(ManagerCommands, WaitForAServiceThatIsAboutToCome) {
 TEST(ManagerCommands, TellTheStatusOfAFaultyService) {
     TouchStack stack({"--fault", "touch.subscribe=status:0x40000006", "--fault",
                       "gesture.getMaxPreDefinedGesture=status:0x40000015", "--fault",
-                      "hand.scan=die"});
+                      "hand.startEnrollment=status:0x40000010", "--fault", "hand.scan=die"});
     expectRows({
             {{"touch", "watch"}, 1, "init: Error allocating memory\n"},
             {{"gesture", "limits"}, 1, "getMaxPreDefinedGesture: Timeout has occurred\n"},
+            {{"hand", "enroll"}, 1, "startEnrollment: Error involving AFE HAL\n"},
+            {{"hand", "enroll", "-n", "1"}, 1, "startEnrollment: Error involving AFE HAL\n"},
             {{"hand", "scan"}, 1, "scan: An unknown error has occurred\n"},
     });
 }

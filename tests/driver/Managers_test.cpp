@@ -51,16 +51,21 @@ struct Touch {
     }
 };
 
-struct Gesture {
-    using Client = GestureManagerClient;
-    static constexpr const char* kName = "gesture";
+// What the managers whose clients watch their service have in common.
+template <typename ManagerClient, typename Record>
+struct Watched {
+    using Client = ManagerClient;
     static constexpr int kDeathsTold = 1;
-    static constexpr int kRounds = 1000;
 
     static sp<Client> make(RecordCollector& events) {
-        return new Client(RecordCollector::onEvent<IGestureManagerClient::GestureData>,
-                          RecordCollector::onDeath, &events);
+        return new Client(RecordCollector::onEvent<Record>, RecordCollector::onDeath, &events);
     }
+};
+
+struct Gesture : Watched<GestureManagerClient, IGestureManagerClient::GestureData> {
+    static constexpr const char* kName = "gesture";
+    static constexpr int kRounds = 1000;
+
     static int letEventsFlow(Client& client) { return client.startGestureDetection(); }
     static int ask(Client& client) {
         unsigned int count = 0;
@@ -69,16 +74,10 @@ struct Gesture {
     static bool isIntact(const std::string& record) { return Touch::isIntact(record); }
 };
 
-struct Hand {
-    using Client = HandBiometricManagerClient;
+struct Hand : Watched<HandBiometricManagerClient, IHandBiometricManagerClient::HandBioData> {
     static constexpr const char* kName = "hand";
-    static constexpr int kDeathsTold = 1;
     static constexpr int kRounds = 250;
 
-    static sp<Client> make(RecordCollector& events) {
-        return new Client(RecordCollector::onEvent<IHandBiometricManagerClient::HandBioData>,
-                          RecordCollector::onDeath, &events);
-    }
     static int letEventsFlow(Client& client) { return client.startMatching(); }
     static int ask(Client& client) {
         unsigned int count = 0;
@@ -262,9 +261,27 @@ struct GestureSamples : testing::Test {
         return client->addGesture(count, samples.data(), number);
     }
 
-    int verify(int shape) {
-        Samples samples = samplesOf(shape, 1);
-        return client->verifyGesture(samples.data(), number);
+    // A service gives the room of a transaction back a moment after its reply. What follows a large
+    // one may still find none.
+    int addSoon(int shape, int count) {
+        return soon([=] { return add(shape, count); });
+    }
+
+    int verifySoon(int shape) {
+        return soon([=] {
+            Samples samples = samplesOf(shape, 1);
+            return client->verifyGesture(samples.data(), number);
+        });
+    }
+
+    template <typename Operation>
+    static int soon(Operation operation) {
+        int status = operation();
+        for (int i = 0; status == 0x40000000 && i < 100; ++i) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(50));
+            status = operation();
+        }
+        return status;
     }
 
     TouchStack stack{{"--services", "gesture"}};
@@ -279,11 +296,11 @@ TEST_F(GestureSamples, OneAndAsManyAsATransactionHoldsAreStored) {
     EXPECT_EQ(14, kMostSamples);
     EXPECT_EQ(0, add(5, 1));
     EXPECT_EQ(9, number);
-    EXPECT_EQ(0, add(6, kMostSamples));
+    EXPECT_EQ(0, addSoon(6, kMostSamples));
     EXPECT_EQ(10, number);
-    EXPECT_EQ(0, verify(5));
+    EXPECT_EQ(0, verifySoon(5));
     EXPECT_EQ(9, number);
-    EXPECT_EQ(0, verify(6));
+    EXPECT_EQ(0, verifySoon(6));
     EXPECT_EQ(10, number);
 }
 
@@ -294,10 +311,10 @@ TEST_F(GestureSamples, TooManyAreRefusedAndNothingIsLost) {
         EXPECT_EQ(0x40000000, add(6, count)) << count;
         EXPECT_EQ(-7, number);
     }
-    EXPECT_EQ(0, verify(5));
+    EXPECT_EQ(0, verifySoon(5));
     EXPECT_EQ(9, number);
-    EXPECT_EQ(0x40000019, verify(6));
-    EXPECT_EQ(0, add(6, kMostSamples)) << "the room is given back";
+    EXPECT_EQ(0x40000019, verifySoon(6));
+    EXPECT_EQ(0, addSoon(6, kMostSamples)) << "the room is given back";
     EXPECT_EQ(10, number);
     EXPECT_TRUE(stack.process().isRunning());
     EXPECT_EQ(0, events.deaths());
