@@ -15,6 +15,10 @@ if(ZELK_SANITIZE)
   if(ZELK_SANITIZE MATCHES "undefined")
     # vptr checks need RTTI of the platform's classes, which its libraries do not promise.
     target_compile_options(zelk_options INTERFACE -fno-sanitize-recover=all -fno-sanitize=vptr)
+    if(CMAKE_CXX_COMPILER_ID MATCHES "Clang")
+      target_compile_options(zelk_options INTERFACE
+        -fsanitize-ignorelist=${CMAKE_SOURCE_DIR}/cmake/sanitizer-ignore.txt)
+    endif()
   endif()
 endif()
 if(ZELK_COVERAGE)
