@@ -42,7 +42,8 @@ check_distribution() {
 
 missing_packages() {
     local installed
-    installed=$(dpkg-query -W -f '${db:Status-Abbrev}${Package}\n' "$@" 2>/dev/null |
+    # It fails where it does not know one of them, and tells of the others all the same.
+    installed=$({ dpkg-query -W -f '${db:Status-Abbrev}${Package}\n' "$@" 2>/dev/null || true; } |
         sed -n 's/^ii //p')
     comm -23 <(printf '%s\n' "$@" | sort -u) <(sort -u <<<"$installed")
 }

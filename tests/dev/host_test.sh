@@ -50,6 +50,13 @@ no-such-package-2" "$(missing_packages no-such-package-2 bash no-such-package-1 
     expect_equal "" "$(missing_packages bash)"
 }
 
+# ./dev ends at the first command that fails, and dpkg-query fails for a package that it does not know.
+test_missing_packages_are_told_to_a_script_that_ends_at_errors() {
+    expect_equal "no-such-package" "$(bash -euo pipefail -c '. "$1/lib.sh"; . "$1/packages.sh"
+        mapfile -t missing < <(missing_packages bash no-such-package); echo "${missing[*]}"' \
+        bash "$ROOT/platform")"
+}
+
 test_installed_packages_cost_no_apt() {
     apt-get() { fail "apt-get was run"; }
     expect_status 0 need_packages bash coreutils
