@@ -18,13 +18,11 @@
 
 namespace pemaro::simulator {
 
-/**
- * What the service knows about one client process: the binders that it registered, and its
- * recording, which goes through idle, prepared and running. Not synchronised.
- *
- * A call names its client by the calling process alone, so that two client objects of one process
- * share one record, and the record lives as long as any of them is registered.
- */
+/// What the service knows about one client process: the binders that it registered, and its
+/// recording, which goes through idle, prepared and running. Not synchronised.
+///
+/// A call names its client by the calling process alone, so that two client objects of one process
+/// share one record, and the record lives as long as any of them is registered.
 class ClientRecord {
   public:
     ClientRecord(pid_t pid, const SimulatorOptions& options,
@@ -33,9 +31,9 @@ class ClientRecord {
     pid_t pid() const { return mPid; }
 
     void addHandle(const android::sp<android::IBinder>& handle) { mHandles.push_back(handle); }
-    /** Forgets the handle registered last and returns it. REQUIRES: hasHandles(). */
+    /// Forgets the handle registered last and returns it. REQUIRES: hasHandles().
     android::sp<android::IBinder> takeHandle();
-    /** False when it was none of this client's. */
+    /// False when it was none of this client's.
     bool removeHandle(const android::IBinder* handle);
     bool hasHandles() const { return !mHandles.empty(); }
 
@@ -47,7 +45,7 @@ class ClientRecord {
     int setOutput(int output);
     int setFile(const std::string& path);
     int prepare();
-    /** Null unless a recording to shared memory is prepared and not yet running. */
+    /// Null unless a recording to shared memory is prepared and not yet running.
     android::sp<android::IMemory> block() const;
     int start();
     int stop(Recording::Counts* counts);

@@ -14,19 +14,19 @@ constexpr const char* kProperty = "PROPERTY_COMMAND";
 constexpr int kDefaultDumpBytes = 65536;
 constexpr int kMaxDumpBytes = 262144;
 
-/** The map under `key`; false when there is none. */
+/// The map under `key`; false when there is none.
 bool getMap(const SerializableMap& from, const char* key, SerializableMap& map) {
     return from.valueFor(key).getValue(map) == STATUS_NO_ERROR;
 }
 
-/** A string value arrives with a string's tag; any other is no name. */
+/// A string value arrives with a string's tag; any other is no name.
 bool getText(const SerializableMap& from, const char* key, std::string& text) {
     SerializableMap copy = from;
     return copy.getType(key) == VALUE_TYPE_STRING &&
            from.valueFor(key).getValue(text) == STATUS_NO_ERROR;
 }
 
-/** The numbers of PARAMETERS, as many as NUM_OF_ELEMENTS tells. */
+/// The numbers of PARAMETERS, as many as NUM_OF_ELEMENTS tells.
 bool getNumbers(const SerializableMap& params, std::vector<int>& numbers) {
     int count = 0;
     if (params.valueFor("NUM_OF_ELEMENTS").getValue(count) != STATUS_NO_ERROR || count < 0) {

@@ -72,8 +72,7 @@ int readFile(const std::string& path, std::string* text) {
     return text->size() > kMaxFileBytes ? STATUS_DATA_EXCEEDS_BUFFER : STATUS_NO_ERROR;
 }
 
-/** Whether a text can be read as a map: it begins with a bracket, whatever follows is the reader's.
- */
+/// Whether a text can be read as a map: it begins with a bracket, whatever follows is the reader's.
 bool looksLikeMap(const std::string& text) {
     return !text.empty() && text[0] == '{';
 }

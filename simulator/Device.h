@@ -14,29 +14,27 @@
 
 namespace pemaro::simulator {
 
-/**
- * The state of the simulated device that all clients share: configuration, analog front end, record
- * filter, properties, events, sessions, authentication. Not synchronised. Operations return a
- * status of Status.h and change nothing when they fail.
- */
+/// The state of the simulated device that all clients share: configuration, analog front end, record
+/// filter, properties, events, sessions, authentication. Not synchronised. Operations return a
+/// status of Status.h and change nothing when they fail.
 class Device {
   public:
-    /** `authText` is what authenticate() accepts. */
+    /// `authText` is what authenticate() accepts.
     explicit Device(const std::string& authText);
 
     Configuration& configuration() { return mSettings.configuration; }
     const Configuration& configuration() const { return mSettings.configuration; }
-    /** Back to what the device was made with; STATUS_INVALID_STATE without authentication. */
+    /// Back to what the device was made with; STATUS_INVALID_STATE without authentication.
     int resetToFactory();
 
     void setFilter(uint32_t filter) { *mFilter = filter; }
     uint32_t filter() const { return *mFilter; }
-    /** The filter as running recordings see it. */
+    /// The filter as running recordings see it.
     std::shared_ptr<const std::atomic<uint32_t>> sharedFilter() const { return mFilter; }
 
     int setAfe(const SerializableMap& params);
     SerializableMap afe() const { return mSettings.afe; }
-    /** One map for each channel of the front end. */
+    /// One map for each channel of the front end.
     SerializableMapArray afeChannels() const;
 
     int setRollingLogSize(int kilobytes);
@@ -45,7 +43,7 @@ class Device {
     void countEvent() { mEvents += 1; }
     uint32_t events() const { return mEvents; }
 
-    /** Keeps the configuration, front end and filter of now under a new identifier, from 1. */
+    /// Keeps the configuration, front end and filter of now under a new identifier, from 1.
     int saveSession();
     int restoreSession(int id);
 

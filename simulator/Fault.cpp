@@ -79,7 +79,7 @@ constexpr std::string_view kOperations[] = {
 
 constexpr long kMaxDelayMs = 3600 * 1000;
 
-/** False when `name` names no operation of any service. */
+/// False when `name` names no operation of any service.
 bool readOperation(const std::string& name, Fault* fault) {
     if (std::find(std::begin(kOperations), std::end(kOperations), name) == std::end(kOperations)) {
         return false;
@@ -119,7 +119,7 @@ bool parseDelay(const std::string& text, std::chrono::milliseconds* delay) {
     return true;
 }
 
-/** The text behind `prefix`, if `text` begins with it. */
+/// The text behind `prefix`, if `text` begins with it.
 std::optional<std::string> after(const std::string& text, const std::string& prefix) {
     return text.compare(0, prefix.size(), prefix) == 0 ? std::optional(text.substr(prefix.size()))
                                                        : std::nullopt;

@@ -8,10 +8,10 @@
 
 namespace pemaro::simulator {
 
-/** A recording to a file: the frames, one after another, each of its own length. */
+/// A recording to a file: the frames, one after another, each of its own length.
 class FileWriter : public FrameSink {
   public:
-    /** Creates or empties the file; null when it cannot be opened. Never waits for a pipe. */
+    /// Creates or empties the file; null when it cannot be opened. Never waits for a pipe.
     static std::shared_ptr<FileWriter> open(const std::string& path);
 
     ~FileWriter() override;

@@ -8,16 +8,14 @@
 
 namespace pemaro::simulator {
 
-/**
- * Draws the frames of a recording: fingers that move along Lissajous figures over a panel of as
- * many cells as the frame has room for, each finger a bell of capacitance around its position.
- */
+/// Draws the frames of a recording: fingers that move along Lissajous figures over a panel of as
+/// many cells as the frame has room for, each finger a bell of capacitance around its position.
 class FrameGenerator {
   public:
-    /** REQUIRES: frameBytes >= sizeof(FrameHeader). Fingers that do not fit are left out. */
+    /// REQUIRES: frameBytes >= sizeof(FrameHeader). Fingers that do not fit are left out.
     FrameGenerator(uint32_t frameBytes, uint32_t fingers);
 
-    /** The next frame, valid until the next call; its size is the frame's length. */
+    /// The next frame, valid until the next call; its size is the frame's length.
     const std::vector<uint8_t>& draw(uint32_t sequence, uint64_t timeNs, uint32_t filter);
 
   private:

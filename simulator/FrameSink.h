@@ -5,12 +5,12 @@
 
 namespace pemaro::simulator {
 
-/** Where a recording's frames go. Used by one thread at a time. */
+/// Where a recording's frames go. Used by one thread at a time.
 class FrameSink {
   public:
     virtual ~FrameSink() = default;
 
-    /** Takes a whole frame. False when there is no room for it now; nothing is taken then. */
+    /// Takes a whole frame. False when there is no room for it now; nothing is taken then.
     virtual bool put(const void* frame, size_t length) = 0;
 };
 

@@ -16,22 +16,20 @@ using GestureManagerBase = ManagerSimulator<BnGestureManagerService, IGestureMan
                                             IGestureManagerClient::GestureData,
                                             &IGestureManagerClient::gestureCallback>;
 
-/**
- * A gesture manager that knows the shapes of Stroke.h, numbered from 1, and what users add to them,
- * each under the lowest free number from 9. All are enabled until told otherwise.
- *
- * While detection is on, the enabled gestures are drawn and reported in turn; while it is off but
- * wake-up is on, one in four, marked as a wake-up.
- *
- * A user's gesture is a number of samples, records of GestureRecord.h such as those reported. To
- * verify one is to compare it with every sample of every enabled user's gesture; the result is the
- * number of the most similar one, if it is similar to kSimilarEnough. Results are -1 otherwise.
- *
- * Statuses: 0x4000001B for null records, 0x4000000D for a count below 1, 0x4000000C for a record
- * that is not intact or nothing drawn, 0x4000000A when no further gesture can be defined,
- * 0x40000019 for a number that is not there or a gesture that resembles none, 0x4000000E for the
- * deletion of a shape that the panel knows by itself. Any thread may call.
- */
+/// A gesture manager that knows the shapes of Stroke.h, numbered from 1, and what users add to them,
+/// each under the lowest free number from 9. All are enabled until told otherwise.
+///
+/// While detection is on, the enabled gestures are drawn and reported in turn; while it is off but
+/// wake-up is on, one in four, marked as a wake-up.
+///
+/// A user's gesture is a number of samples, records of GestureRecord.h such as those reported. To
+/// verify one is to compare it with every sample of every enabled user's gesture; the result is the
+/// number of the most similar one, if it is similar to kSimilarEnough. Results are -1 otherwise.
+///
+/// Statuses: 0x4000001B for null records, 0x4000000D for a count below 1, 0x4000000C for a record
+/// that is not intact or nothing drawn, 0x4000000A when no further gesture can be defined,
+/// 0x40000019 for a number that is not there or a gesture that resembles none, 0x4000000E for the
+/// deletion of a shape that the panel knows by itself. Any thread may call.
 class GestureManagerSimulator : public GestureManagerBase {
   public:
     static constexpr double kSimilarEnough = 85;
@@ -39,7 +37,7 @@ class GestureManagerSimulator : public GestureManagerBase {
 
     explicit GestureManagerSimulator(const ManagerOptions& options);
 
-    /** The next gesture, if there is one. Its own clock calls this. */
+    /// The next gesture, if there is one. Its own clock calls this.
     void tick();
 
     int enableWakeup() override;

@@ -16,31 +16,29 @@ using HandManagerBase = ManagerSimulator<BnHandBiometricManagerService, IHandBio
                                          IHandBiometricManagerClient::HandBioData,
                                          &IHandBiometricManagerClient::handBiometricCallback>;
 
-/**
- * A hand biometric manager. It does one thing at a time, an enrollment, a scan or a matching, in
- * steps of its own clock, and reports them in the order that HandRecord.h tells.
- *
- * Each enrollment is of another person, whose profile is called "hand N" until setProfileName()
- * gives the one enrolled last another name; renameProfile() takes the current name first. Names are
- * of 1 to 47 bytes, and one is no other's.
- *
- * While matching goes on, each enrolled hand is laid on the panel twice, first with care and then
- * carelessly, and after all of them a stranger's. A hand matches the most similar profile if they
- * are as alike as the security level asks: 60, 75, 85 or 95 of 100 at the levels 0 to 3. The level
- * is 1 at first. Careful hands pass every level, careless ones the first two, strangers none.
- *
- * Statuses: 0x4000000B for what makes no sense now (something is going on already, or nothing is),
- * 0x4000000A when no further hand can be enrolled, 0x4000000D for a level or a name that is none,
- * 0x4000001B for a null name, 0x40000018 for a name that is taken, 0x40000019 for one that is not
- * there. Any thread may call.
- */
+/// A hand biometric manager. It does one thing at a time, an enrollment, a scan or a matching, in
+/// steps of its own clock, and reports them in the order that HandRecord.h tells.
+///
+/// Each enrollment is of another person, whose profile is called "hand N" until setProfileName()
+/// gives the one enrolled last another name; renameProfile() takes the current name first. Names are
+/// of 1 to 47 bytes, and one is no other's.
+///
+/// While matching goes on, each enrolled hand is laid on the panel twice, first with care and then
+/// carelessly, and after all of them a stranger's. A hand matches the most similar profile if they
+/// are as alike as the security level asks: 60, 75, 85 or 95 of 100 at the levels 0 to 3. The level
+/// is 1 at first. Careful hands pass every level, careless ones the first two, strangers none.
+///
+/// Statuses: 0x4000000B for what makes no sense now (something is going on already, or nothing is),
+/// 0x4000000A when no further hand can be enrolled, 0x4000000D for a level or a name that is none,
+/// 0x4000001B for a null name, 0x40000018 for a name that is taken, 0x40000019 for one that is not
+/// there. Any thread may call.
 class HandBiometricManagerSimulator : public HandManagerBase {
   public:
     static constexpr int kMaxSecurity = 3;
 
     explicit HandBiometricManagerSimulator(const ManagerOptions& options);
 
-    /** One step of what is going on. Its own clock calls this. */
+    /// One step of what is going on. Its own clock calls this.
     void tick();
 
     int startEnrollment() override;
@@ -84,7 +82,7 @@ class HandBiometricManagerSimulator : public HandManagerBase {
     void enroll(const HandImage& image);
 
     Profiles::iterator find(const char* name);
-    /** Gives a profile a name, if that is one and free. */
+    /// Gives a profile a name, if that is one and free.
     int rename(Profiles::iterator profile, const char* name);
 
     static std::shared_ptr<HandRecord> newEvent(HandEvent event);

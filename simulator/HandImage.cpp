@@ -16,7 +16,7 @@ constexpr double kDeviation = 40;
 
 using Plane = std::array<double, kHandColumns * kHandRows>;
 
-/** The sum of a few waves in directions of the person's own, with mean square 1 or about. */
+/// The sum of a few waves in directions of the person's own, with mean square 1 or about.
 Plane veins(uint32_t person) {
     std::minstd_rand random(2654435761u * (person + 1));
     const auto upTo = [&random](double high) {

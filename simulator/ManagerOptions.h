@@ -8,7 +8,7 @@
 
 namespace pemaro::simulator {
 
-/** What kind of managers are simulated beside the touch companion service. */
+/// What kind of managers are simulated beside the touch companion service.
 struct ManagerOptions {
     static constexpr double kMaxRate = 1000;
     static constexpr uint32_t kMaxUserGestures = 1000;
@@ -20,7 +20,7 @@ struct ManagerOptions {
     uint32_t handProfiles = 5;   ///< how many hands can be enrolled
     size_t queueRecords = 32;    ///< how many events wait for a slow subscriber
 
-    /** Told one line about each thing that happens, if set. Called with a service's lock held. */
+    /// Told one line about each thing that happens, if set. Called with a service's lock held.
     std::function<void(const std::string&)> narrate;
 };
 

@@ -17,22 +17,20 @@
 
 namespace pemaro::simulator {
 
-/**
- * What the simulated managers have in common: subscribers, faults, and a clock of their own.
- *
- * `Stub` is the service's stub, and `kCallback` the member of `Client` that takes a `Record`. A
- * derived class answers the operations through perform(), and has a `void tick()`; it calls
- * startTicking() at the end of its constructor and shutDown() in its destructor.
- */
+/// What the simulated managers have in common: subscribers, faults, and a clock of their own.
+///
+/// `Stub` is the service's stub, and `kCallback` the member of `Client` that takes a `Record`. A
+/// derived class answers the operations through perform(), and has a `void tick()`; it calls
+/// startTicking() at the end of its constructor and shutDown() in its destructor.
 template <typename Stub, typename Client, typename Record, int (Client::*kCallback)(Record*)>
 class ManagerSimulator : public Stub {
   public:
-    /** Faults may be ordered and withdrawn at any time. */
+    /// Faults may be ordered and withdrawn at any time.
     FaultTable& faults() { return mFaults; }
 
     SubscriberList::Counts counts() const { return mSubscribers->counts(); }
 
-    /** Ends all events and forgets all subscribers. */
+    /// Ends all events and forgets all subscribers.
     void shutDown() {
         mTicker.reset();
         mSubscribers->clear();
@@ -67,7 +65,7 @@ class ManagerSimulator : public Stub {
         mTicker = std::make_unique<Ticker>(rate, [self] { self->tick(); });
     }
 
-    /** Runs an operation under the lock, unless a fault takes its place. */
+    /// Runs an operation under the lock, unless a fault takes its place.
     template <typename Body>
     int perform(const char* operation, Body body) {
         if (const auto status = mFaults.strike(operation)) {
@@ -77,7 +75,7 @@ class ManagerSimulator : public Stub {
         return body();
     }
 
-    /** Reports an event to all subscribers, without waiting for any. */
+    /// Reports an event to all subscribers, without waiting for any.
     template <typename Layout>
     void publish(std::shared_ptr<const Layout> record) {
         static_assert(sizeof(Layout) == sizeof(Record), "a record has one size");

@@ -6,7 +6,7 @@
 
 namespace pemaro::simulator {
 
-/** CLOCK_MONOTONIC in nanoseconds, as records and frames carry it. */
+/// CLOCK_MONOTONIC in nanoseconds, as records and frames carry it.
 inline uint64_t monotonicTimeNs() {
     const auto now = std::chrono::steady_clock::now().time_since_epoch();
     return static_cast<uint64_t>(std::chrono::duration_cast<std::chrono::nanoseconds>(now).count());

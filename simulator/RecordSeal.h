@@ -14,7 +14,7 @@ namespace pemaro::simulator {
 // What all records of the managers begin with, field for field as a frame does, so that a frame's
 // checksum serves them too.
 
-/** Fills in what is the same in every record of a kind, the time, and last the checksum. */
+/// Fills in what is the same in every record of a kind, the time, and last the checksum.
 template <typename Record>
 void sealRecord(uint32_t magic, uint16_t version, size_t headerBytes, Record* record) {
     static_assert(offsetof(Record, checksum) == offsetof(FrameHeader, checksum), "record layout");
@@ -26,7 +26,7 @@ void sealRecord(uint32_t magic, uint16_t version, size_t headerBytes, Record* re
     record->checksum = frameChecksum(record, sizeof(*record));
 }
 
-/** Copies a record, of whatever alignment; null for one that is not intact or of another kind. */
+/// Copies a record, of whatever alignment; null for one that is not intact or of another kind.
 template <typename Record>
 std::shared_ptr<const Record> readSealedRecord(uint32_t magic, uint16_t version,
                                                const void* record) {

@@ -92,7 +92,7 @@ const std::vector<uint8_t>& Recording::Worker::drawNext() {
     return generator.draw(sequence, monotonicTimeNs(), filter->load(std::memory_order_relaxed));
 }
 
-/** False when the recording is to end. */
+/// False when the recording is to end.
 bool Recording::Worker::sleepUntil(Clock::time_point when) {
     std::unique_lock<std::mutex> guard(lock);
     return !changed.wait_until(guard, when, [this] { return stopping; });

@@ -11,7 +11,7 @@
 
 namespace pemaro::simulator {
 
-/** A running recording: a thread that draws frames at a fixed rate and puts them into a sink. */
+/// A running recording: a thread that draws frames at a fixed rate and puts them into a sink.
 class Recording {
   public:
     struct Counts {
@@ -19,21 +19,17 @@ class Recording {
         uint64_t dropped = 0;   ///< those of them that the sink had no room for
     };
 
-    /**
-     * Starts the thread. `rate` is in frames a second; 0 draws a frame whenever the sink has room,
-     * so that none is ever dropped. `filter` may change while the recording runs.
-     */
+    /// Starts the thread. `rate` is in frames a second; 0 draws a frame whenever the sink has room,
+    /// so that none is ever dropped. `filter` may change while the recording runs.
     Recording(std::shared_ptr<FrameSink> sink, const FrameGenerator& generator, double rate,
               std::shared_ptr<const std::atomic<uint32_t>> filter);
 
-    /** Stops the recording. */
+    /// Stops the recording.
     ~Recording();
 
-    /**
-     * Ends the thread and tells what it did. A thread that does not end within two seconds is
-     * abandoned with all that it uses: a reader that was killed inside a wait on the shared
-     * condition can leave it in a state that blocks whoever signals it.
-     */
+    /// Ends the thread and tells what it did. A thread that does not end within two seconds is
+    /// abandoned with all that it uses: a reader that was killed inside a wait on the shared
+    /// condition can leave it in a state that blocks whoever signals it.
     Counts stop();
 
   private:

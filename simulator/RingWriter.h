@@ -12,22 +12,20 @@
 
 namespace pemaro::simulator {
 
-/**
- * The service's end of the shared ring. It makes the memory, and writes frames into it while there
- * is room; see TouchCompanionSharedCblk.h for the layout.
- *
- * The other end is a process that may die or misbehave at any moment, so nothing in the block is
- * believed but `read`, and that only as a number: the writer keeps its own copies of the geometry
- * and of its index. It never takes the block's mutex, which a reader that was killed may hold for
- * ever, and never destroys the mutex or the condition, for which it would have to wait for a reader
- * that is no more.
- */
+/// The service's end of the shared ring. It makes the memory, and writes frames into it while there
+/// is room; see TouchCompanionSharedCblk.h for the layout.
+///
+/// The other end is a process that may die or misbehave at any moment, so nothing in the block is
+/// believed but `read`, and that only as a number: the writer keeps its own copies of the geometry
+/// and of its index. It never takes the block's mutex, which a reader that was killed may hold for
+/// ever, and never destroys the mutex or the condition, for which it would have to wait for a reader
+/// that is no more.
 class RingWriter : public FrameSink {
   public:
-    /** Null when there is no memory for the block. */
+    /// Null when there is no memory for the block.
     static std::shared_ptr<RingWriter> create(uint32_t frameBytes, uint32_t ringFrames);
 
-    /** What getCblk() hands out. */
+    /// What getCblk() hands out.
     const android::sp<android::IMemory>& memory() const { return mMemory; }
 
     bool put(const void* frame, size_t length) override;

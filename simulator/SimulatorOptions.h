@@ -9,7 +9,7 @@
 
 namespace pemaro::simulator {
 
-/** What kind of touch stack is simulated. */
+/// What kind of touch stack is simulated.
 struct SimulatorOptions {
     static constexpr uint32_t kMinFrameBytes = sizeof(FrameHeader);
     static constexpr uint32_t kMaxFrameBytes = 1 << 20;
@@ -25,7 +25,7 @@ struct SimulatorOptions {
     std::string configPath;         ///< the configuration's own place; empty: it has none
     std::string authText = "zelk";  ///< what setAuth() accepts
 
-    /** Told one line about each thing that happens, if set. Called with the service's lock held. */
+    /// Told one line about each thing that happens, if set. Called with the service's lock held.
     std::function<void(const std::string&)> narrate;
 };
 

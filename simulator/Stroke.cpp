@@ -25,7 +25,7 @@ double distance(Position a, Position b) {
     return std::hypot(a.x - b.x, a.y - b.y);
 }
 
-/** The corners of a shape within the unit square. */
+/// The corners of a shape within the unit square.
 Path corners(int shape) {
     switch (shape) {
         case 1:
@@ -53,7 +53,7 @@ Path corners(int shape) {
     return circle;
 }
 
-/** `count` points at equal distances along a path. */
+/// `count` points at equal distances along a path.
 Path resample(const Path& path, size_t count) {
     double length = 0;
     for (size_t i = 1; i < path.size(); ++i) {
@@ -100,7 +100,7 @@ Path pathOf(const Stroke& stroke) {
     return path;
 }
 
-/** Moved to the centre 0 and scaled to the size 1. */
+/// Moved to the centre 0 and scaled to the size 1.
 Path normalize(Path path) {
     const Box box = boundsOf(path);
     for (Position& position : path) {
@@ -114,7 +114,7 @@ uint16_t onPanel(double position, int size) {
     return static_cast<uint16_t>(std::clamp<long>(std::lround(position), 0, size - 1));
 }
 
-/** A normalised path, drawn by a hand somewhere on the panel. */
+/// A normalised path, drawn by a hand somewhere on the panel.
 Stroke draw(const Path& path, uint32_t variation) {
     std::minstd_rand random(variation + 1);
     const auto between = [&random](double low, double high) {

@@ -13,16 +13,14 @@
 
 namespace pemaro::simulator {
 
-/**
- * One subscriber of a manager: a queue of records and a thread that hands them over, one after
- * another. A callback is a synchronous call into another process, which may take its time, stand
- * still or call back meanwhile; with a thread to each, it is its own events alone that wait. Any
- * thread may call.
- */
+/// One subscriber of a manager: a queue of records and a thread that hands them over, one after
+/// another. A callback is a synchronous call into another process, which may take its time, stand
+/// still or call back meanwhile; with a thread to each, it is its own events alone that wait. Any
+/// thread may call.
 class Subscriber : public std::enable_shared_from_this<Subscriber> {
   public:
     using Record = std::shared_ptr<const void>;
-    /** Calls the subscriber with a record; returns its status. */
+    /// Calls the subscriber with a record; returns its status.
     using Deliver = std::function<int(const void* record)>;
 
     struct Counts {
@@ -33,20 +31,20 @@ class Subscriber : public std::enable_shared_from_this<Subscriber> {
         Counts& operator+=(const Counts& other);
     };
 
-    /** Starts the thread. At most `queueLimit` records wait. */
+    /// Starts the thread. At most `queueLimit` records wait.
     static std::shared_ptr<Subscriber> start(const android::sp<android::IBinder>& handle,
                                              Deliver deliver, size_t queueLimit);
 
     const android::sp<android::IBinder>& handle() const { return mHandle; }
 
-    /** Never waits: the oldest record gives way when the queue is full. */
+    /// Never waits: the oldest record gives way when the queue is full.
     void put(Record record);
 
-    /** Asks the thread to end, from whatever thread, and does not wait: a subscriber may leave from
-     * within its own callback. At most the call under way goes on. */
+    /// Asks the thread to end, from whatever thread, and does not wait: a subscriber may leave from
+    /// within its own callback. At most the call under way goes on.
     void stop();
 
-    /** Waits for the thread that was asked to end. */
+    /// Waits for the thread that was asked to end.
     bool waitUntilStopped(std::chrono::steady_clock::time_point deadline);
     bool hasStopped() const;
 

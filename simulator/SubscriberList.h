@@ -14,10 +14,8 @@
 
 namespace pemaro::simulator {
 
-/**
- * The subscribers of a manager. A subscriber is its callback binder, however often it subscribes;
- * one whose process dies is forgotten. Any thread may call.
- */
+/// The subscribers of a manager. A subscriber is its callback binder, however often it subscribes;
+/// one whose process dies is forgotten. Any thread may call.
 class SubscriberList : public android::IBinder::DeathRecipient {
   public:
     struct Counts : Subscriber::Counts {
@@ -25,20 +23,20 @@ class SubscriberList : public android::IBinder::DeathRecipient {
         uint64_t published = 0;
     };
 
-    /** `narrate` may be null; it is told a line about each that comes and goes. */
+    /// `narrate` may be null; it is told a line about each that comes and goes.
     SubscriberList(const char* service, size_t queueLimit,
                    std::function<void(const std::string&)> narrate);
 
-    /** Subscribing again changes nothing and is no error. */
+    /// Subscribing again changes nothing and is no error.
     int add(const android::sp<android::IBinder>& handle, Subscriber::Deliver deliver);
     int remove(const android::sp<android::IBinder>& handle);
 
-    /** Queues a record for each subscriber. */
+    /// Queues a record for each subscriber.
     void publish(const Subscriber::Record& record);
 
     Counts counts() const;
 
-    /** Forgets all, and waits a moment for the calls under way. */
+    /// Forgets all, and waits a moment for the calls under way.
     void clear();
 
     void binderDied(const android::wp<android::IBinder>& who) override;

@@ -8,13 +8,13 @@
 
 namespace pemaro::simulator {
 
-/** Calls a function at a fixed rate, from a thread of its own, as long as it lives. */
+/// Calls a function at a fixed rate, from a thread of its own, as long as it lives.
 class Ticker {
   public:
-    /** `rate` is in calls a second; there are none at 0. The first comes after one period. */
+    /// `rate` is in calls a second; there are none at 0. The first comes after one period.
     Ticker(double rate, std::function<void()> onTick);
 
-    /** Waits for a call under way. */
+    /// Waits for a call under way.
     ~Ticker();
     Ticker(const Ticker&) = delete;
     Ticker& operator=(const Ticker&) = delete;

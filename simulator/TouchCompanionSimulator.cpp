@@ -15,7 +15,7 @@ using android::wp;
 
 namespace pemaro::simulator {
 
-/** Tells the service which handle's process died. */
+/// Tells the service which handle's process died.
 class TouchCompanionSimulator::DeathWatcher : public IBinder::DeathRecipient {
   public:
     explicit DeathWatcher(TouchCompanionSimulator* service) : mService(service) {}
@@ -34,7 +34,7 @@ class TouchCompanionSimulator::DeathWatcher : public IBinder::DeathRecipient {
 TouchCompanionSimulator::TouchCompanionSimulator(const SimulatorOptions& options)
         : mOptions(options), mDevice(options.authText), mInterpreter(mDevice) {}
 
-/** Runs an operation under the lock, unless a fault takes its place. */
+/// Runs an operation under the lock, unless a fault takes its place.
 template <typename Body>
 int TouchCompanionSimulator::perform(const char* operation, Body body) {
     if (const auto status = mFaults.strike(operation)) {
@@ -44,7 +44,7 @@ int TouchCompanionSimulator::perform(const char* operation, Body body) {
     return body();
 }
 
-/** The same for an operation of a registered client, which is handed to `body`. */
+/// The same for an operation of a registered client, which is handed to `body`.
 template <typename Body>
 int TouchCompanionSimulator::performForClient(const char* operation, Body body) {
     return perform(operation, [&] {

@@ -17,18 +17,16 @@
 
 namespace pemaro::simulator {
 
-/**
- * A touch companion service with a simulated device behind it.
- *
- * A client is a calling process: it registers, opens, and records; each recording client has a ring
- * and a writer of its own, and a client that dies is forgotten together with its recording. What is
- * asked out of turn is answered with 0x4000000B, what makes no sense with 0x4000000D or a status
- * that tells more. Any thread may call.
- *
- *     android::sp<TouchCompanionSimulator> service = new TouchCompanionSimulator(options);
- *     android::defaultServiceManager()->addService(android::String16("pemaro.TouchService"),
- *                                                  service);
- */
+/// A touch companion service with a simulated device behind it.
+///
+/// A client is a calling process: it registers, opens, and records; each recording client has a ring
+/// and a writer of its own, and a client that dies is forgotten together with its recording. What is
+/// asked out of turn is answered with 0x4000000B, what makes no sense with 0x4000000D or a status
+/// that tells more. Any thread may call.
+///
+///     android::sp<TouchCompanionSimulator> service = new TouchCompanionSimulator(options);
+///     android::defaultServiceManager()->addService(android::String16("pemaro.TouchService"),
+///                                                  service);
 class TouchCompanionSimulator : public BnTouchCompanionService {
   public:
     struct Totals {
@@ -40,12 +38,12 @@ class TouchCompanionSimulator : public BnTouchCompanionService {
 
     explicit TouchCompanionSimulator(const SimulatorOptions& options);
 
-    /** Faults may be ordered and withdrawn at any time. */
+    /// Faults may be ordered and withdrawn at any time.
     FaultTable& faults() { return mFaults; }
 
     Totals totals();
 
-    /** Ends all recordings and forgets all clients. */
+    /// Ends all recordings and forgets all clients.
     void shutDown();
 
     int registerClient(const android::sp<ITouchCompanionClient>& client) override;
@@ -70,7 +68,7 @@ class TouchCompanionSimulator : public BnTouchCompanionService {
     int getAFEParams(SerializableMap& out) override;
     int getAFEParams(SerializableMapArray& out) override;
     int getPacketSize() override;
-    /** Events in the low 16 bits, clients in the next 8, running recordings in the high 8. */
+    /// Events in the low 16 bits, clients in the next 8, running recordings in the high 8.
     int inspect(unsigned int* value) override;
     int saveSession(int& sessionID) override;
     int restoreSession(int sessionID) override;

@@ -16,7 +16,7 @@
 
 namespace pemaro::simulator {
 
-/** The services of one process, or some of them. */
+/// The services of one process, or some of them.
 class TouchStack {
   public:
     struct Options {
@@ -28,16 +28,16 @@ class TouchStack {
     explicit TouchStack(const Options& options);
     ~TouchStack();
 
-    /** Orders a fault; nothing happens when its service is switched off. */
+    /// Orders a fault; nothing happens when its service is switched off.
     void order(const Fault& fault);
 
-    /** Registers all services; empty, or why the service manager refused one. */
+    /// Registers all services; empty, or why the service manager refused one.
     std::string registerAll();
 
-    /** Ends all that goes on, and forgets all clients. */
+    /// Ends all that goes on, and forgets all clients.
     void shutDown();
 
-    /** A line for each service about what it has done. */
+    /// A line for each service about what it has done.
     std::vector<std::string> summary();
 
   private:

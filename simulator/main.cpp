@@ -38,7 +38,7 @@ int fail(const std::string& problem) {
     return kExitFailure;
 }
 
-/** The texts of a command line that are looked at when all are there. */
+/// The texts of a command line that are looked at when all are there.
 struct Texts {
     std::vector<std::string> services;
     std::vector<std::string> faults;

@@ -3,13 +3,10 @@
 // The reader of the text form (TextWriter.cpp tells what is written). It accepts more than that:
 //
 //   - White space (space, tab, carriage return, line feed, vertical tab, form feed) around tokens,
-//   and
-//     anything before the first and behind the last bracket of the outermost container.
+//     and anything before the first and behind the last bracket of the outermost container.
 //   - Anything between a value of a map and the next key, a missing comma included. In an array,
-//   the
-//     one character behind a nested container is skipped, whatever it is.
-//   - A key without anything behind its colon, which is dropped; of equal keys, the last one
-//   counts.
+//     the one character behind a nested container is skipped, whatever it is.
+//   - A key without anything behind its colon, which is dropped; of equal keys, the last one counts.
 //   - A double quote with a backslash before it neither opens nor closes a quoted stretch. The
 //     backslash stays in the text.
 //

@@ -14,17 +14,17 @@ copy() {
 test_one_line_sources() {
     mkdir -p apt/sources.list.d
     cat >apt/sources.list <<'LIST'
-# deb http://deb.debian.org/debian bookworm main
-deb http://deb.debian.org/debian bookworm main contrib non-free-firmware
+# deb http://archive.example/debian bookworm main
+deb http://archive.example/debian bookworm main contrib non-free-firmware
 deb [arch=amd64 signed-by=/usr/share/keyrings/debian.gpg] http://mirror.example/debian bookworm-updates main
-deb-src http://deb.debian.org/debian bookworm main
+deb-src http://archive.example/debian bookworm main
 LIST
     echo 'deb https://packages.example/apt tool-bookworm main' >apt/sources.list.d/tool.list
     echo 'deb https://packages.example/debian bookworm stable' >apt/sources.list.d/other.list
     copy
     expect_equal "sources.list" "$(ls to)"
-    expect_equal 'deb http://deb.debian.org/debian bookworm main
-deb-src http://deb.debian.org/debian bookworm main
+    expect_equal 'deb http://archive.example/debian bookworm main
+deb-src http://archive.example/debian bookworm main
 deb [arch=amd64 signed-by=/usr/share/keyrings/debian.gpg] http://mirror.example/debian bookworm-updates main
 deb-src [arch=amd64 signed-by=/usr/share/keyrings/debian.gpg] http://mirror.example/debian bookworm-updates main' \
         "$(cat to/sources.list)"
@@ -35,7 +35,7 @@ test_deb822_sources() {
     cat >apt/sources.list.d/debian.sources <<'SOURCES'
 Types: deb
 # the mirror
-URIs: http://deb.debian.org/debian
+URIs: http://archive.example/debian
 Suites: bookworm bookworm-updates bookworm-backports
 Components: main contrib
 Signed-By:
@@ -56,7 +56,7 @@ Components: main
 SOURCES
     copy
     expect_equal 'types: deb deb-src
-uris: http://deb.debian.org/debian
+uris: http://archive.example/debian
 suites: bookworm bookworm-updates
 components: main
 signed-by:

@@ -6,13 +6,11 @@
 
 namespace pemaro::zelkctl {
 
-/** What a command does once the command line is known to be right; returns the exit status. */
+/// What a command does once the command line is known to be right; returns the exit status.
 using Action = std::function<int()>;
 
-/**
- * Each adds its commands and their arguments to `app`, and sets `action` when one is chosen. The
- * arguments live as long as `app`.
- */
+/// Each adds its commands and their arguments to `app`, and sets `action` when one is chosen. The
+/// arguments live as long as `app`.
 void addPingCommand(CLI::App& app, Action& action);
 void addRecordCommand(CLI::App& app, Action& action);
 void addRecordFileCommand(CLI::App& app, Action& action);

@@ -6,8 +6,8 @@
 
 namespace pemaro::zelkctl {
 
-/** Runs `body` with a connected facade of the exported factory and returns the exit status, which
- * is that of `body` when the connection was made. */
+/// Runs `body` with a connected facade of the exported factory and returns the exit status, which
+/// is that of `body` when the connection was made.
 template <typename Body>
 int withFacade(Body body) {
     const std::unique_ptr<Connection> connection = Connection::open();
@@ -18,7 +18,7 @@ int withFacade(Body body) {
     return facade == nullptr ? tools::kExitFailure : body(*facade);
 }
 
-/** The same with a client, for what the facade does not offer. */
+/// The same with a client, for what the facade does not offer.
 template <typename Body>
 int withClient(Body body) {
     const std::unique_ptr<Connection> connection = Connection::open();
@@ -29,8 +29,8 @@ int withClient(Body body) {
     return client == nullptr ? tools::kExitFailure : body(*client);
 }
 
-/** One operation of a client, and what is printed when it succeeded; `detail` is told with its
- * failure. */
+/// One operation of a client, and what is printed when it succeeded; `detail` is told with its
+/// failure.
 template <typename Operation>
 int operateClient(const char* name, Operation operation, const std::string& done,
                   const std::string& detail = "") {

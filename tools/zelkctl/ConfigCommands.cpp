@@ -31,7 +31,7 @@ int fail(const std::string& command, const FileResult& result) {
 
 // ---- values by key ----
 
-/** The text form of a map puts a key between quotes, and cannot quote a quote. */
+/// The text form of a map puts a key between quotes, and cannot quote a quote.
 int checkKeys(const Keys& keys) {
     for (const std::string& key : keys) {
         if (key.empty() || key.find_first_of("\"\\") != std::string::npos) {
@@ -61,7 +61,7 @@ Params wantedParams(const Keys& keys) {
     return params;
 }
 
-/** A parameter object hands out no maps and arrays; a client does, in their text form. */
+/// A parameter object hands out no maps and arrays; a client does, in their text form.
 int readContainers(const Keys& keys, Values& values) {
     const android::sp<TouchCompanionClient> client = Connection::openClient();
     if (client == nullptr) {
@@ -196,7 +196,7 @@ void addGetCommand(CLI::App& config, Action& action) {
     command->callback([=, &action] { action = [=] { return getValues(*keys, *json); }; });
 }
 
-/** A command about a file of ours. */
+/// A command about a file of ours.
 void addFileCommand(CLI::App& config, Action& action, const char* name, const char* help,
                     int (*run)(const std::string& path)) {
     auto path = std::make_shared<std::string>();
@@ -205,7 +205,7 @@ void addFileCommand(CLI::App& config, Action& action, const char* name, const ch
     command->callback([=, &action] { action = [=] { return run(*path); }; });
 }
 
-/** A command about a file of the service's. */
+/// A command about a file of the service's.
 void addServiceFileCommand(CLI::App& config, Action& action, const char* name, const char* help,
                            const char* operationName,
                            int (TouchCompanionClient::*operation)(const std::string*),

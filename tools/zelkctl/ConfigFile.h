@@ -7,7 +7,7 @@
 
 namespace pemaro::zelkctl {
 
-/** How a file fared: a status that names the kind of failure, and what it was in particular. */
+/// How a file fared: a status that names the kind of failure, and what it was in particular.
 struct FileResult {
     int status = STATUS_NO_ERROR;
     std::string detail;
@@ -15,10 +15,10 @@ struct FileResult {
     bool isGood() const { return status == STATUS_NO_ERROR; }
 };
 
-/** Reads a file whole; one of more than `limit` bytes is refused. */
+/// Reads a file whole; one of more than `limit` bytes is refused.
 FileResult readConfigFile(const std::string& path, size_t limit, std::string& bytes);
 
-/** Replaces a file by one with these bytes, or, when that fails, leaves the old one as it was. */
+/// Replaces a file by one with these bytes, or, when that fails, leaves the old one as it was.
 FileResult writeConfigFile(const std::string& path, const std::string& bytes);
 
 }  // namespace pemaro::zelkctl

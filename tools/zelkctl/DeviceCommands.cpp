@@ -13,7 +13,7 @@ namespace {
 
 using Text = std::unique_ptr<char, decltype(&free)>;
 
-/** A name that the text form of a map can carry, which has no way to quote a quote. */
+/// A name that the text form of a map can carry, which has no way to quote a quote.
 bool checkName(const char* command, const std::string& name) {
     if (!name.empty() && name.find_first_of("\"\\") == std::string::npos) {
         return true;
@@ -23,7 +23,7 @@ bool checkName(const char* command, const std::string& name) {
     return false;
 }
 
-/** The library takes all that stands behind the first space for numbers. */
+/// The library takes all that stands behind the first space for numbers.
 bool checkCommand(const std::string& text) {
     const size_t space = text.find(' ');
     return checkName("command", text.substr(0, space)) &&

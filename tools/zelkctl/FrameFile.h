@@ -8,21 +8,21 @@
 
 namespace pemaro::zelkctl {
 
-/** A file of raw frames, one after another. It never keeps a part of a frame. */
+/// A file of raw frames, one after another. It never keeps a part of a frame.
 class FrameFile {
   public:
     ~FrameFile();
 
-    /** Creates or empties the file; false, with the reason in problem(), when it cannot. */
+    /// Creates or empties the file; false, with the reason in problem(), when it cannot.
     bool open(const std::string& path);
 
-    /** Adds a frame. False after the first failure, and then nothing is written any more. */
+    /// Adds a frame. False after the first failure, and then nothing is written any more.
     bool write(const void* frame, size_t length);
 
-    /** Closes the file; false when something written before did not reach it. */
+    /// Closes the file; false when something written before did not reach it.
     bool close();
 
-    /** The first failure, told with the file's name; empty as long as there is none. */
+    /// The first failure, told with the file's name; empty as long as there is none.
     const std::string& problem() const { return mProblem; }
 
   private:

@@ -51,7 +51,7 @@ void FrameReceiver::take(const void* frame, size_t length) {
     }
 }
 
-/** What is wrong with a frame, or nothing. A frame of another kind has only its length to check. */
+/// What is wrong with a frame, or nothing. A frame of another kind has only its length to check.
 std::string FrameReceiver::check(const void* frame, size_t length) {
     const uint64_t number = mStats.frames + mStats.corrupt;
     if (length < kMinFrame || length > mPacketSize) {

@@ -11,7 +11,7 @@
 
 namespace pemaro::zelkctl {
 
-/** What a recording brought so far. */
+/// What a recording brought so far.
 struct FrameStats {
     uint64_t frames = 0;
     uint64_t bytes = 0;
@@ -22,22 +22,22 @@ struct FrameStats {
     std::string firstCorrupt;  ///< what was wrong with the first corrupt one
 };
 
-/** Takes the frames of a recording: checks, counts and writes them. */
+/// Takes the frames of a recording: checks, counts and writes them.
 class FrameReceiver {
   public:
-    /** `file` may be null; `limit` frames are taken, all if 0. */
+    /// `file` may be null; `limit` frames are taken, all if 0.
     FrameReceiver(FrameFile* file, uint64_t limit) : mFile(file), mLimit(limit) {}
 
-    /** To be told before the recording starts: no more than this is ever read of a frame. */
+    /// To be told before the recording starts: no more than this is ever read of a frame.
     void setPacketSize(uint32_t bytes) { mPacketSize = bytes; }
 
-    /** The data callback of the client; `context` is the receiver. */
+    /// The data callback of the client; `context` is the receiver.
     static void onFrame(int, void* frame, unsigned long length, void* context);
 
     FrameStats stats() const;
 
-    /** Waits until the receiver takes no more frames, having enough of them or nowhere to write
-     * them; false when that did not happen in time. */
+    /// Waits until the receiver takes no more frames, having enough of them or nowhere to write
+    /// them; false when that did not happen in time.
     bool waitUntilDone(std::chrono::milliseconds patience);
 
   private:

@@ -12,7 +12,7 @@ namespace {
 
 using Client = HandBiometricManagerClient;
 
-/** An activity of the service: how it is started, and how ended where it can be. */
+/// An activity of the service: how it is started, and how ended where it can be.
 struct Activity {
     const char* name;
     const char* help;
@@ -50,7 +50,7 @@ int act(const Activity& activity, const ActivityOptions& options) {
             fmt::format("{} started", activity.done));
 }
 
-/** A name as it can be printed on one line. */
+/// A name as it can be printed on one line.
 std::string printable(std::string name) {
     std::replace_if(
             name.begin(), name.end(), [](unsigned char byte) { return byte < ' ' || byte == 0x7F; },
@@ -131,7 +131,7 @@ void addProfilesCommand(CLI::App& hand, Action& action) {
     command->callback([json, &action] { action = [json] { return showProfiles(*json); }; });
 }
 
-/** A command about one profile by its name. */
+/// A command about one profile by its name.
 void addNameCommand(CLI::App& hand, Action& action, const char* name, const char* help,
                     const char* operationName, int (Client::*operation)(const char*),
                     const char* done) {

@@ -10,21 +10,19 @@
 
 namespace pemaro::zelkctl {
 
-/**
- * A JSON object on one line, its members in the order in which they are added.
- *
- *     JsonObject().add("session", 3).text()    // {"session":3}
- */
+/// A JSON object on one line, its members in the order in which they are added.
+///
+///     JsonObject().add("session", 3).text()    // {"session":3}
 class JsonObject {
   public:
     JsonObject() : mWriter(mBuffer) { mWriter.StartObject(); }
 
     JsonObject& add(const std::string& name, int64_t value);
-    /** Bytes that are no UTF-8 are replaced, each by U+FFFD: JSON has no place for them. */
+    /// Bytes that are no UTF-8 are replaced, each by U+FFFD: JSON has no place for them.
     JsonObject& add(const std::string& name, const std::string& value);
     JsonObject& add(const std::string& name, const std::vector<std::string>& values);
 
-    /** The whole object; nothing can be added any more. */
+    /// The whole object; nothing can be added any more.
     std::string text();
 
   private:

@@ -5,14 +5,12 @@
 
 namespace pemaro::zelkctl {
 
-/**
- * A line on stdout that tells how far a command is: on a terminal redrawn in place, and otherwise a
- * line of its own each time.
- */
+/// A line on stdout that tells how far a command is: on a terminal redrawn in place, and otherwise a
+/// line of its own each time.
 class LiveLine {
   public:
     LiveLine();
-    /** Ends the line, so that what follows stands on the next. */
+    /// Ends the line, so that what follows stands on the next.
     ~LiveLine();
 
     bool isTerminal() const { return mTerminal; }

@@ -21,7 +21,7 @@ void addManagerWatchCommand(CLI::App& manager, Action& action, const char* help)
             [options, &action] { action = [options] { return watchManager<Manager>(*options); }; });
 }
 
-/** A command with one number, which it hands to an operation; "NAME" prints "WHAT n NAMEd". */
+/// A command with one number, which it hands to an operation; "NAME" prints "WHAT n NAMEd".
 template <typename Manager>
 void addNumberCommand(CLI::App& manager, Action& action, const char* name, const char* help,
                       const char* what, const char* operationName,
@@ -39,7 +39,7 @@ void addNumberCommand(CLI::App& manager, Action& action, const char* name, const
     });
 }
 
-/** One of the two words that a switch takes, and what it does and prints. */
+/// One of the two words that a switch takes, and what it does and prints.
 template <typename Client>
 struct SwitchWord {
     const char* word;
@@ -48,7 +48,7 @@ struct SwitchWord {
     const char* done;
 };
 
-/** A command that takes one of two words. */
+/// A command that takes one of two words.
 template <typename Manager>
 void addSwitchCommand(CLI::App& manager, Action& action, const char* name, const char* help,
                       SwitchWord<typename Manager::Client> on,

@@ -39,8 +39,8 @@ struct HandManager {
     static android::sp<Client> create(EventReceiver* receiver);
 };
 
-/** Runs `body` with a connected client of a manager and returns the exit status, which is that of
- * `body` when the connection was made. */
+/// Runs `body` with a connected client of a manager and returns the exit status, which is that of
+/// `body` when the connection was made.
 template <typename Manager, typename Body>
 int withManager(Body body) {
     if (!startBinder()) {
@@ -62,7 +62,7 @@ int withManager(Body body) {
     return result;
 }
 
-/** The same for one operation and what it prints when it succeeded. */
+/// The same for one operation and what it prints when it succeeded.
 template <typename Manager, typename Operation>
 int operate(const char* name, Operation operation, const std::string& done) {
     return withManager<Manager>([&](typename Manager::Client& client) {
@@ -75,7 +75,7 @@ int operate(const char* name, Operation operation, const std::string& done) {
     });
 }
 
-/** Watches a manager's events, after an operation that the first connection is for, if any. */
+/// Watches a manager's events, after an operation that the first connection is for, if any.
 template <typename Manager>
 int watchManager(const WatchOptions& options, int (Manager::Client::*begin)() = nullptr,
                  const char* beginName = nullptr) {

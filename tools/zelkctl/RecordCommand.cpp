@@ -40,7 +40,7 @@ std::string describeLosses(const FrameStats& stats) {
                    : std::string("no sequence numbers");
 }
 
-/** Shows the progress of a recording now and then. */
+/// Shows the progress of a recording now and then.
 class Progress {
   public:
     explicit Progress(Clock::time_point start) : mStart(start), mShownAt(start) {}
@@ -65,7 +65,7 @@ class Progress {
     uint64_t mShownFrames = 0;
 };
 
-/** Returns when the recording is to end, for whatever reason; the seconds that it took. */
+/// Returns when the recording is to end, for whatever reason; the seconds that it took.
 double watch(const RecordOptions& options, const Connection& connection,
              const StopSignal& stopSignal, FrameReceiver& receiver) {
     const Clock::time_point start = Clock::now();
@@ -93,7 +93,7 @@ void printSummary(const FrameStats& stats, double seconds) {
                describeLosses(stats), stats.corrupt);
 }
 
-/** Stops the service, prints the summary, and judges how it went. */
+/// Stops the service, prints the summary, and judges how it went.
 int finish(ITouchCompanionFacade& facade, const Connection& connection, FrameFile& file,
            const FrameReceiver& receiver, double seconds) {
     const int status = facade.stopRecord();

@@ -25,7 +25,7 @@ struct RecordFileOptions {
     double seconds = 0;
 };
 
-/** The operation that failed, or null, and its status. */
+/// The operation that failed, or null, and its status.
 struct Outcome {
     const char* operation = nullptr;
     int status = STATUS_NO_ERROR;
@@ -44,7 +44,7 @@ Outcome start(TouchCompanionClient& client, const std::string& path) {
     return {status == STATUS_NO_ERROR ? nullptr : "startRecord", status};
 }
 
-/** Returns when the recording is to end, for whatever reason; the seconds that it took. */
+/// Returns when the recording is to end, for whatever reason; the seconds that it took.
 double wait(double seconds, const Connection& connection, const StopSignal& stopSignal) {
     const Clock::time_point begin = Clock::now();
     Seconds passed(0);

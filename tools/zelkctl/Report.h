@@ -11,19 +11,19 @@
 
 namespace pemaro::zelkctl {
 
-/** Tells in one line on stderr what went wrong; the exit status of a failed command. */
+/// Tells in one line on stderr what went wrong; the exit status of a failed command.
 inline int fail(const std::string& problem) {
     fflush(stdout);
     fmt::print(stderr, "zelkctl: {}\n", problem);
     return tools::kExitFailure;
 }
 
-/** The same for a service that is not there. */
+/// The same for a service that is not there.
 inline int failAbsent(const std::string& service) {
     return fail(fmt::format("the service {} is not running", service));
 }
 
-/** The same for an operation that returned a status, and what it was about, if that helps. */
+/// The same for an operation that returned a status, and what it was about, if that helps.
 inline int failStatus(const std::string& operation, int status, const std::string& detail = "") {
     return fail(fmt::format("{}: {}{}", operation, errStr(status),
                             detail.empty() ? "" : " (" + detail + ")"));

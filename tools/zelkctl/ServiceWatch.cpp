@@ -52,7 +52,7 @@ std::unique_ptr<ServiceWatch> ServiceWatch::await(const char* name,
     return watch;
 }
 
-/** Null as well for one that died a moment ago, which the service manager may still know. */
+/// Null as well for one that died a moment ago, which the service manager may still know.
 std::unique_ptr<ServiceWatch> ServiceWatch::find(const char* name) {
     const sp<IBinder> service =
             android::defaultServiceManager()->checkService(android::String16(name));

@@ -3,10 +3,8 @@
 
 namespace pemaro::zelkctl {
 
-/**
- * While one lives, SIGINT and SIGTERM ask the command to end instead of ending the process, once: a
- * second one has its usual effect, should the command be stuck.
- */
+/// While one lives, SIGINT and SIGTERM ask the command to end instead of ending the process, once: a
+/// second one has its usual effect, should the command be stuck.
 class StopSignal {
   public:
     StopSignal();

@@ -33,7 +33,7 @@ struct RegionOptions {
     bool off = false;
 };
 
-/** The supported ones of the features that were asked for. */
+/// The supported ones of the features that were asked for.
 int collectFeatures(Client& client, const FeaturesOptions& options,
                     std::vector<Feature>& features) {
     for (int64_t number = options.first; number <= options.last; ++number) {

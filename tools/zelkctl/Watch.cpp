@@ -22,7 +22,7 @@ constexpr double kMaxSeconds = 1e6;
 /// How soon a signal, or the service's death, is noticed.
 constexpr milliseconds kWatchPeriod(50);
 
-/** The watching of one client, from its first connection to its end. */
+/// The watching of one client, from its first connection to its end.
 class Watcher {
   public:
     Watcher(const WatchOptions& options, const Watched& watched, EventReceiver& receiver)
@@ -34,7 +34,7 @@ class Watcher {
                                                   std::chrono::duration<double>(options.seconds))
                                 : Clock::time_point::max()) {}
 
-    /** The exit status; what failed has been told. */
+    /// The exit status; what failed has been told.
     int run() {
         mService = ServiceWatch::await(mWatched.service, ServiceWatch::kPatience,
                                        [this] { return isOver(milliseconds(0)); });
@@ -58,7 +58,7 @@ class Watcher {
     }
 
   private:
-    /** Waits for so long to see whether the watch is to end. */
+    /// Waits for so long to see whether the watch is to end.
     bool isOver(milliseconds patience) {
         const auto left = std::max(Clock::duration(0), mDeadline - Clock::now());
         if (left < patience) {

@@ -10,7 +10,7 @@
 
 namespace pemaro::zelkctl {
 
-/** How to watch events, and for how long. */
+/// How to watch events, and for how long.
 struct WatchOptions {
     uint64_t count = 0;  ///< events; 0: any number
     double seconds = 0;  ///< 0: until told to stop
@@ -22,23 +22,21 @@ struct WatchOptions {
 
 void addWatchOptions(CLI::App& command, WatchOptions& options);
 
-/** What is watched: a manager's name, and its client. */
+/// What is watched: a manager's name, and its client.
 struct Watched {
     const char* service;
     std::function<int()> init;
     std::function<int()> deinit;
-    /** Run once, when the client is connected for the first time; may be null. */
+    /// Run once, when the client is connected for the first time; may be null.
     std::function<int()> begin;
     const char* beginName;
 };
 
-/** Makes the client whose events go to the receiver. */
+/// Makes the client whose events go to the receiver.
 using MakeWatched = std::function<Watched(EventReceiver*)>;
 
-/**
- * Prints events until there are enough or SIGINT or SIGTERM comes; returns the exit status. When
- * the service dies, the client is disconnected, waits for a new service, and connects again.
- */
+/// Prints events until there are enough or SIGINT or SIGTERM comes; returns the exit status. When
+/// the service dies, the client is disconnected, waits for a new service, and connects again.
 int watch(const WatchOptions& options, const MakeWatched& make);
 
 }  // namespace pemaro::zelkctl
