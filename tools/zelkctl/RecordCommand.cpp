@@ -8,6 +8,7 @@
 #include "tools/zelkctl/Connection.h"
 #include "tools/zelkctl/FrameFile.h"
 #include "tools/zelkctl/FrameReceiver.h"
+#include "tools/zelkctl/Lasting.h"
 #include "tools/zelkctl/LiveLine.h"
 #include "tools/zelkctl/Report.h"
 #include "tools/zelkctl/StopSignal.h"
@@ -21,10 +22,6 @@ using std::chrono::milliseconds;
 
 constexpr int kOutputMemory = 1;
 constexpr uint64_t kMaxFrames = 1000000000000;
-constexpr double kMinSeconds = 0.001;
-constexpr double kMaxSeconds = 1e6;
-/// How soon a signal, or the service's death, is noticed.
-constexpr milliseconds kWatchPeriod(50);
 constexpr milliseconds kRedrawPeriod(200);
 constexpr milliseconds kLinePeriod(1000);
 
@@ -158,8 +155,7 @@ void addRecordCommand(CLI::App& app, Action& action) {
     CLI::App* command = app.add_subcommand("record", "Record touch frames until told to stop");
     command->add_option("-n,--frames", options->frames, "End after so many frames")
             ->check(CLI::Range(uint64_t{1}, kMaxFrames));
-    command->add_option("-s,--seconds", options->seconds, "End after so many seconds")
-            ->check(CLI::Range(kMinSeconds, kMaxSeconds));
+    addSecondsOption(*command, options->seconds);
     command->add_option("-o,--output", options->output,
                         "File to write the frames to, one after another");
     command->callback([options, &action] { action = [options] { return record(*options); }; });

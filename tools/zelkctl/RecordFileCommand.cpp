@@ -6,6 +6,7 @@
 
 #include "tools/zelkctl/Commands.h"
 #include "tools/zelkctl/Companion.h"
+#include "tools/zelkctl/Lasting.h"
 #include "tools/zelkctl/StopSignal.h"
 
 namespace pemaro::zelkctl {
@@ -15,10 +16,6 @@ using Clock = std::chrono::steady_clock;
 using Seconds = std::chrono::duration<double>;
 
 constexpr int kOutputFile = 0;
-constexpr double kMinSeconds = 0.001;
-constexpr double kMaxSeconds = 1e6;
-/// How soon a signal, or the service's death, is noticed.
-constexpr std::chrono::milliseconds kWatchPeriod(50);
 
 struct RecordFileOptions {
     std::string path;
@@ -93,8 +90,7 @@ void addRecordFileCommand(CLI::App& app, Action& action) {
     CLI::App* command = app.add_subcommand(
             "record-file", "Make the service record to a file of its own until told to stop");
     command->add_option("PATH", options->path, "The file as the service sees it")->required();
-    command->add_option("-s,--seconds", options->seconds, "End after so many seconds")
-            ->check(CLI::Range(kMinSeconds, kMaxSeconds));
+    addSecondsOption(*command, options->seconds);
     command->callback([=, &action] { action = [=] { return recordFile(*options); }; });
 }
 

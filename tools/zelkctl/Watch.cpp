@@ -6,6 +6,7 @@
 #include <memory>
 
 #include "tools/zelkctl/FrameFile.h"
+#include "tools/zelkctl/Lasting.h"
 #include "tools/zelkctl/Report.h"
 #include "tools/zelkctl/ServiceWatch.h"
 #include "tools/zelkctl/StopSignal.h"
@@ -17,10 +18,6 @@ using Clock = std::chrono::steady_clock;
 using std::chrono::milliseconds;
 
 constexpr uint64_t kMaxEvents = 1000000000000;
-constexpr double kMinSeconds = 0.001;
-constexpr double kMaxSeconds = 1e6;
-/// How soon a signal, or the service's death, is noticed.
-constexpr milliseconds kWatchPeriod(50);
 
 /// The watching of one client, from its first connection to its end.
 class Watcher {
@@ -100,8 +97,7 @@ class Watcher {
 void addWatchOptions(CLI::App& command, WatchOptions& options) {
     command.add_option("-n,--count", options.count, "End after so many events")
             ->check(CLI::Range(uint64_t{1}, kMaxEvents));
-    command.add_option("-s,--seconds", options.seconds, "End after so many seconds")
-            ->check(CLI::Range(kMinSeconds, kMaxSeconds));
+    addSecondsOption(command, options.seconds);
     command.add_option("-o,--output", options.output,
                        "File to write the events' records to, one after another");
     command.add_flag("--json", options.json, "Print each event as a line of JSON");
