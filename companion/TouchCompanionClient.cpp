@@ -4,15 +4,14 @@
 #include "pemaro/TouchCompanionClient.h"
 
 #include <binder/IPCThreadState.h>
-#include <binder/IServiceManager.h>
 #include <log/log.h>
-#include <utils/String16.h>
 #include <utils/Timers.h>
 
 #include <algorithm>
 #include <cstring>
 
 #include "companion/PlatformShims.h"
+#include "companion/ServiceLookup.h"
 #include "companion/TouchCompanionThread.h"
 #include "companion/Waiting.h"
 #include "pemaro/Status.h"
@@ -22,9 +21,7 @@ namespace pemaro {
 using android::IBinder;
 using android::IInterface;
 using android::IPCThreadState;
-using android::IServiceManager;
 using android::sp;
-using android::String16;
 
 namespace {
 
@@ -96,14 +93,8 @@ TouchCompanionClient::~TouchCompanionClient() {
 }
 
 int TouchCompanionClient::init() {
-    sp<IServiceManager> serviceManager = android::defaultServiceManager();
-    if (serviceManager == nullptr) {
-        ALOGE("couldn't get default service manager");
-        return STATUS_ERROR_ACQUIRING_RESOURCE;
-    }
-    sp<IBinder> binder = serviceManager->getService(String16(kServiceName));
+    sp<IBinder> binder = findService(LOG_TAG, kServiceName);
     if (binder == nullptr) {
-        ALOGE("couldn't find the service");
         return STATUS_ERROR_ACQUIRING_RESOURCE;
     }
     mService = ITouchCompanionService::asInterface(binder);

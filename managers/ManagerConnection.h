@@ -5,6 +5,7 @@
 
 #include <utility>
 
+#include "companion/ServiceLookup.h"
 #include "pemaro/Binder.h"
 #include "pemaro/Status.h"
 
@@ -19,12 +20,6 @@ namespace pemaro {
 //
 // (A touch manager client keeps the service when subscribing failed, and is not told of a death.)
 // Nothing is locked: see the clients' headers for what must not coincide.
-
-/// The service called `name`, asked for once; null, with the reason logged, when there is none.
-android::sp<android::IBinder> findService(const char* tag, const char* name);
-
-/// The same in ten attempts, with half a second of sleep after each that failed.
-android::sp<android::IBinder> awaitService(const char* tag, const char* name);
 
 void logManagerDebug(const char* tag, const char* text);
 void logManagerError(const char* tag, const char* text);
