@@ -4,6 +4,7 @@
 set(ZELK_PLATFORM_DIR "${CMAKE_SOURCE_DIR}/build/platform" CACHE PATH
     "Where the built platform libraries are installed")
 
+set(ZELK_PLATFORM_IS_BUILT OFF)
 if(NOT TARGET android::binder)
   if(NOT EXISTS "${ZELK_PLATFORM_DIR}/lib/cmake/AndroidPlatform/AndroidPlatformConfig.cmake")
     message(FATAL_ERROR
@@ -12,4 +13,5 @@ if(NOT TARGET android::binder)
             "and android::ui")
   endif()
   find_package(AndroidPlatform REQUIRED NO_DEFAULT_PATH PATHS "${ZELK_PLATFORM_DIR}")
+  set(ZELK_PLATFORM_IS_BUILT ON)
 endif()

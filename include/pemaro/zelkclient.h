@@ -44,3 +44,4 @@
 #include "pemaro/TouchCompanionFactory.h"
 #include "pemaro/TouchCompanionSharedCblk.h"
 #include "pemaro/TouchManagerClient.h"
+#include "pemaro/Version.h"
