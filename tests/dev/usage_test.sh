@@ -5,12 +5,14 @@
 . "$(dirname -- "$0")/lib.sh"
 
 dev=$ROOT/dev
-commands=(setup build test demo vm clean)
+mapfile -t commands < <(basename -s .sh -- "$ROOT"/platform/commands/*.sh)
 
 test_alone_prints_every_command() {
     expect_status 0 "$dev"
+    expect_equal "setup build test demo vm clean" \
+        "$(sed -nE 's/^  ([a-z]+) .*/\1/p' <<<"$OUTPUT" | head -n 6 | xargs)"
     for command in "${commands[@]}"; do
-        expect_contains "  $command " "$OUTPUT"
+        expect_equal 1 "$(grep -cE "^  $command .* [a-z]+" <<<"$OUTPUT")"
     done
 }
 

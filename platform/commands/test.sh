@@ -1,28 +1,49 @@
 # SPDX-License-Identifier: Apache-2.0
-# ./dev test: the stages, each a preset's tests with one label. Sourced by ./dev.
+#: test [options] | build and run all tests, with sanitizers and over the real Binder driver
 # shellcheck shell=bash
 
-TEST_STAGES=(native asan tsan driver dev)
+# In the order in which they run: the option's name and what it runs. stage_<name> does it, and is given the
+# regular expression that the tests' names have to match, or "".
+TEST_STAGES=(
+    'native|in one process, without the driver (release build)'
+    'asan|the native tests with AddressSanitizer and UndefinedBehaviorSanitizer'
+    'tsan|the native tests with ThreadSanitizer'
+    'driver|over the real Binder driver (release build; see ./dev vm)'
+    'dev|of ./dev itself'
+)
 
 # The slowest that the tests over the driver may be, in seconds, on a busy machine.
 DRIVER_TESTS_TIMEOUT=1800
 
+usage_test() {
+    local stage names=("${TEST_STAGES[@]%%|*}")
+    printf 'usage: ./dev test%s [-R REGEX]\n\n' "$(printf ' [--%s]' "${names[@]}")"
+    echo "Builds and runs the tests; without a selection all of them:"
+    for stage in "${TEST_STAGES[@]}"; do
+        printf '  --%-9s %s\n' "${stage%%|*}" "${stage#*|}"
+    done
+    echo "  -R REGEX    only tests whose name matches"
+}
+
 command_test() {
     local stage regex=''
-    local -a stages=() summary=()
+    local -a names=("${TEST_STAGES[@]%%|*}") stages=() summary=()
     while (($# > 0)); do
         case $1 in
-        --native | --asan | --tsan | --driver | --dev) stages+=("${1#--}") ;;
         -R)
             (($# > 1)) || die_usage "test: -R needs a regular expression"
             regex=$2
             shift
             ;;
-        *) die_usage "test: unknown option '$1'; ./dev test --help lists them" ;;
+        *)
+            [[ $1 == --?* && " ${names[*]} " == *" ${1#--} "* ]] ||
+                die_usage "test: unknown option '$1'; ./dev test --help lists them"
+            stages+=("${1#--}")
+            ;;
         esac
         shift
     done
-    ((${#stages[@]} > 0)) || stages=("${TEST_STAGES[@]}")
+    ((${#stages[@]} > 0)) || stages=("${names[@]}")
     trap 'exit 130' INT
     for stage in "${stages[@]}"; do
         run_stage "$stage" "$regex"

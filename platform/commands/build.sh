@@ -1,0 +1,25 @@
+# SPDX-License-Identifier: Apache-2.0
+#: build [preset ...] | build a preset: release (the default), debug, asan, tsan, coverage
+# shellcheck shell=bash
+
+PRESETS=(release debug asan tsan coverage)
+
+usage_build() {
+    cat <<'TEXT'
+usage: ./dev build [preset …]
+
+Builds into build/<preset>. Presets: release (the default), debug, asan, tsan, coverage.
+TEXT
+}
+
+command_build() {
+    local preset
+    (($# > 0)) || set -- release
+    for preset in "$@"; do
+        [[ " ${PRESETS[*]} " == *" $preset "* ]] ||
+            die_usage "unknown preset '$preset': there are ${PRESETS[*]}"
+    done
+    for preset in "$@"; do
+        build_preset "$preset"
+    done
+}
