@@ -12,7 +12,7 @@ PACKAGES_BUILD=(g++ cmake ninja-build clang libclang-rt-14-dev llvm)
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev abigail-tools libc++-14-dev libc++abi-14-dev
     zsh)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
-PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev mandoc)
+PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev mandoc)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 

@@ -5,14 +5,14 @@
 #include <string>
 #include <vector>
 
-#include "simulator/Fault.h"
-#include "simulator/GestureManagerSimulator.h"
-#include "simulator/HandBiometricManagerSimulator.h"
-#include "simulator/ManagerOptions.h"
 #include "simulator/ServiceKind.h"
-#include "simulator/SimulatorOptions.h"
-#include "simulator/TouchCompanionSimulator.h"
-#include "simulator/TouchManagerSimulator.h"
+#include "simulator/companion/SimulatorOptions.h"
+#include "simulator/companion/TouchCompanionSimulator.h"
+#include "simulator/faults/Fault.h"
+#include "simulator/managers/GestureManagerSimulator.h"
+#include "simulator/managers/HandBiometricManagerSimulator.h"
+#include "simulator/managers/ManagerOptions.h"
+#include "simulator/managers/TouchManagerSimulator.h"
 
 namespace pemaro::simulator {
 

@@ -13,7 +13,7 @@
 #include <vector>
 
 #include "pemaro/Status.h"
-#include "simulator/Fault.h"
+#include "simulator/faults/Fault.h"
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FrameCollector.h"
 

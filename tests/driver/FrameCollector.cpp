@@ -7,7 +7,7 @@
 #include <iterator>
 #include <thread>
 
-#include "simulator/Frame.h"
+#include "frames/Frame.h"
 #include "tests/support/ChildProcess.h"
 
 using android::sp;
@@ -67,10 +67,10 @@ void FrameCollector::onFrame(int, void* frame, unsigned long bytes, void* contex
 
 void FrameCollector::take(const void* frame, size_t bytes) {
     std::unique_lock<std::mutex> guard(mLock);
-    const char* fault = simulator::frameFault(frame, bytes);
-    simulator::FrameHeader header{};
+    const char* fault = frames::frameFault(frame, bytes);
+    frames::FrameHeader header{};
     if (fault == nullptr) {
-        simulator::readFrameHeader(frame, bytes, &header);
+        frames::readFrameHeader(frame, bytes, &header);
         mLost += header.sequence - mNextSequence;
         mNextSequence = header.sequence + 1;
     } else if (mFirstFault.empty()) {
@@ -88,10 +88,10 @@ int countFrames(const std::string& path) {
     const std::string recorded{std::istreambuf_iterator<char>(file), {}};
     int count = 0;
     for (size_t start = 0; start < recorded.size(); ++count) {
-        simulator::FrameHeader header{};
-        if (!simulator::readFrameHeader(&recorded[start], recorded.size() - start, &header) ||
+        frames::FrameHeader header{};
+        if (!frames::readFrameHeader(&recorded[start], recorded.size() - start, &header) ||
             header.length > recorded.size() - start ||
-            simulator::frameFault(&recorded[start], header.length) != nullptr) {
+            frames::frameFault(&recorded[start], header.length) != nullptr) {
             return -1;
         }
         start += header.length;

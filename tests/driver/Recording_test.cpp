@@ -13,8 +13,8 @@
 #include <string>
 #include <thread>
 
+#include "frames/Frame.h"
 #include "pemaro/Status.h"
-#include "simulator/Frame.h"
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FrameCollector.h"
 
@@ -135,11 +135,11 @@ TEST(Recording, GoesToAFileOfTheServices) {
     unlink(path.c_str());
     uint32_t count = 0;
     for (size_t start = 0; start < recorded.size(); ++count) {
-        simulator::FrameHeader header;
-        ASSERT_TRUE(simulator::readFrameHeader(&recorded[start], recorded.size() - start, &header));
+        frames::FrameHeader header;
+        ASSERT_TRUE(frames::readFrameHeader(&recorded[start], recorded.size() - start, &header));
         ASSERT_EQ(count, header.sequence);
         ASSERT_LE(header.length, recorded.size() - start);
-        ASSERT_STREQ(nullptr, simulator::frameFault(&recorded[start], header.length));
+        ASSERT_STREQ(nullptr, frames::frameFault(&recorded[start], header.length));
         start += header.length;
     }
     EXPECT_GT(count, 10u);

@@ -83,7 +83,7 @@ TEST(EventReceiver, TakesNothingOnceClosed) {
 
 TEST(EventReceiver, KeepsTheRecordsOneAfterAnother) {
     const std::string path = testing::TempDir() + "EventReceiver_test." + std::to_string(getpid());
-    FrameFile file;
+    frames::FrameFile file;
     ASSERT_TRUE(file.open(path));
     EventReceiver receiver(&file, 0, false);
     Record record = numbers();
@@ -100,7 +100,7 @@ TEST(EventReceiver, KeepsTheRecordsOneAfterAnother) {
 }
 
 TEST(EventReceiver, IsDoneWhenItCannotKeepARecord) {
-    FrameFile file;
+    frames::FrameFile file;
     ASSERT_TRUE(file.open("/dev/full"));
     EventReceiver receiver(&file, 0, false);
     Record record = numbers();

@@ -6,10 +6,10 @@
 #include <chrono>
 #include <vector>
 
-#include "simulator/FrameGenerator.h"
+#include "frames/FrameGenerator.h"
 
-using pemaro::simulator::FrameGenerator;
-using pemaro::simulator::kFilterDefault;
+using pemaro::frames::FrameGenerator;
+using pemaro::frames::kFilterDefault;
 
 namespace pemaro::zelkctl {
 
@@ -22,7 +22,7 @@ class FrameReceiverTest : public ::testing::Test {
     FrameReceiverTest() { receiver.setPacketSize(kPacket); }
 
     void give(FrameReceiver& to, uint32_t sequence) {
-        std::vector<uint8_t> frame = generator.draw(sequence, 0, kFilterDefault);
+        std::vector<uint8_t> frame = generator.draw(sequence, 0, frames::kFilterDefault);
         FrameReceiver::onFrame(0, frame.data(), frame.size(), &to);
     }
 
@@ -32,7 +32,7 @@ class FrameReceiverTest : public ::testing::Test {
         FrameReceiver::onFrame(0, frame.data(), announced, &receiver);
     }
 
-    FrameGenerator generator{kPacket, 1};
+    frames::FrameGenerator generator{kPacket, 1};
     FrameReceiver receiver{nullptr, 0};
 };
 
@@ -48,7 +48,7 @@ TEST_F(FrameReceiverTest, CountsFramesAndBytes) {
     }
     const FrameStats stats = receiver.stats();
     EXPECT_EQ(10u, stats.frames);
-    EXPECT_EQ(10 * generator.draw(0, 0, kFilterDefault).size(), stats.bytes);
+    EXPECT_EQ(10 * generator.draw(0, 0, frames::kFilterDefault).size(), stats.bytes);
     EXPECT_TRUE(stats.sequenced);
     EXPECT_EQ(0u, stats.gaps + stats.lost + stats.corrupt);
     EXPECT_FALSE(isDone(receiver));
@@ -85,7 +85,7 @@ TEST_F(FrameReceiverTest, ReadsNothingOfAFrameWithAnImpossibleLength) {
 }
 
 TEST_F(FrameReceiverTest, SeesATornFrame) {
-    std::vector<uint8_t> frame = generator.draw(0, 0, kFilterDefault);
+    std::vector<uint8_t> frame = generator.draw(0, 0, frames::kFilterDefault);
     frame.back() ^= 1;
     give(receiver, 0);
     FrameReceiver::onFrame(0, frame.data(), frame.size(), &receiver);
@@ -113,7 +113,7 @@ TEST_F(FrameReceiverTest, TakesNoMoreThanItsLimit) {
 }
 
 TEST_F(FrameReceiverTest, IsDoneWhenTheFileTakesNoMore) {
-    FrameFile full;
+    frames::FrameFile full;
     ASSERT_TRUE(full.open("/dev/full"));
     FrameReceiver writing(&full, 0);
     writing.setPacketSize(kPacket);

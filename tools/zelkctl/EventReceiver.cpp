@@ -6,7 +6,7 @@
 
 #include <cstdio>
 
-#include "simulator/Frame.h"
+#include "frames/Checksum.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -39,7 +39,7 @@ void printLine(const std::string& line) {
 }  // namespace
 
 std::string eventLine(Clock::time_point when, const void* record, size_t size, bool json) {
-    const std::string digest = fmt::format("{:08x}", simulator::crc32(record, size));
+    const std::string digest = fmt::format("{:08x}", frames::crc32(record, size));
     return json ? fmt::format("{{{},\"size\":{},\"digest\":\"{}\"}}", jsonTime(when), size, digest)
                 : fmt::format("{}  {} bytes  {}", timeOfDay(when), size, digest);
 }

@@ -8,7 +8,7 @@
 #include <mutex>
 #include <string>
 
-#include "tools/zelkctl/FrameFile.h"
+#include "frames/FrameFile.h"
 
 namespace pemaro::zelkctl {
 
@@ -21,7 +21,7 @@ namespace pemaro::zelkctl {
 class EventReceiver {
   public:
     /// `file` may be null; `limit` events are taken, all if 0.
-    EventReceiver(FrameFile* file, uint64_t limit, bool json)
+    EventReceiver(frames::FrameFile* file, uint64_t limit, bool json)
             : mFile(file), mLimit(limit), mJson(json) {}
 
     /// The callback of a client; `context` is the receiver.
@@ -43,7 +43,7 @@ class EventReceiver {
   private:
     void take(const void* record, size_t size);
 
-    FrameFile* const mFile;
+    frames::FrameFile* const mFile;
     const uint64_t mLimit;
     const bool mJson;
 

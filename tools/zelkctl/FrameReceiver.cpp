@@ -3,7 +3,7 @@
 
 #include <fmt/core.h>
 
-#include "simulator/Frame.h"
+#include "frames/Frame.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -58,11 +58,11 @@ std::string FrameReceiver::check(const void* frame, size_t length) {
         return fmt::format("frame {} tells a length of {} bytes, with packets of {}", number,
                            length, mPacketSize);
     }
-    simulator::FrameHeader header;
-    if (!simulator::readFrameHeader(frame, length, &header)) {
+    frames::FrameHeader header;
+    if (!frames::readFrameHeader(frame, length, &header)) {
         return "";
     }
-    const char* fault = simulator::frameFault(frame, length);
+    const char* fault = frames::frameFault(frame, length);
     if (fault != nullptr) {
         return fmt::format("frame {}: {}", number, fault);
     }

@@ -7,7 +7,7 @@
 #include <mutex>
 #include <string>
 
-#include "tools/zelkctl/FrameFile.h"
+#include "frames/FrameFile.h"
 
 namespace pemaro::zelkctl {
 
@@ -26,7 +26,7 @@ struct FrameStats {
 class FrameReceiver {
   public:
     /// `file` may be null; `limit` frames are taken, all if 0.
-    FrameReceiver(FrameFile* file, uint64_t limit) : mFile(file), mLimit(limit) {}
+    FrameReceiver(frames::FrameFile* file, uint64_t limit) : mFile(file), mLimit(limit) {}
 
     /// To be told before the recording starts: no more than this is ever read of a frame.
     void setPacketSize(uint32_t bytes) { mPacketSize = bytes; }
@@ -45,7 +45,7 @@ class FrameReceiver {
     std::string check(const void* frame, size_t length);
     void follow(uint32_t sequence);
 
-    FrameFile* const mFile;
+    frames::FrameFile* const mFile;
     const uint64_t mLimit;
     uint32_t mPacketSize = 0;
 

@@ -3,10 +3,10 @@
 #include <chrono>
 #include <memory>
 
+#include "frames/FrameFile.h"
 #include "pemaro/ITouchCompanionFacade.h"
 #include "tools/zelkctl/Commands.h"
 #include "tools/zelkctl/Connection.h"
-#include "tools/zelkctl/FrameFile.h"
 #include "tools/zelkctl/FrameReceiver.h"
 #include "tools/zelkctl/Lasting.h"
 #include "tools/zelkctl/LiveLine.h"
@@ -91,7 +91,7 @@ void printSummary(const FrameStats& stats, double seconds) {
 }
 
 /// Stops the service, prints the summary, and judges how it went.
-int finish(ITouchCompanionFacade& facade, const Connection& connection, FrameFile& file,
+int finish(ITouchCompanionFacade& facade, const Connection& connection, frames::FrameFile& file,
            const FrameReceiver& receiver, double seconds) {
     const int status = facade.stopRecord();
     const FrameStats stats = receiver.stats();
@@ -117,7 +117,7 @@ int record(const RecordOptions& options) {
     if (connection == nullptr) {
         return tools::kExitFailure;
     }
-    FrameFile file;
+    frames::FrameFile file;
     FrameReceiver receiver(options.output.empty() ? nullptr : &file, options.frames);
     const auto facade = Connection::openFacade(&FrameReceiver::onFrame, &receiver);
     if (facade == nullptr) {

@@ -5,7 +5,7 @@
 #include <chrono>
 #include <memory>
 
-#include "tools/zelkctl/FrameFile.h"
+#include "frames/FrameFile.h"
 #include "tools/zelkctl/Lasting.h"
 #include "tools/zelkctl/Report.h"
 #include "tools/zelkctl/ServiceWatch.h"
@@ -107,7 +107,7 @@ int watch(const WatchOptions& options, const MakeWatched& make) {
     if (!startBinder()) {
         return tools::kExitFailure;
     }
-    FrameFile file;
+    frames::FrameFile file;
     if (!options.output.empty() && !file.open(options.output)) {
         return fail(file.problem());
     }

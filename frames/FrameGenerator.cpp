@@ -1,0 +1,101 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "frames/FrameGenerator.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+
+namespace pemaro::frames {
+namespace {
+
+constexpr double kPi = 3.14159265358979323846;
+constexpr uint32_t kPositionMax = 65535;
+constexpr uint32_t kMaxSide = 65535;
+/// A finger touches this many cells to each side of its centre.
+constexpr uint32_t kReach = 3;
+constexpr float kSigma = 1.3f;
+constexpr int16_t kPeak = 1200;
+
+FingerRecord fingerAt(uint32_t id, double seconds) {
+    const double x = std::sin(2 * kPi * (0.31 + 0.07 * id) * seconds + id);
+    const double y = std::sin(2 * kPi * (0.23 + 0.05 * id) * seconds + 2 * id);
+    FingerRecord finger{};
+    finger.id = static_cast<uint16_t>(id);
+    finger.x = static_cast<uint16_t>((0.5 + 0.45 * x) * kPositionMax);
+    finger.y = static_cast<uint16_t>((0.5 + 0.45 * y) * kPositionMax);
+    finger.peak = static_cast<int16_t>(kPeak - 60 * (id % 8));
+    return finger;
+}
+
+}  // namespace
+
+FrameGenerator::FrameGenerator(uint32_t frameBytes, uint32_t fingers) {
+    const uint32_t room = frameBytes - static_cast<uint32_t>(sizeof(FrameHeader));
+    mFingers = std::min<uint32_t>(fingers, room / sizeof(FingerRecord));
+    const uint32_t cells = (room - mFingers * sizeof(FingerRecord)) / sizeof(int16_t);
+    // Panels are taller than wide: about 9 columns for 16 rows.
+    mColumns = static_cast<uint32_t>(std::sqrt(cells * 9.0 / 16.0));
+    mColumns = std::clamp(mColumns, std::min(cells, 1u), kMaxSide);
+    mRows = mColumns == 0 ? 0 : std::min(cells / mColumns, kMaxSide);
+}
+
+const std::vector<uint8_t>& FrameGenerator::draw(uint32_t sequence, uint64_t timeNs,
+                                                 uint32_t filter) {
+    FrameHeader header{};
+    header.magic = kFrameMagic;
+    header.version = kFrameVersion;
+    header.headerBytes = sizeof(header);
+    header.sequence = sequence;
+    header.timeNs = timeNs;
+    header.filter = filter;
+    header.fingers = static_cast<uint16_t>((filter & kFilterFingers) != 0 ? mFingers : 0);
+    header.columns = static_cast<uint16_t>((filter & kFilterImage) != 0 ? mColumns : 0);
+    header.rows = static_cast<uint16_t>((filter & kFilterImage) != 0 ? mRows : 0);
+    const size_t image = sizeof(header) + header.fingers * sizeof(FingerRecord);
+    header.length = static_cast<uint32_t>(image + sizeof(int16_t) * header.columns * header.rows);
+
+    mFrame.assign(header.length, 0);
+    for (uint32_t id = 0; id < mFingers; ++id) {
+        const FingerRecord finger = fingerAt(id, static_cast<double>(timeNs) / 1e9);
+        if (header.fingers != 0) {
+            memcpy(&mFrame[sizeof(header) + id * sizeof(finger)], &finger, sizeof(finger));
+        }
+        if (header.rows != 0) {
+            drawFinger(finger, &mFrame[image]);
+        }
+    }
+    memcpy(mFrame.data(), &header, sizeof(header));
+    header.checksum = frameChecksum(mFrame.data(), mFrame.size());
+    memcpy(mFrame.data(), &header, sizeof(header));
+    return mFrame;
+}
+
+void FrameGenerator::drawFinger(const FingerRecord& finger, uint8_t* image) const {
+    const Axis across = bell(finger.x, mColumns);
+    const Axis down = bell(finger.y, mRows);
+    for (size_t row = 0; row < down.weights.size(); ++row) {
+        for (size_t column = 0; column < across.weights.size(); ++column) {
+            const size_t cell = (down.first + row) * mColumns + across.first + column;
+            int16_t value;
+            memcpy(&value, image + cell * sizeof(value), sizeof(value));
+            const float add = finger.peak * down.weights[row] * across.weights[column];
+            value = static_cast<int16_t>(std::min(value + add, 32767.0f));
+            memcpy(image + cell * sizeof(value), &value, sizeof(value));
+        }
+    }
+}
+
+FrameGenerator::Axis FrameGenerator::bell(uint32_t position, uint32_t cells) {
+    const float centre = static_cast<float>(position) * (cells - 1) / kPositionMax;
+    const auto nearest = static_cast<uint32_t>(centre + 0.5f);
+    Axis axis;
+    axis.first = nearest > kReach ? nearest - kReach : 0;
+    const uint32_t end = std::min(nearest + kReach + 1, cells);
+    for (uint32_t cell = axis.first; cell < end; ++cell) {
+        const float distance = (static_cast<float>(cell) - centre) / kSigma;
+        axis.weights.push_back(std::exp(-0.5f * distance * distance));
+    }
+    return axis;
+}
+
+}  // namespace pemaro::frames

@@ -1,0 +1,32 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <string>
+
+#include "frames/Frame.h"
+
+namespace pemaro::simulator {
+
+/// What kind of touch stack is simulated.
+struct SimulatorOptions {
+    static constexpr uint32_t kMinFrameBytes = sizeof(frames::FrameHeader);
+    static constexpr uint32_t kMaxFrameBytes = 1 << 20;
+    static constexpr uint32_t kMaxRingFrames = 1 << 16;
+    static constexpr uint64_t kMaxRingBytes = uint64_t{256} << 20;
+    static constexpr uint32_t kMaxFingers = 10;
+    static constexpr double kMaxRate = 100000;
+
+    double rate = 240;           ///< frames a second; 0: as fast as the client takes them
+    uint32_t frameBytes = 4096;  ///< the packet size, and a slot of the ring
+    uint32_t ringFrames = 64;    ///< slots of the ring
+    uint32_t fingers = 3;
+    std::string configPath;         ///< the configuration's own place; empty: it has none
+    std::string authText = "zelk";  ///< what setAuth() accepts
+
+    /// Told one line about each thing that happens, if set. Called with the service's lock held.
+    std::function<void(const std::string&)> narrate;
+};
+
+}  // namespace pemaro::simulator

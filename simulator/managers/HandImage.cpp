@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "simulator/managers/HandImage.h"
+
+#include <algorithm>
+#include <cmath>
+#include <numeric>
+#include <random>
+
+namespace pemaro::simulator {
+namespace {
+
+constexpr double kPi = 3.14159265358979323846;
+constexpr int kWaves = 12;
+constexpr double kMean = 128;
+constexpr double kDeviation = 40;
+
+using Plane = std::array<double, kHandColumns * kHandRows>;
+
+/// The sum of a few waves in directions of the person's own, with mean square 1 or about.
+Plane veins(uint32_t person) {
+    std::minstd_rand random(2654435761u * (person + 1));
+    const auto upTo = [&random](double high) {
+        return std::uniform_real_distribution<double>(0, high)(random);
+    };
+    Plane plane{};
+    for (int wave = 0; wave < kWaves; ++wave) {
+        const double direction = upTo(2 * kPi);
+        const double perCell = 0.15 + upTo(0.35);
+        const double phase = upTo(2 * kPi);
+        for (size_t i = 0; i < plane.size(); ++i) {
+            const double x = static_cast<double>(i % kHandColumns);
+            const double y = static_cast<double>(i / kHandColumns);
+            const double along = x * std::cos(direction) + y * std::sin(direction);
+            plane[i] += std::sin(along * perCell + phase) * std::sqrt(2.0 / kWaves);
+        }
+    }
+    return plane;
+}
+
+double meanOf(const HandImage& image) {
+    return std::accumulate(image.begin(), image.end(), 0.0) / image.size();
+}
+
+}  // namespace
+
+HandImage seeHand(uint32_t person, double noise, uint32_t variation) {
+    std::minstd_rand random(variation + 1);
+    std::normal_distribution<double> disturbance(0, 1);
+    const Plane plane = veins(person);
+    HandImage image;
+    for (size_t i = 0; i < image.size(); ++i) {
+        const double seen = (1 - noise) * plane[i] + noise * disturbance(random);
+        image[i] = static_cast<uint8_t>(std::clamp(kMean + kDeviation * seen, 0.0, 255.0));
+    }
+    return image;
+}
+
+double handSimilarity(const HandImage& a, const HandImage& b) {
+    const double meanA = meanOf(a);
+    const double meanB = meanOf(b);
+    double squaresA = 0;
+    double squaresB = 0;
+    double products = 0;
+    for (size_t i = 0; i < a.size(); ++i) {
+        squaresA += (a[i] - meanA) * (a[i] - meanA);
+        squaresB += (b[i] - meanB) * (b[i] - meanB);
+        products += (a[i] - meanA) * (b[i] - meanB);
+    }
+    const double scale = std::sqrt(squaresA * squaresB);
+    return scale > 0 ? 100 * std::max(0.0, products / scale) : 0;
+}
+
+}  // namespace pemaro::simulator

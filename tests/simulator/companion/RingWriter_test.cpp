@@ -1,0 +1,116 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "simulator/companion/RingWriter.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <memory>
+#include <string>
+
+namespace pemaro::simulator {
+
+namespace {
+
+// The reader's end of a ring, without its waits.
+class Reader {
+  public:
+    explicit Reader(const RingWriter& writer)
+            : block(static_cast<TouchCompanionSharedCblk*>(writer.memory()->pointer())) {}
+
+    std::string take() {
+        const uint32_t slot = block->read - block->bufferFrames * block->readWrap;
+        const auto* frame = block->frames() + size_t{slot} * block->frameSize;
+        std::string text(reinterpret_cast<const char*>(frame));
+        block->read += 1;
+        if (block->read % block->bufferFrames == 0) {
+            block->readWrap += 1;
+        }
+        return text;
+    }
+
+    TouchCompanionSharedCblk* const block;
+};
+
+bool put(RingWriter& writer, const std::string& text) {
+    return writer.put(text.c_str(), text.size() + 1);
+}
+
+}  // namespace
+
+TEST(RingWriter, MakesABlockThatTellsItsGeometry) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(100, 5);
+    ASSERT_NE(nullptr, writer);
+    Reader reader(*writer);
+    EXPECT_EQ(5u, reader.block->bufferFrames);
+    EXPECT_EQ(100u, reader.block->frameSize);
+    EXPECT_EQ(120u, reader.block->headerSize);
+    EXPECT_EQ(0u, reader.block->read);
+    EXPECT_EQ(0u, reader.block->write);
+    EXPECT_EQ(136u + 500u, writer->memory()->size());
+}
+
+TEST(RingWriter, TakesNoMoreFramesThanTheRingHolds) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 3);
+    Reader reader(*writer);
+    EXPECT_TRUE(put(*writer, "a"));
+    EXPECT_TRUE(put(*writer, "b"));
+    EXPECT_TRUE(put(*writer, "c"));
+    EXPECT_FALSE(put(*writer, "d"));
+    EXPECT_EQ(3u, reader.block->write);
+    EXPECT_EQ("a", reader.take());
+    EXPECT_TRUE(put(*writer, "e"));
+    EXPECT_FALSE(put(*writer, "f"));
+    EXPECT_EQ("b", reader.take());
+    EXPECT_EQ("c", reader.take());
+    EXPECT_EQ("e", reader.take());
+}
+
+TEST(RingWriter, KeepsTheOrderOverManyRounds) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 7);
+    Reader reader(*writer);
+    for (int i = 0; i < 1000; i += 5) {
+        for (int j = i; j < i + 5; ++j) {
+            ASSERT_TRUE(put(*writer, std::to_string(j)));
+        }
+        for (int j = i; j < i + 5; ++j) {
+            ASSERT_EQ(std::to_string(j), reader.take());
+        }
+    }
+    EXPECT_EQ(1000u / 7, reader.block->writeWrap);
+}
+
+TEST(RingWriter, RefusesAFrameThatIsLongerThanASlot) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    EXPECT_TRUE(put(*writer, std::string(15, 'x')));
+    EXPECT_FALSE(put(*writer, std::string(16, 'x')));
+}
+
+TEST(RingWriter, BelievesNothingThatAClientWritesIntoTheBlock) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    Reader reader(*writer);
+    reader.block->bufferFrames = 0xFFFFFFFF;
+    reader.block->frameSize = 0xFFFFFFFF;
+    reader.block->write = 12345;
+    reader.block->writeWrap = 12345;
+    reader.block->data = nullptr;
+    EXPECT_TRUE(put(*writer, "a"));
+    EXPECT_EQ(1u, reader.block->write);
+    EXPECT_TRUE(put(*writer, "b"));
+    // A reader that claims to be ahead of the writer.
+    reader.block->read = 3;
+    EXPECT_FALSE(put(*writer, "c"));
+    reader.block->read = 0x80000000;
+    EXPECT_FALSE(put(*writer, "c"));
+    reader.block->read = 2;
+    EXPECT_TRUE(put(*writer, "c"));
+    EXPECT_STREQ("c", reinterpret_cast<char*>(reader.block->frames()));
+}
+
+TEST(RingWriter, WritesOnWhenTheReaderDiedWithTheMutex) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    Reader reader(*writer);
+    ASSERT_EQ(0, pthread_mutex_lock(&reader.block->mutex));
+    EXPECT_TRUE(put(*writer, "a"));
+}
+
+}  // namespace pemaro::simulator
