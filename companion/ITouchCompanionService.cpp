@@ -13,8 +13,9 @@
 #include <limits>
 #include <memory>
 
-#include "companion/ProxyCall.h"
-#include "companion/StubDispatch.h"
+#include "binder/ParcelText.h"
+#include "binder/ProxyCall.h"
+#include "binder/StubDispatch.h"
 #include "pemaro/BnTouchCompanionService.h"
 #include "pemaro/BpTouchCompanionService.h"
 #include "pemaro/Status.h"
@@ -67,13 +68,13 @@ enum {
 // and a blank, setRecordFile has no entry and setAuth no text at all. Log readers know them so;
 // they stay.
 constexpr ProxyRow kRegisterClient = {REGISTER_CLIENT, "Bp::registerClient",
-                                      "registerClient() error: %s", nullptr};
+                                      "registerClient() error: %s"};
 constexpr ProxyRow kUnregisterClient = {UNREGISTER_CLIENT, "Bp: unregisterClient",
-                                        "unregisterClient() error: %s", nullptr};
+                                        "unregisterClient() error: %s"};
 constexpr ProxyRow kOpen = {OPEN, "Bp::open", "init() error: %s", "init() error: %s"};
-constexpr ProxyRow kGetCblk = {GET_CBLK, "Bp::getCblk", "getCblk() error: %s", nullptr};
+constexpr ProxyRow kGetCblk = {GET_CBLK, "Bp::getCblk", "getCblk() error: %s"};
 constexpr ProxyRow kPrepareRecord = {PREPARE_RECORD, "Bp::prepareRecord",
-                                     "prepareRecord() error: %s", nullptr};
+                                     "prepareRecord() error: %s"};
 constexpr ProxyRow kStartRecord = {START_RECORD, "Bp::startRecord", "startRecord() error: %s",
                                    "startRecord() error: %s"};
 constexpr ProxyRow kStopRecord = {STOP_RECORD, "Bp::stopRecord", "stopRecord() error: %s",
@@ -103,12 +104,12 @@ constexpr ProxyRow kSaveConfig = {SAVE_CONFIG, "Bp::saveConfig", "saveConfig() e
 constexpr ProxyRow kSaveConfigPath = {SAVE_CONFIG_PATH, kSaveConfig.entry,
                                       kSaveConfig.transportError, kSaveConfig.remoteError};
 constexpr ProxyRow kGetPacketSize = {GET_PACKET_SIZE, "Bp::getPacketSize",
-                                     "getPacketSize() error: %s", nullptr};
+                                     "getPacketSize() error: %s"};
 constexpr ProxyRow kSetConfigBinary = {SET_CONFIG_BINARY, "Bp::setConfigParams(binary)",
                                        "setConfigParams() (binary) error: %s",
                                        "setConfigParams() (binary) error: %s"};
 constexpr ProxyRow kGetConfigBinary = {GET_CONFIG_BINARY, "Bp::getConfigParams (binary)",
-                                       "getConfigParams() (binary) error: %s", nullptr};
+                                       "getConfigParams() (binary) error: %s"};
 constexpr ProxyRow kInspect = {INSPECT, "Bp::inspect", "inspect() error: %s",
                                "inspect() error: %s"};
 constexpr ProxyRow kGetConfig = {GET_CONFIG, "Bp::getConfigParams",
@@ -120,7 +121,7 @@ constexpr ProxyRow kSaveSession = {SAVE_SESSION, "Bp::saveSession", "saveSession
                                    "saveSession() error: %s"};
 constexpr ProxyRow kRestoreSession = {RESTORE_SESSION, "Bp::restoreSession",
                                       "restoreSession() error: %s", "restoreSession() error: %s"};
-constexpr ProxyRow kSetAuth = {SET_AUTH, nullptr, nullptr, nullptr};
+constexpr ProxyRow kSetAuth = {SET_AUTH, nullptr, nullptr};
 
 }  // namespace
 
@@ -160,7 +161,7 @@ BpTouchCompanionService::BpTouchCompanionService(const sp<IBinder>& remote)
 
 int BpTouchCompanionService::registerClient(const sp<ITouchCompanionClient>& client) {
     Call call(kRegisterClient);
-    call.request.writeStrongBinder(IInterface::asBinder(client));
+    call.writeObject(client);
     return call.transact(remote());
 }
 
@@ -380,11 +381,6 @@ status_t replyPath(Service& service, const Parcel& data, Parcel& reply) {
     return replyStatus(reply, (service.*kOperation)(&path));
 }
 
-status_t onRegisterClient(Service& service, const Parcel& data, Parcel& reply) {
-    return replyStatus(reply, service.registerClient(
-                                      ITouchCompanionClient::asInterface(data.readStrongBinder())));
-}
-
 // Unlike all others: the status is the transaction's result and the reply stays empty.
 status_t onUnregisterClient(Service& service, const Parcel&, Parcel&) {
     return service.unregisterClient();
@@ -499,44 +495,39 @@ status_t onSaveSession(Service& service, const Parcel&, Parcel& reply) {
 }
 
 const StubRow<Service> kRows[] = {
-        {nullptr, onRegisterClient},
-        {nullptr, onUnregisterClient},
-        {nullptr, replyPlain<&Service::open>},
-        {nullptr, onGetCblk},
-        {nullptr, replyPlain<&Service::prepareRecord>},
-        {nullptr, replyPlain<&Service::startRecord>},
-        {nullptr, replyPlain<&Service::stopRecord>},
-        {nullptr, replyText<&Service::setRecordFile>},
-        {nullptr, onSendEvent},
-        {nullptr, replyPlain<&Service::close>},
-        {nullptr, replyNoPath<&Service::reloadConfig>},
-        {nullptr, replyPath<&Service::reloadConfig>},
-        {nullptr, replyInt<&Service::setRecordParameter>},
-        {nullptr, replyFilled<SerializableMap, &Service::getProperties>},
-        {nullptr, replyFilled<SerializableMap, &Service::getAFEParams>},
-        {nullptr, onSetAFEParams},
-        {nullptr, replyFilled<SerializableMapArray, &Service::getAFEParams>},
-        {nullptr, replyNoPath<&Service::saveConfig>},
-        {nullptr, replyPath<&Service::saveConfig>},
-        {nullptr, replyPlain<&Service::getPacketSize>},
-        {nullptr, onSetConfigBinary},
-        {nullptr, onGetConfigBinary},
-        {nullptr, onInspect},
-        {nullptr, onGetConfig},
-        {nullptr, onSendCommand},
-        {nullptr, onSaveSession},
-        {nullptr, replyInt<&Service::restoreSession>},
-        {nullptr, replyText<&Service::setAuth>},
+        {replyObject<&Service::registerClient, ITouchCompanionClient>},
+        {onUnregisterClient},
+        {replyPlain<&Service::open>},
+        {onGetCblk},
+        {replyPlain<&Service::prepareRecord>},
+        {replyPlain<&Service::startRecord>},
+        {replyPlain<&Service::stopRecord>},
+        {replyText<&Service::setRecordFile>},
+        {onSendEvent},
+        {replyPlain<&Service::close>},
+        {replyNoPath<&Service::reloadConfig>},
+        {replyPath<&Service::reloadConfig>},
+        {replyInt<&Service::setRecordParameter>},
+        {replyFilled<SerializableMap, &Service::getProperties>},
+        {replyFilled<SerializableMap, &Service::getAFEParams>},
+        {onSetAFEParams},
+        {replyFilled<SerializableMapArray, &Service::getAFEParams>},
+        {replyNoPath<&Service::saveConfig>},
+        {replyPath<&Service::saveConfig>},
+        {replyPlain<&Service::getPacketSize>},
+        {onSetConfigBinary},
+        {onGetConfigBinary},
+        {onInspect},
+        {onGetConfig},
+        {onSendCommand},
+        {onSaveSession},
+        {replyInt<&Service::restoreSession>},
+        {replyText<&Service::setAuth>},
 };
 static_assert(sizeof(kRows) / sizeof(kRows[0]) == SET_AUTH, "one row a code");
 
 }  // namespace
 
-status_t BnTouchCompanionService::onTransact(uint32_t code, const Parcel& data, Parcel* reply,
-                                             uint32_t flags) {
-    Service& service = *this;
-    return dispatch(LOG_TAG, kRows, *this, service, code, data, reply,
-                    [&] { return BBinder::onTransact(code, data, reply, flags); });
-}
+IMPLEMENT_STUB(TouchCompanionService, kRows)
 
 }  // namespace pemaro

@@ -10,10 +10,10 @@
 #include <algorithm>
 #include <cstring>
 
-#include "companion/PlatformShims.h"
-#include "companion/ServiceLookup.h"
+#include "binder/PlatformShims.h"
+#include "binder/ServiceLookup.h"
+#include "binder/Waiting.h"
 #include "companion/TouchCompanionThread.h"
-#include "companion/Waiting.h"
 #include "pemaro/Status.h"
 
 namespace pemaro {

@@ -6,6 +6,7 @@
 
 #include <log/log.h>
 
+#include "binder/ServiceCall.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
 
@@ -13,42 +14,32 @@ namespace pemaro {
 
 namespace {
 
-// Most of the operations below: one call, and a line for a failure.
-template <typename Operation>
-int forward(const android::sp<ITouchCompanionService>& service, const char* failure,
-            Operation&& operation) {
-    if (service == nullptr) {
-        return STATUS_INVALID_STATE;
-    }
-    int status = operation(*service);
-    if (status != STATUS_NO_ERROR && failure != nullptr) {
-        ALOGE("%s", failure);
-    }
-    return status;
+using Service = ITouchCompanionService;
+
+constexpr CallFailure failure(const char* text) {
+    return {LOG_TAG, text, WithoutService::Quiet};
 }
+
+constexpr CallFailure kUnlogged = failure(nullptr);
 
 }  // namespace
 
 int TouchCompanionClient::sendEvent(eventType type, eventParam param) {
-    return forward(mService, "sendEvent failed", [&](ITouchCompanionService& service) {
-        return service.sendEvent(static_cast<int>(type), static_cast<int>(param));
-    });
+    return callService(failure("sendEvent failed"), mService, &Service::sendEvent,
+                       static_cast<int>(type), static_cast<int>(param));
 }
 
 int TouchCompanionClient::reloadConfig(const std::string* path) {
-    return forward(mService, "reloadConfig failed",
-                   [&](ITouchCompanionService& service) { return service.reloadConfig(path); });
+    return callService(failure("reloadConfig failed"), mService, &Service::reloadConfig, path);
 }
 
 int TouchCompanionClient::saveConfig(const std::string* path) {
-    return forward(mService, "saveConfig failed",
-                   [&](ITouchCompanionService& service) { return service.saveConfig(path); });
+    return callService(failure("saveConfig failed"), mService, &Service::saveConfig, path);
 }
 
 int TouchCompanionClient::setConfigParams(const void* data, size_t size) {
-    return forward(
-            mService, "setConfigParams (binary) failed",
-            [&](ITouchCompanionService& service) { return service.setConfigParams(data, size); });
+    return callService(failure("setConfigParams (binary) failed"), mService,
+                       &Service::setConfigParams, data, size);
 }
 
 int TouchCompanionClient::getConfigParams(void* buffer, size_t* len) {
@@ -78,23 +69,20 @@ int TouchCompanionClient::getConfigParams(SerializableMap& params) {
         ALOGD("params map is empty...no config values were retrieved");
         return STATUS_NO_ERROR;
     }
-    return forward(mService, nullptr, [&](ITouchCompanionService& service) {
-        return service.getConfigParams(params);
-    });
+    return callService(kUnlogged, mService,
+                       [&](Service& service) { return service.getConfigParams(params); });
 }
 
 int TouchCompanionClient::getPacketSize() {
-    return forward(mService, nullptr,
-                   [](ITouchCompanionService& service) { return service.getPacketSize(); });
+    return callService(kUnlogged, mService, &Service::getPacketSize);
 }
 
 int TouchCompanionClient::inspect(unsigned int* value) {
-    return forward(mService, nullptr,
-                   [&](ITouchCompanionService& service) { return service.inspect(value); });
+    return callService(kUnlogged, mService, &Service::inspect, value);
 }
 
 int TouchCompanionClient::saveSession(int& sessionID) {
-    return forward(mService, nullptr, [&](ITouchCompanionService& service) {
+    return callService(kUnlogged, mService, [&](Service& service) {
         ALOGD("saveSession E %d", sessionID);
         int status = service.saveSession(sessionID);
         ALOGD("saveSession X= %d", status);
@@ -103,7 +91,7 @@ int TouchCompanionClient::saveSession(int& sessionID) {
 }
 
 int TouchCompanionClient::restoreSession(int sessionID) {
-    return forward(mService, nullptr, [&](ITouchCompanionService& service) {
+    return callService(kUnlogged, mService, [&](Service& service) {
         ALOGD("restoreSession E %d", sessionID);
         int status = service.restoreSession(sessionID);
         ALOGD("restoreSession X= %d", status);
@@ -112,9 +100,8 @@ int TouchCompanionClient::restoreSession(int sessionID) {
 }
 
 int TouchCompanionClient::setAuth(const char* auth) {
-    return forward(mService, "setAuth failed", [&](ITouchCompanionService& service) {
-        return service.setAuth(std::string(auth));
-    });
+    return callService(failure("setAuth failed"), mService,
+                       [&](Service& service) { return service.setAuth(std::string(auth)); });
 }
 
 }  // namespace pemaro

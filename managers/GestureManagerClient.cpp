@@ -5,6 +5,7 @@
 
 #include <log/log.h>
 
+#include "binder/ServiceCall.h"
 #include "managers/ManagerConnection.h"
 #include "pemaro/Status.h"
 
@@ -49,54 +50,54 @@ int GestureManagerClient::deinit() {
 // of enabling. Log readers know them so; they stay.
 
 int GestureManagerClient::enableWakeup() {
-    return callService(LOG_TAG, "enable failed: %s", mService, &Service::enableWakeup);
+    return callService({LOG_TAG, "enable failed: %s"}, mService, &Service::enableWakeup);
 }
 
 int GestureManagerClient::disableWakeup() {
-    return callService(LOG_TAG, "disable failed: %s", mService, &Service::disableWakeup);
+    return callService({LOG_TAG, "disable failed: %s"}, mService, &Service::disableWakeup);
 }
 
 int GestureManagerClient::startGestureDetection() {
-    return callService(LOG_TAG, "enable failed: %s", mService, &Service::startGestureDetection);
+    return callService({LOG_TAG, "enable failed: %s"}, mService, &Service::startGestureDetection);
 }
 
 int GestureManagerClient::stopGestureDetection() {
-    return callService(LOG_TAG, "enable failed: %s", mService, &Service::stopGestureDetection);
+    return callService({LOG_TAG, "enable failed: %s"}, mService, &Service::stopGestureDetection);
 }
 
 int GestureManagerClient::addGesture(int count, IGestureManagerClient::GestureData* samples,
                                      int& result) {
-    return callService(LOG_TAG, "addGesture failed: %s", mService, &Service::addGesture, count,
+    return callService({LOG_TAG, "addGesture failed: %s"}, mService, &Service::addGesture, count,
                        samples, result);
 }
 
 int GestureManagerClient::deleteGesture(int gesture) {
-    return callService(LOG_TAG, "deleteGesture failed: %s", mService, &Service::deleteGesture,
+    return callService({LOG_TAG, "deleteGesture failed: %s"}, mService, &Service::deleteGesture,
                        gesture);
 }
 
 int GestureManagerClient::enableGesture(int gesture) {
-    return callService(LOG_TAG, "enableGesture failed: %s", mService, &Service::enableGesture,
+    return callService({LOG_TAG, "enableGesture failed: %s"}, mService, &Service::enableGesture,
                        gesture);
 }
 
 int GestureManagerClient::disableGesture(int gesture) {
-    return callService(LOG_TAG, "disableGesture failed: %s", mService, &Service::disableGesture,
+    return callService({LOG_TAG, "disableGesture failed: %s"}, mService, &Service::disableGesture,
                        gesture);
 }
 
 int GestureManagerClient::verifyGesture(IGestureManagerClient::GestureData* sample, int& result) {
-    return callService(LOG_TAG, "improveGestureTraining failed: %s", mService,
+    return callService({LOG_TAG, "improveGestureTraining failed: %s"}, mService,
                        &Service::improveGestureTraining, sample, result);
 }
 
 int GestureManagerClient::getMaxPreDefinedGesture(unsigned int& count) {
-    return callService(LOG_TAG, "getMaxPreDefinedGesture failed: %s", mService,
+    return callService({LOG_TAG, "getMaxPreDefinedGesture failed: %s"}, mService,
                        &Service::getMaxPreDefinedGesture, count);
 }
 
 int GestureManagerClient::getMaxUserDefinedGesture(unsigned int& count) {
-    return callService(LOG_TAG, "getMaxUserDefinedGesture failed: %s", mService,
+    return callService({LOG_TAG, "getMaxUserDefinedGesture failed: %s"}, mService,
                        &Service::getMaxUserDefinedGesture, count);
 }
 

@@ -5,6 +5,7 @@
 
 #include <log/log.h>
 
+#include "binder/ServiceCall.h"
 #include "managers/ManagerConnection.h"
 #include "pemaro/Status.h"
 
@@ -49,63 +50,64 @@ int HandBiometricManagerClient::deinit() {
 // The operations on profile names share setProfileName's text. Log readers know it so; it stays.
 
 int HandBiometricManagerClient::startEnrollment() {
-    return callService(LOG_TAG, "startEnrollment failed: %s", mService, &Service::startEnrollment);
+    return callService({LOG_TAG, "startEnrollment failed: %s"}, mService,
+                       &Service::startEnrollment);
 }
 
 int HandBiometricManagerClient::stopEnrollment() {
-    return callService(LOG_TAG, "stopEnrollment failed: %s", mService, &Service::stopEnrollment);
+    return callService({LOG_TAG, "stopEnrollment failed: %s"}, mService, &Service::stopEnrollment);
 }
 
 int HandBiometricManagerClient::scan() {
-    return callService(LOG_TAG, "scan failed: %s", mService, &Service::scan);
+    return callService({LOG_TAG, "scan failed: %s"}, mService, &Service::scan);
 }
 
 int HandBiometricManagerClient::startMatching() {
-    return callService(LOG_TAG, "startMatching failed: %s", mService, &Service::startMatching);
+    return callService({LOG_TAG, "startMatching failed: %s"}, mService, &Service::startMatching);
 }
 
 int HandBiometricManagerClient::stopMatching() {
-    return callService(LOG_TAG, "stopMatching failed: %s", mService, &Service::stopMatching);
+    return callService({LOG_TAG, "stopMatching failed: %s"}, mService, &Service::stopMatching);
 }
 
 int HandBiometricManagerClient::cancelScan() {
-    return callService(LOG_TAG, "cancelScan failed: %s", mService, &Service::cancelScan);
+    return callService({LOG_TAG, "cancelScan failed: %s"}, mService, &Service::cancelScan);
 }
 
 int HandBiometricManagerClient::setSecurity(int level) {
-    return callService(LOG_TAG, "setSecurity failed: %s", mService, &Service::setSecurity, level);
+    return callService({LOG_TAG, "setSecurity failed: %s"}, mService, &Service::setSecurity, level);
 }
 
 int HandBiometricManagerClient::setProfileName(const char* name) {
-    return callService(LOG_TAG, "setProfileName failed: %s", mService, &Service::setProfileName,
+    return callService({LOG_TAG, "setProfileName failed: %s"}, mService, &Service::setProfileName,
                        name);
 }
 
 int HandBiometricManagerClient::deleteProfile(const char* name) {
-    return callService(LOG_TAG, "setProfileName failed: %s", mService, &Service::deleteProfile,
+    return callService({LOG_TAG, "setProfileName failed: %s"}, mService, &Service::deleteProfile,
                        name);
 }
 
 int HandBiometricManagerClient::renameProfile(const char* first, const char* second) {
-    return callService(LOG_TAG, "setProfileName failed: %s", mService, &Service::renameProfile,
+    return callService({LOG_TAG, "setProfileName failed: %s"}, mService, &Service::renameProfile,
                        first, second);
 }
 
 int HandBiometricManagerClient::getMaxUser(unsigned int& count) {
-    return callService(LOG_TAG, "getMaxUser failed: %s", mService, &Service::getMaxUser, count);
+    return callService({LOG_TAG, "getMaxUser failed: %s"}, mService, &Service::getMaxUser, count);
 }
 
 int HandBiometricManagerClient::getProfileList(std::vector<std::string>& names) {
-    return callService(LOG_TAG, "getProfileList failed: %s", mService, &Service::getProfileList,
+    return callService({LOG_TAG, "getProfileList failed: %s"}, mService, &Service::getProfileList,
                        names);
 }
 
 int HandBiometricManagerClient::enableWakeup() {
-    return callService(LOG_TAG, "enable failed: %s", mService, &Service::enableWakeup);
+    return callService({LOG_TAG, "enable failed: %s"}, mService, &Service::enableWakeup);
 }
 
 int HandBiometricManagerClient::disableWakeup() {
-    return callService(LOG_TAG, "disable failed: %s", mService, &Service::disableWakeup);
+    return callService({LOG_TAG, "disable failed: %s"}, mService, &Service::disableWakeup);
 }
 
 int HandBiometricManagerClient::handBiometricCallback(

@@ -3,51 +3,20 @@
 
 #include "pemaro/IGestureManagerClient.h"
 
-#include "managers/ManagerCall.h"
+#include "managers/ManagerCallback.h"
 #include "pemaro/BnGestureManagerClient.h"
 #include "pemaro/BpGestureManagerClient.h"
 
 namespace pemaro {
 
-using android::IBinder;
-using android::Parcel;
-using android::sp;
-using android::status_t;
-
 namespace {
 
-constexpr uint32_t INJECT_GESTURE = IBinder::FIRST_CALL_TRANSACTION;
-
-constexpr ProxyRow kGestureCallback =
-        managerRow(INJECT_GESTURE, "Bp::gestureCallback", "gestureCallback() error: %s");
+constexpr CallbackTexts kTexts = {"Bp::gestureCallback", "gestureCallback() error: %s",
+                                  "INJECT_GESTURE transact received..."};
 
 }  // namespace
 
-BpGestureManagerClient::BpGestureManagerClient(const sp<IBinder>& remote)
-        : BpInterface<IGestureManagerClient>(remote) {}
-
-int BpGestureManagerClient::gestureCallback(GestureData* data) {
-    return ManagerCall(LOG_TAG, kGestureCallback, descriptor).transactWithRecord(remote(), data);
-}
-
-IMPLEMENT_META_INTERFACE(GestureManagerClient, "pemaro.GestureManagerClient")
-
-namespace {
-
-using Client = IGestureManagerClient;
-
-const StubRow<Client> kRows[] = {
-        {"INJECT_GESTURE transact received...",
-         replyRecord<&Client::gestureCallback, Client::GestureData>},
-};
-
-}  // namespace
-
-status_t BnGestureManagerClient::onTransact(uint32_t code, const Parcel& data, Parcel* reply,
-                                            uint32_t flags) {
-    Client& client = *this;
-    return dispatch(LOG_TAG, kRows, *this, client, code, data, reply,
-                    [&] { return BBinder::onTransact(code, data, reply, flags); });
-}
+IMPLEMENT_MANAGER_CALLBACK(GestureManagerClient, "pemaro.GestureManagerClient", gestureCallback,
+                           GestureData, kTexts)
 
 }  // namespace pemaro

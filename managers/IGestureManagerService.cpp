@@ -39,30 +39,27 @@ enum {
 // Log readers know these texts so; they stay: the wake-up operations fail as "enable()" and
 // "disable()", the limits fail without parentheses, and what the transactions call ENABLE, DISABLE
 // and VERIFY_GESTURE the operations call otherwise.
-constexpr ProxyRow kEnableWakeup =
-        managerRow(ENABLE_WAKEUP, "Bp::enableWakeup", "enable() error: %s");
-constexpr ProxyRow kDisableWakeup =
-        managerRow(DISABLE_WAKEUP, "Bp::disableWakeup", "disable() error: %s");
-constexpr ProxyRow kStartGestureDetection =
-        managerRow(ENABLE, "Bp::startGestureDetection", "startGestureDetection() error: %s");
-constexpr ProxyRow kStopGestureDetection =
-        managerRow(DISABLE, "Bp::stopGestureDetection", "stopGestureDetection() error: %s");
-constexpr ProxyRow kAddGesture =
-        managerRow(ADD_GESTURE, "Bp::addGesture", "addGesture() error: %s");
-constexpr ProxyRow kDeleteGesture =
-        managerRow(DELETE_GESTURE, "Bp::deleteGesture", "deleteGesture() error: %s");
-constexpr ProxyRow kEnableGesture =
-        managerRow(ENABLE_GESTURE, "Bp::enableGesture", "enableGesture() error: %s");
-constexpr ProxyRow kDisableGesture =
-        managerRow(DISABLE_GESTURE, "Bp::disableGesture", "disableGesture() error: %s");
-constexpr ProxyRow kImproveGestureTraining = managerRow(
-        VERIFY_GESTURE, "Bp::improveGestureTraining", "improveGestureTraining() error: %s");
-constexpr ProxyRow kGetMaxPreDefinedGesture =
-        managerRow(GET_MAX_PREDEFINED_GESTURE, "Bp::getMaxPreDefinedGesture enter",
-                   "getMaxPreDefinedGesture error: %s");
-constexpr ProxyRow kGetMaxUserDefinedGesture =
-        managerRow(GET_MAX_USERDEFINED_GESTURE, "Bp::getMaxUserDefinedGesture enter",
-                   "getMaxUserDefinedGesture error: %s");
+constexpr ProxyRow kEnableWakeup = {ENABLE_WAKEUP, "Bp::enableWakeup", "enable() error: %s"};
+constexpr ProxyRow kDisableWakeup = {DISABLE_WAKEUP, "Bp::disableWakeup", "disable() error: %s"};
+constexpr ProxyRow kStartGestureDetection = {ENABLE, "Bp::startGestureDetection",
+                                             "startGestureDetection() error: %s"};
+constexpr ProxyRow kStopGestureDetection = {DISABLE, "Bp::stopGestureDetection",
+                                            "stopGestureDetection() error: %s"};
+constexpr ProxyRow kAddGesture = {ADD_GESTURE, "Bp::addGesture", "addGesture() error: %s"};
+constexpr ProxyRow kDeleteGesture = {DELETE_GESTURE, "Bp::deleteGesture",
+                                     "deleteGesture() error: %s"};
+constexpr ProxyRow kEnableGesture = {ENABLE_GESTURE, "Bp::enableGesture",
+                                     "enableGesture() error: %s"};
+constexpr ProxyRow kDisableGesture = {DISABLE_GESTURE, "Bp::disableGesture",
+                                      "disableGesture() error: %s"};
+constexpr ProxyRow kImproveGestureTraining = {VERIFY_GESTURE, "Bp::improveGestureTraining",
+                                              "improveGestureTraining() error: %s"};
+constexpr ProxyRow kGetMaxPreDefinedGesture = {GET_MAX_PREDEFINED_GESTURE,
+                                               "Bp::getMaxPreDefinedGesture enter",
+                                               "getMaxPreDefinedGesture error: %s"};
+constexpr ProxyRow kGetMaxUserDefinedGesture = {GET_MAX_USERDEFINED_GESTURE,
+                                                "Bp::getMaxUserDefinedGesture enter",
+                                                "getMaxUserDefinedGesture error: %s"};
 
 }  // namespace
 
@@ -77,16 +74,7 @@ struct Call : ManagerCall {
 
 }  // namespace
 
-BpGestureManagerService::BpGestureManagerService(const sp<IBinder>& remote)
-        : BpInterface<IGestureManagerService>(remote) {}
-
-int BpGestureManagerService::subscribe(const sp<IGestureManagerClient>& client) {
-    return Call(kSubscribe).transactWithClient(remote(), client);
-}
-
-int BpGestureManagerService::unsubscribe(const sp<IGestureManagerClient>& client) {
-    return Call(kUnsubscribe).transactWithClient(remote(), client);
-}
+IMPLEMENT_SUBSCRIPTION(GestureManagerService, IGestureManagerClient)
 
 int BpGestureManagerService::enableWakeup() {
     return Call(kEnableWakeup).transactForStatus(remote());
@@ -165,34 +153,28 @@ status_t onVerifyGesture(Service& service, const Parcel& data, Parcel& reply) {
 }
 
 const StubRow<Service> kRows[] = {
-        {"SUBSCRIBE transact received...", replyClient<&Service::subscribe, IGestureManagerClient>},
-        {"UNSUBSCRIBE transact received...",
-         replyClient<&Service::unsubscribe, IGestureManagerClient>},
-        {"ENABLE_WAKEUP transact received...", replyPlain<&Service::enableWakeup>},
-        {"DISABLE_WAKEUP transact received...", replyPlain<&Service::disableWakeup>},
-        {"ENABLE transact received...", replyPlain<&Service::startGestureDetection>},
-        {"DISABLE transact received...", replyPlain<&Service::stopGestureDetection>},
-        {"ADD_GESTURE transact received...", onAddGesture},
-        {"DELETE_GESTURE transact received...", replyInt<&Service::deleteGesture>},
-        {"ENABLE_GESTURE transact received...", replyInt<&Service::enableGesture>},
-        {"DISABLE_GESTURE transact received...", replyInt<&Service::disableGesture>},
-        {"VERIFY_GESTURE transact received...", onVerifyGesture},
-        {"GET_MAX_PREDEFINED_GESTURE transact received...",
-         replyNumber<&Service::getMaxPreDefinedGesture, unsigned int>,
+        kSubscribeRow<Service, IGestureManagerClient>,
+        kUnsubscribeRow<Service, IGestureManagerClient>,
+        {replyPlain<&Service::enableWakeup>, "ENABLE_WAKEUP transact received..."},
+        {replyPlain<&Service::disableWakeup>, "DISABLE_WAKEUP transact received..."},
+        {replyPlain<&Service::startGestureDetection>, "ENABLE transact received..."},
+        {replyPlain<&Service::stopGestureDetection>, "DISABLE transact received..."},
+        {onAddGesture, "ADD_GESTURE transact received..."},
+        {replyInt<&Service::deleteGesture>, "DELETE_GESTURE transact received..."},
+        {replyInt<&Service::enableGesture>, "ENABLE_GESTURE transact received..."},
+        {replyInt<&Service::disableGesture>, "DISABLE_GESTURE transact received..."},
+        {onVerifyGesture, "VERIFY_GESTURE transact received..."},
+        {replyNumber<&Service::getMaxPreDefinedGesture, unsigned int>,
+         "GET_MAX_PREDEFINED_GESTURE transact received...",
          "GET_MAX_PREDEFINED_GESTURE transact finished..."},
-        {"GET_MAX_USERDEFINED_GESTURE transact received...",
-         replyNumber<&Service::getMaxUserDefinedGesture, unsigned int>,
+        {replyNumber<&Service::getMaxUserDefinedGesture, unsigned int>,
+         "GET_MAX_USERDEFINED_GESTURE transact received...",
          "GET_MAX_USERDEFINED_GESTURE transact finished..."},
 };
 static_assert(sizeof(kRows) / sizeof(kRows[0]) == GET_MAX_USERDEFINED_GESTURE, "one row a code");
 
 }  // namespace
 
-status_t BnGestureManagerService::onTransact(uint32_t code, const Parcel& data, Parcel* reply,
-                                             uint32_t flags) {
-    Service& service = *this;
-    return dispatch(LOG_TAG, kRows, *this, service, code, data, reply,
-                    [&] { return BBinder::onTransact(code, data, reply, flags); });
-}
+IMPLEMENT_STUB(GestureManagerService, kRows)
 
 }  // namespace pemaro

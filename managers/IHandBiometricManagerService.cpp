@@ -46,32 +46,27 @@ enum {
 
 // Log readers know these texts so; they stay: only the subscriptions fail with parentheses, and the
 // wake-up operations fail as "enable()" and "disable()".
-constexpr ProxyRow kStartEnrollment =
-        managerRow(START_ENROLLMENT, "Bp::startEnrollment", "startEnrollment error: %s");
-constexpr ProxyRow kStopEnrollment =
-        managerRow(STOP_ENROLLMENT, "Bp::stopEnrollment", "stopEnrollment error: %s");
-constexpr ProxyRow kScan = managerRow(SCAN, "Bp::scan", "scan error: %s");
-constexpr ProxyRow kStartMatching =
-        managerRow(START_MATCHING, "Bp::startMatching", "startMatching error: %s");
-constexpr ProxyRow kStopMatching =
-        managerRow(STOP_MATCHING, "Bp::stopMatching", "stopMatching error: %s");
-constexpr ProxyRow kCancelScan = managerRow(CANCEL_SCAN, "Bp::cancelScan", "cancelScan error: %s");
-constexpr ProxyRow kSetSecurity =
-        managerRow(SET_SECURITY, "Bp::setSecurity", "setSecurity error: %s");
-constexpr ProxyRow kSetProfileName =
-        managerRow(SET_PROFILENAME, "Bp::setProfileName", "setProfileName error: %s");
-constexpr ProxyRow kDeleteProfile =
-        managerRow(DELETE_PROFILE, "Bp::deleteProfile", "deleteProfile error: %s");
-constexpr ProxyRow kRenameProfile =
-        managerRow(RENAME_PROFILE, "Bp::renameProfile", "renameProfile error: %s");
-constexpr ProxyRow kGetMaxUser =
-        managerRow(GET_MAXUSER, "Bp::getMaxUser enter", "getMaxUser error: %s");
-constexpr ProxyRow kGetProfileList =
-        managerRow(GET_PROFILELIST, "Bp::getProfileList enter", "getProfileList error: %s");
-constexpr ProxyRow kEnableWakeup =
-        managerRow(ENABLE_WAKEUP, "Bp::enableWakeup", "enable() error: %s");
-constexpr ProxyRow kDisableWakeup =
-        managerRow(DISABLE_WAKEUP, "Bp::disableWakeup", "disable() error: %s");
+constexpr ProxyRow kStartEnrollment = {START_ENROLLMENT, "Bp::startEnrollment",
+                                       "startEnrollment error: %s"};
+constexpr ProxyRow kStopEnrollment = {STOP_ENROLLMENT, "Bp::stopEnrollment",
+                                      "stopEnrollment error: %s"};
+constexpr ProxyRow kScan = {SCAN, "Bp::scan", "scan error: %s"};
+constexpr ProxyRow kStartMatching = {START_MATCHING, "Bp::startMatching",
+                                     "startMatching error: %s"};
+constexpr ProxyRow kStopMatching = {STOP_MATCHING, "Bp::stopMatching", "stopMatching error: %s"};
+constexpr ProxyRow kCancelScan = {CANCEL_SCAN, "Bp::cancelScan", "cancelScan error: %s"};
+constexpr ProxyRow kSetSecurity = {SET_SECURITY, "Bp::setSecurity", "setSecurity error: %s"};
+constexpr ProxyRow kSetProfileName = {SET_PROFILENAME, "Bp::setProfileName",
+                                      "setProfileName error: %s"};
+constexpr ProxyRow kDeleteProfile = {DELETE_PROFILE, "Bp::deleteProfile",
+                                     "deleteProfile error: %s"};
+constexpr ProxyRow kRenameProfile = {RENAME_PROFILE, "Bp::renameProfile",
+                                     "renameProfile error: %s"};
+constexpr ProxyRow kGetMaxUser = {GET_MAXUSER, "Bp::getMaxUser enter", "getMaxUser error: %s"};
+constexpr ProxyRow kGetProfileList = {GET_PROFILELIST, "Bp::getProfileList enter",
+                                      "getProfileList error: %s"};
+constexpr ProxyRow kEnableWakeup = {ENABLE_WAKEUP, "Bp::enableWakeup", "enable() error: %s"};
+constexpr ProxyRow kDisableWakeup = {DISABLE_WAKEUP, "Bp::disableWakeup", "disable() error: %s"};
 
 }  // namespace
 
@@ -98,16 +93,7 @@ struct Call : ManagerCall {
 
 }  // namespace
 
-BpHandBiometricManagerService::BpHandBiometricManagerService(const sp<IBinder>& remote)
-        : BpInterface<IHandBiometricManagerService>(remote) {}
-
-int BpHandBiometricManagerService::subscribe(const sp<IHandBiometricManagerClient>& client) {
-    return Call(kSubscribe).transactWithClient(remote(), client);
-}
-
-int BpHandBiometricManagerService::unsubscribe(const sp<IHandBiometricManagerClient>& client) {
-    return Call(kUnsubscribe).transactWithClient(remote(), client);
-}
+IMPLEMENT_SUBSCRIPTION(HandBiometricManagerService, IHandBiometricManagerClient)
 
 int BpHandBiometricManagerService::startEnrollment() {
     return Call(kStartEnrollment).transactForStatus(remote());
@@ -218,36 +204,29 @@ status_t onGetProfileList(Service& service, const Parcel&, Parcel& reply) {
 }
 
 const StubRow<Service> kRows[] = {
-        {"SUBSCRIBE transact received...",
-         replyClient<&Service::subscribe, IHandBiometricManagerClient>},
-        {"UNSUBSCRIBE transact received...",
-         replyClient<&Service::unsubscribe, IHandBiometricManagerClient>},
-        {"START_ENROLLMENT transact received...", replyPlain<&Service::startEnrollment>},
-        {"STOP_ENROLLMENT transact received...", replyPlain<&Service::stopEnrollment>},
-        {"SCAN transact received...", replyPlain<&Service::scan>},
-        {"START_MATCHING transact received...", replyPlain<&Service::startMatching>},
-        {"STOP_MATCHING transact received...", replyPlain<&Service::stopMatching>},
-        {"CANCEL_SCAN transact received...", replyPlain<&Service::cancelScan>},
-        {"SET_SECURITY transact received...", replyInt<&Service::setSecurity>},
-        {"SET_PROFILENAME transact received...", replyName<&Service::setProfileName>},
-        {"DELETE_PROFILE transact received...", replyName<&Service::deleteProfile>},
-        {"RENAME_PROFILE transact received...", onRenameProfile},
-        {"GET_MAXUSER transact received...", replyNumber<&Service::getMaxUser, unsigned int>,
+        kSubscribeRow<Service, IHandBiometricManagerClient>,
+        kUnsubscribeRow<Service, IHandBiometricManagerClient>,
+        {replyPlain<&Service::startEnrollment>, "START_ENROLLMENT transact received..."},
+        {replyPlain<&Service::stopEnrollment>, "STOP_ENROLLMENT transact received..."},
+        {replyPlain<&Service::scan>, "SCAN transact received..."},
+        {replyPlain<&Service::startMatching>, "START_MATCHING transact received..."},
+        {replyPlain<&Service::stopMatching>, "STOP_MATCHING transact received..."},
+        {replyPlain<&Service::cancelScan>, "CANCEL_SCAN transact received..."},
+        {replyInt<&Service::setSecurity>, "SET_SECURITY transact received..."},
+        {replyName<&Service::setProfileName>, "SET_PROFILENAME transact received..."},
+        {replyName<&Service::deleteProfile>, "DELETE_PROFILE transact received..."},
+        {onRenameProfile, "RENAME_PROFILE transact received..."},
+        {replyNumber<&Service::getMaxUser, unsigned int>, "GET_MAXUSER transact received...",
          "GET_MAXUSER transact finished..."},
-        {"GET_PROFILELIST transact received...", onGetProfileList,
+        {onGetProfileList, "GET_PROFILELIST transact received...",
          "GET_PROFILELIST transact finished..."},
-        {"ENABLE_WAKEUP transact received...", replyPlain<&Service::enableWakeup>},
-        {"DISABLE_WAKEUP transact received...", replyPlain<&Service::disableWakeup>},
+        {replyPlain<&Service::enableWakeup>, "ENABLE_WAKEUP transact received..."},
+        {replyPlain<&Service::disableWakeup>, "DISABLE_WAKEUP transact received..."},
 };
 static_assert(sizeof(kRows) / sizeof(kRows[0]) == DISABLE_WAKEUP, "one row a code");
 
 }  // namespace
 
-status_t BnHandBiometricManagerService::onTransact(uint32_t code, const Parcel& data, Parcel* reply,
-                                                   uint32_t flags) {
-    Service& service = *this;
-    return dispatch(LOG_TAG, kRows, *this, service, code, data, reply,
-                    [&] { return BBinder::onTransact(code, data, reply, flags); });
-}
+IMPLEMENT_STUB(HandBiometricManagerService, kRows)
 
 }  // namespace pemaro

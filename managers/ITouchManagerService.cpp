@@ -30,13 +30,12 @@ enum {
     CONFIGURE_VM_REGION,
 };
 
-constexpr ProxyRow kIsSupported =
-        managerRow(IS_SUPPORTED, "Bp::isSupported", "isSupported() error: %s");
-constexpr ProxyRow kIsEnabled = managerRow(IS_ENABLED, "Bp::isEnabled", "isEnabled() error: %s");
-constexpr ProxyRow kEnable = managerRow(ENABLE, "Bp::enable", "enable() error: %s");
-constexpr ProxyRow kDisable = managerRow(DISABLE, "Bp::disable", "disable() error: %s");
-constexpr ProxyRow kConfigureVmRegion = managerRow(CONFIGURE_VM_REGION, "Bp::configure_vm_region",
-                                                   "configure_vm_region() error: %s");
+constexpr ProxyRow kIsSupported = {IS_SUPPORTED, "Bp::isSupported", "isSupported() error: %s"};
+constexpr ProxyRow kIsEnabled = {IS_ENABLED, "Bp::isEnabled", "isEnabled() error: %s"};
+constexpr ProxyRow kEnable = {ENABLE, "Bp::enable", "enable() error: %s"};
+constexpr ProxyRow kDisable = {DISABLE, "Bp::disable", "disable() error: %s"};
+constexpr ProxyRow kConfigureVmRegion = {CONFIGURE_VM_REGION, "Bp::configure_vm_region",
+                                         "configure_vm_region() error: %s"};
 
 // A region's fields in their order on the wire, which is not that of the structure: the two sides
 // have always spoken it so.
@@ -55,16 +54,7 @@ struct Call : ManagerCall {
 
 }  // namespace
 
-BpTouchManagerService::BpTouchManagerService(const sp<IBinder>& remote)
-        : BpInterface<ITouchManagerService>(remote) {}
-
-int BpTouchManagerService::subscribe(const sp<ITouchManagerClient>& client) {
-    return Call(kSubscribe).transactWithClient(remote(), client);
-}
-
-int BpTouchManagerService::unsubscribe(const sp<ITouchManagerClient>& client) {
-    return Call(kUnsubscribe).transactWithClient(remote(), client);
-}
+IMPLEMENT_SUBSCRIPTION(TouchManagerService, ITouchManagerClient)
 
 int BpTouchManagerService::isSupported(int feature, bool& supported) {
     Call call(kIsSupported);
@@ -124,24 +114,18 @@ status_t onConfigureVmRegion(Service& service, const Parcel& data, Parcel& reply
 }
 
 const StubRow<Service> kRows[] = {
-        {"SUBSCRIBE transact received...", replyClient<&Service::subscribe, ITouchManagerClient>},
-        {"UNSUBSCRIBE transact received...",
-         replyClient<&Service::unsubscribe, ITouchManagerClient>},
-        {"IS_SUPPORTED transact received...", replyAnswer<&Service::isSupported>},
-        {"IS_ENABLED transact received...", replyAnswer<&Service::isEnabled>},
-        {"ENABLE transact received...", replyInt<&Service::enable>},
-        {"DISABLE transact received...", replyInt<&Service::disable>},
-        {"CONFIGURE_VM_REGION transact received...", onConfigureVmRegion},
+        kSubscribeRow<Service, ITouchManagerClient>,
+        kUnsubscribeRow<Service, ITouchManagerClient>,
+        {replyAnswer<&Service::isSupported>, "IS_SUPPORTED transact received..."},
+        {replyAnswer<&Service::isEnabled>, "IS_ENABLED transact received..."},
+        {replyInt<&Service::enable>, "ENABLE transact received..."},
+        {replyInt<&Service::disable>, "DISABLE transact received..."},
+        {onConfigureVmRegion, "CONFIGURE_VM_REGION transact received..."},
 };
 static_assert(sizeof(kRows) / sizeof(kRows[0]) == CONFIGURE_VM_REGION, "one row a code");
 
 }  // namespace
 
-status_t BnTouchManagerService::onTransact(uint32_t code, const Parcel& data, Parcel* reply,
-                                           uint32_t flags) {
-    Service& service = *this;
-    return dispatch(LOG_TAG, kRows, *this, service, code, data, reply,
-                    [&] { return BBinder::onTransact(code, data, reply, flags); });
-}
+IMPLEMENT_STUB(TouchManagerService, kRows)
 
 }  // namespace pemaro

@@ -4,8 +4,8 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "companion/ProxyCall.h"
-#include "companion/StubDispatch.h"
+#include "binder/ProxyCall.h"
+#include "binder/StubDispatch.h"
 #include "pemaro/Binder.h"
 #include "pemaro/Status.h"
 
@@ -15,20 +15,17 @@ namespace pemaro {
 //
 //   - The service's status is passed on without a log; a row has no text for it.
 //   - A reply carries values first and the status last, as int32 each.
-//   - A callback object crosses as a strong binder.
+//   - The first two transactions register and forget the callback object of a client.
 //   - Records cross as raw bytes, without a length and without a copy on the receiving side. No
 //     record, which reads as null, is what null is sent as.
 
 // ---- proxies ----
 
-constexpr ProxyRow managerRow(uint32_t code, const char* entry, const char* transportError) {
-    return {code, entry, transportError, nullptr};
-}
-
-// The first two transactions of each service. The second one's entry has a colon and a blank; log
-// readers know it so, and it stays.
-constexpr ProxyRow kSubscribe = managerRow(1, "Bp::subscribe", "subscribe() error: %s");
-constexpr ProxyRow kUnsubscribe = managerRow(2, "Bp: unsubscribe", "unsubscribe() error: %s");
+// The second one's entry has a colon and a blank; log readers know it so, and it stays.
+constexpr ProxyRow kSubscribe = {android::IBinder::FIRST_CALL_TRANSACTION, "Bp::subscribe",
+                                 "subscribe() error: %s"};
+constexpr ProxyRow kUnsubscribe = {android::IBinder::FIRST_CALL_TRANSACTION + 1, "Bp: unsubscribe",
+                                   "unsubscribe() error: %s"};
 
 struct ManagerCall : ProxyCall {
     using ProxyCall::ProxyCall;
@@ -44,14 +41,7 @@ struct ManagerCall : ProxyCall {
     /// For subscribing and unsubscribing.
     template <typename Client>
     int transactWithClient(android::IBinder* remote, const android::sp<Client>& client) {
-        request.writeStrongBinder(android::IInterface::asBinder(client));
-        return transactForStatus(remote);
-    }
-
-    /// For the callbacks.
-    template <typename Record>
-    int transactWithRecord(android::IBinder* remote, const Record* record) {
-        writeRecords(record, 1);
+        writeObject(client);
         return transactForStatus(remote);
     }
 
@@ -86,12 +76,13 @@ android::status_t replyValue(android::Parcel& reply, Call&& call) {
     return replyStatus(reply, status);
 }
 
-/// The handler of subscribing and unsubscribing.
-template <auto kOperation, typename Client, typename Service>
-android::status_t replyClient(Service& service, const android::Parcel& data,
-                              android::Parcel& reply) {
-    return replyStatus(reply, (service.*kOperation)(Client::asInterface(data.readStrongBinder())));
-}
+/// The first two rows of each service's table.
+template <typename Service, typename Client>
+constexpr StubRow<Service> kSubscribeRow = {replyObject<&Service::subscribe, Client>,
+                                            "SUBSCRIBE transact received..."};
+template <typename Service, typename Client>
+constexpr StubRow<Service> kUnsubscribeRow = {replyObject<&Service::unsubscribe, Client>,
+                                              "UNSUBSCRIBE transact received..."};
 
 /// The handler of an operation that tells a number.
 template <auto kOperation, typename Value, typename Service>
@@ -99,10 +90,17 @@ android::status_t replyNumber(Service& service, const android::Parcel&, android:
     return replyValue<Value>(reply, [&](Value& value) { return (service.*kOperation)(value); });
 }
 
-/// The handler of a callback with one record.
-template <auto kOperation, typename Record, typename Client>
-android::status_t replyRecord(Client& client, const android::Parcel& data, android::Parcel& reply) {
-    return replyStatus(reply, (client.*kOperation)(readRecords<Record>(data, 1)));
-}
-
 }  // namespace pemaro
+
+/// Defines the proxy's constructor and the two operations that each manager's service begins with,
+/// for the interface I<NAME> and callback objects of the interface CLIENT; a `Call` that takes a row
+/// has to be in sight.
+#define IMPLEMENT_SUBSCRIPTION(NAME, CLIENT)                            \
+    Bp##NAME::Bp##NAME(const android::sp<android::IBinder>& remote)     \
+            : BpInterface<I##NAME>(remote) {}                           \
+    int Bp##NAME::subscribe(const android::sp<CLIENT>& client) {        \
+        return Call(kSubscribe).transactWithClient(remote(), client);   \
+    }                                                                   \
+    int Bp##NAME::unsubscribe(const android::sp<CLIENT>& client) {      \
+        return Call(kUnsubscribe).transactWithClient(remote(), client); \
+    }

@@ -1,11 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <log/log.h>
-
-#include <utility>
-
-#include "companion/ServiceLookup.h"
+#include "binder/Log.h"
+#include "binder/ServiceLookup.h"
 #include "pemaro/Binder.h"
 #include "pemaro/Status.h"
 
@@ -20,9 +17,6 @@ namespace pemaro {
 //
 // (A touch manager client keeps the service when subscribing failed, and is not told of a death.)
 // Nothing is locked: see the clients' headers for what must not coincide.
-
-void logManagerDebug(const char* tag, const char* text);
-void logManagerError(const char* tag, const char* text);
 
 /// What distinguishes the connection of one client class from that of another. The texts of a
 /// client that does not watch its service are null where they are about that.
@@ -47,7 +41,7 @@ class ManagerConnection {
     /// init() of the clients that watch their service: look up, subscribe, link to its death. What
     /// had been done is undone when a step fails.
     int initWatched(DeathRecipient* watcher) {
-        logManagerDebug(mTexts.tag, "init: E");
+        logText(ANDROID_LOG_DEBUG, mTexts.tag, "init: E");
         android::sp<android::IBinder> binder = awaitService(mTexts.tag, mTexts.serviceName);
         if (binder == nullptr) {
             return STATUS_ERROR_ACQUIRING_RESOURCE;
@@ -62,7 +56,7 @@ class ManagerConnection {
             return refused(status);
         }
         if (binder->linkToDeath(watcher, nullptr, 0) != android::NO_ERROR) {
-            logManagerError(mTexts.tag, mTexts.linkFailed);
+            logText(ANDROID_LOG_ERROR, mTexts.tag, mTexts.linkFailed);
             unsubscribe();
             mService.clear();
             return STATUS_UNKNOWN_ERROR;
@@ -76,21 +70,21 @@ class ManagerConnection {
     int hold(const android::sp<android::IBinder>& binder) {
         mService = Service::asInterface(binder);
         if (mService == nullptr) {
-            logManagerError(mTexts.tag, "wrong service interface?");
+            logText(ANDROID_LOG_ERROR, mTexts.tag, "wrong service interface?");
             return STATUS_BAD_PARAMETER;
         }
         return STATUS_NO_ERROR;
     }
 
     int refused(int status) {
-        logManagerError(mTexts.tag, "subscribing to service failed");
+        logText(ANDROID_LOG_ERROR, mTexts.tag, "subscribing to service failed");
         return status;
     }
 
     /// Success is logged as an error so that it shows in every log.
     int connected() {
         mInitialized = true;
-        logManagerError(mTexts.tag, mTexts.connected);
+        logText(ANDROID_LOG_ERROR, mTexts.tag, mTexts.connected);
         return STATUS_NO_ERROR;
     }
 
@@ -98,7 +92,7 @@ class ManagerConnection {
 
     /// `watcher` is the one of initWatched(), null where there is none.
     int deinit(DeathRecipient* watcher) {
-        logManagerDebug(mTexts.tag, "deinit: E");
+        logText(ANDROID_LOG_DEBUG, mTexts.tag, "deinit: E");
         if (mInitialized && mService != nullptr) {
             unsubscribe();
             android::sp<android::IBinder> binder = android::IInterface::asBinder(mService);
@@ -108,7 +102,7 @@ class ManagerConnection {
             mService.clear();
             mInitialized = false;
         }
-        logManagerDebug(mTexts.tag, "deinit: X");
+        logText(ANDROID_LOG_DEBUG, mTexts.tag, "deinit: X");
         return STATUS_NO_ERROR;
     }
 
@@ -117,11 +111,11 @@ class ManagerConnection {
     template <typename Callback>
     bool accepts(Callback* callback, void* context, const char* callbackMissing) {
         if (callback == nullptr) {
-            logManagerError(mTexts.tag, callbackMissing);
+            logText(ANDROID_LOG_ERROR, mTexts.tag, callbackMissing);
             return false;
         }
         if (context == nullptr) {
-            logManagerError(mTexts.tag, "JNI context is null...unsubscribing client");
+            logText(ANDROID_LOG_ERROR, mTexts.tag, "JNI context is null...unsubscribing client");
             unsubscribe();
             return false;
         }
@@ -141,22 +135,5 @@ class ManagerConnection {
     android::sp<Service>& mService;
     Client* const mSelf;
 };
-
-/// Calls an operation of the service and passes its status on; a failure is logged with `failure`,
-/// a format for its message. 0x4000000B when no service is held.
-template <typename Service, typename... Parameters, typename... Arguments>
-int callService(const char* tag, const char* failure, const android::sp<Service>& service,
-                int (Service::*operation)(Parameters...), Arguments&&... arguments) {
-    int status = STATUS_INVALID_STATE;
-    // Kept for the call, during which a callback on this thread may let go of the service.
-    android::sp<Service> held = service;
-    if (held != nullptr) {
-        status = (held.get()->*operation)(std::forward<Arguments>(arguments)...);
-    }
-    if (status != STATUS_NO_ERROR) {
-        __android_log_print(ANDROID_LOG_ERROR, tag, failure, errStr(status));
-    }
-    return status;
-}
 
 }  // namespace pemaro

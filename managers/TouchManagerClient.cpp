@@ -5,6 +5,7 @@
 
 #include <log/log.h>
 
+#include "binder/ServiceCall.h"
 #include "managers/ManagerConnection.h"
 #include "pemaro/Status.h"
 
@@ -68,25 +69,25 @@ int TouchManagerClient::deinit() {
 // configure_vm_region fails with disable's text. Log readers know it so; it stays.
 
 int TouchManagerClient::isSupported(int feature, bool& supported) {
-    return callService(LOG_TAG, "isSupported failed: %s", mService, &Service::isSupported, feature,
-                       supported);
+    return callService({LOG_TAG, "isSupported failed: %s"}, mService, &Service::isSupported,
+                       feature, supported);
 }
 
 int TouchManagerClient::isEnabled(int feature, bool& enabled) {
-    return callService(LOG_TAG, "isEnabled failed: %s", mService, &Service::isEnabled, feature,
+    return callService({LOG_TAG, "isEnabled failed: %s"}, mService, &Service::isEnabled, feature,
                        enabled);
 }
 
 int TouchManagerClient::enable(int feature) {
-    return callService(LOG_TAG, "enable failed: %s", mService, &Service::enable, feature);
+    return callService({LOG_TAG, "enable failed: %s"}, mService, &Service::enable, feature);
 }
 
 int TouchManagerClient::disable(int feature) {
-    return callService(LOG_TAG, "disable failed: %s", mService, &Service::disable, feature);
+    return callService({LOG_TAG, "disable failed: %s"}, mService, &Service::disable, feature);
 }
 
 int TouchManagerClient::configure_vm_region(Rect& region, bool flag) {
-    return callService(LOG_TAG, "disable failed: %s", mService, &Service::configure_vm_region,
+    return callService({LOG_TAG, "disable failed: %s"}, mService, &Service::configure_vm_region,
                        region, flag);
 }
 

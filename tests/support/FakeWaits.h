@@ -9,7 +9,7 @@
 #include <mutex>
 #include <vector>
 
-#include "companion/Waiting.h"
+#include "binder/Waiting.h"
 
 namespace pemaro::test {
 

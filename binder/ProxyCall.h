@@ -4,7 +4,6 @@
 #include <utils/String16.h>
 
 #include <cstdint>
-#include <string>
 
 #include "pemaro/Binder.h"
 
@@ -13,12 +12,10 @@ namespace pemaro {
 // What every proxy of the library does for every operation, told once:
 //
 //   1. log the operation's entry text (debug) and write the interface token, then the arguments;
-//   2. transact, synchronously; a transport failure is logged (error) with the text of its negated
-//   status
-//      and becomes 0x40000000, whatever it was;
-//   3. read the reply; a status that the service returned is passed on unchanged, after it was
-//   logged
-//      (error) with its message where the operation has a text for that.
+//   2. transact, synchronously; a transport failure becomes 0x40000000, whatever it was, and is
+//      logged (error) with the text of its negated status;
+//   3. read the reply; the service's status is passed on unchanged, and a failure is logged (error)
+//      with its message where the operation has a text for that.
 //
 // An operation states its row and its arguments:
 //
@@ -35,7 +32,7 @@ struct ProxyRow {
     uint32_t code;
     const char* entry;
     const char* transportError;
-    const char* remoteError;
+    const char* remoteError = nullptr;
 };
 
 class ProxyCall {
@@ -55,6 +52,12 @@ class ProxyCall {
     /// Both: for the operations whose reply begins with the status.
     int transactForStatus(android::IBinder* remote);
 
+    /// An object of the caller's goes into the request as a strong binder.
+    template <typename Interface>
+    void writeObject(const android::sp<Interface>& object) {
+        request.writeStrongBinder(android::IInterface::asBinder(object));
+    }
+
   private:
     const char* const mTag;
     const ProxyRow& mRow;
@@ -62,9 +65,5 @@ class ProxyCall {
 
 /// The text of a failed transport status, which is a negative errno.
 const char* transportText(android::status_t status);
-
-/// A text crosses as String8, all its bytes.
-void writeText(android::Parcel& parcel, const std::string& text);
-std::string readText(const android::Parcel& parcel);
 
 }  // namespace pemaro

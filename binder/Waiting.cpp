@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "companion/Waiting.h"
+#include "binder/Waiting.h"
 
 namespace pemaro {
 

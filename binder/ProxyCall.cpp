@@ -1,20 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "companion/ProxyCall.h"
+#include "binder/ProxyCall.h"
 
 #include <log/log.h>
-#include <utils/String8.h>
 
 #include <cstring>
 
+#include "binder/Log.h"
 #include "pemaro/Status.h"
 
 namespace pemaro {
 
 ProxyCall::ProxyCall(const char* tag, const ProxyRow& row, const android::String16& descriptor)
         : mTag(tag), mRow(row) {
-    if (mRow.entry != nullptr) {
-        __android_log_print(ANDROID_LOG_DEBUG, mTag, "%s", mRow.entry);
-    }
+    logText(ANDROID_LOG_DEBUG, mTag, mRow.entry);
     request.writeInterfaceToken(descriptor);
 }
 
@@ -45,15 +43,6 @@ int ProxyCall::transactForStatus(android::IBinder* remote) {
 const char* transportText(android::status_t status) {
     // In unsigned arithmetic: the platform's UNKNOWN_ERROR is the one number that has no negative.
     return strerror(static_cast<int>(0u - static_cast<unsigned int>(status)));
-}
-
-void writeText(android::Parcel& parcel, const std::string& text) {
-    parcel.writeString8(android::String8(text.data(), text.size()));
-}
-
-std::string readText(const android::Parcel& parcel) {
-    android::String8 text = parcel.readString8();
-    return std::string(text.c_str(), text.size());
 }
 
 }  // namespace pemaro

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "binder/Log.h"
 #include "pemaro/Binder.h"
 
 namespace pemaro {
@@ -15,18 +16,15 @@ namespace pemaro {
 /// One transaction of an interface; row n of a table serves the code n + 1.
 template <typename Service>
 struct StubRow {
-    /// Logged at debug priority when the request is accepted; null for nothing.
-    const char* log;
     /// Reads the request, calls the operation and writes the reply; returns the transaction's
     /// result.
     android::status_t (*handle)(Service& service, const android::Parcel& data,
                                 android::Parcel& reply);
+    /// Logged at debug priority when the request is accepted; null for nothing.
+    const char* received = nullptr;
     /// Logged at debug priority when the reply is written; null for nothing.
     const char* finished = nullptr;
 };
-
-/// At debug priority; nothing for a null text.
-void logTransaction(const char* tag, const char* text);
 
 /// `fallback` is the call of BBinder::onTransact, which only the stub itself may make.
 template <typename Service, size_t N, typename Fallback>
@@ -41,10 +39,10 @@ android::status_t dispatch(const char* tag, const StubRow<Service> (&rows)[N],
         return fallback();
     }
     const StubRow<Service>& row = rows[code - android::IBinder::FIRST_CALL_TRANSACTION];
-    logTransaction(tag, row.log);
+    logText(ANDROID_LOG_DEBUG, tag, row.received);
     android::Parcel unwanted;  // a local caller may pass no reply parcel
     android::status_t result = row.handle(service, data, reply != nullptr ? *reply : unwanted);
-    logTransaction(tag, row.finished);
+    logText(ANDROID_LOG_DEBUG, tag, row.finished);
     return result;
 }
 
@@ -66,4 +64,22 @@ android::status_t replyInt(Service& service, const android::Parcel& data, androi
     return replyStatus(reply, (service.*kOperation)(data.readInt32()));
 }
 
+/// The handler of an operation on an object of the caller's, which crosses as a strong binder.
+template <auto kOperation, typename Interface, typename Service>
+android::status_t replyObject(Service& service, const android::Parcel& data,
+                              android::Parcel& reply) {
+    return replyStatus(reply,
+                       (service.*kOperation)(Interface::asInterface(data.readStrongBinder())));
+}
+
 }  // namespace pemaro
+
+/// Defines the onTransact of the stub Bn<NAME>, which serves the interface I<NAME> by the table
+/// ROWS and logs under LOG_TAG; as the platform's IMPLEMENT_META_INTERFACE, inside the namespace.
+#define IMPLEMENT_STUB(NAME, ROWS)                                                               \
+    android::status_t Bn##NAME::onTransact(uint32_t code, const android::Parcel& data,           \
+                                           android::Parcel* reply, uint32_t flags) {             \
+        I##NAME& service = *this;                                                                \
+        return dispatch(LOG_TAG, ROWS, *this, service, code, data, reply,                        \
+                        [&] { return android::BBinder::onTransact(code, data, reply, flags); }); \
+    }

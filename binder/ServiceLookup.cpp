@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "companion/ServiceLookup.h"
+#include "binder/ServiceLookup.h"
 
 #include <binder/IServiceManager.h>
-#include <log/log.h>
 #include <utils/String16.h>
 
-#include "companion/Waiting.h"
+#include "binder/Log.h"
+#include "binder/Waiting.h"
 
 namespace pemaro {
 
@@ -19,14 +19,10 @@ namespace {
 constexpr int kLookupAttempts = 10;
 constexpr useconds_t kLookupPauseMicros = 500000;
 
-void logError(const char* tag, const char* text) {
-    __android_log_print(ANDROID_LOG_ERROR, tag, "%s", text);
-}
-
 sp<IServiceManager> serviceManager(const char* tag) {
     sp<IServiceManager> manager = android::defaultServiceManager();
     if (manager == nullptr) {
-        logError(tag, "couldn't get default service manager");
+        logText(ANDROID_LOG_ERROR, tag, "couldn't get default service manager");
     }
     return manager;
 }
@@ -40,7 +36,7 @@ sp<IBinder> findService(const char* tag, const char* name) {
     }
     sp<IBinder> binder = manager->getService(String16(name));
     if (binder == nullptr) {
-        logError(tag, "couldn't find the service");
+        logText(ANDROID_LOG_ERROR, tag, "couldn't find the service");
     }
     return binder;
 }
@@ -60,7 +56,7 @@ sp<IBinder> awaitService(const char* tag, const char* name) {
                             kLookupAttempts);
         waitHooks().sleepMicros(kLookupPauseMicros);
     }
-    logError(tag, "couldn't find service");
+    logText(ANDROID_LOG_ERROR, tag, "couldn't find service");
     return nullptr;
 }
 
