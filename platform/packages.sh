@@ -8,9 +8,9 @@ PACKAGES_PLATFORM=(android-libutils-dev android-libcutils-dev android-liblog-dev
 # Compilers; clang with its runtime and symbolizer is for the address sanitizer.
 PACKAGES_BUILD=(g++ cmake ninja-build clang libclang-rt-14-dev llvm)
 # The exported interface is compared by libabigail, and compiled with the device's C++ library as well; zsh
-# runs its completion.
+# runs its completion; spin verifies the model of the shared ring.
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev abigail-tools libc++-14-dev libc++abi-14-dev
-    zsh)
+    spin zsh)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
 PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev mandoc)
 # The machine that runs a kernel with the Binder driver.

@@ -1,0 +1,243 @@
+/* SPDX-License-Identifier: Apache-2.0
+ *
+ * The shared ring of frames as a model for spin: a writer that may die before each of its steps, the
+ * client's recording thread, and the caller who stops it.
+ *
+ * Each statement is one step, and so is each access to the shared block. That the steps of one side are
+ * seen in order by the other is what publishIndex() and acquireIndex() are for. A writer that stands
+ * still for ever (SIGSTOP) leaves the same block behind as one that dies, so death stands for both.
+ *
+ * What is smaller than in the library:
+ *   - rings of 1 to 4 frames, all in one run;
+ *   - the indices wrap at 2 rounds of the ring instead of 2^32, so that a recording without end has an
+ *     end here. 2^32 is a whole number of rounds for 1, 2 and 4 frames; for 3 the model tells of the time
+ *     before the real indices wrap;
+ *   - a frame is its number, written twice (its head and its tail);
+ *   - an empty ring is given up after 3 waits instead of 63.
+ *
+ * What it shows is in the assertions and in the ltl claims at the end. DEFECT breaks the ring in one
+ * place; check-ring shows that each of them is found.
+ */
+#ifndef DEFECT
+#define DEFECT 0
+#endif
+#define PUBLISHES_FIRST 1     /* the writer publishes its index before the frame is written */
+#define WRITES_INTO_FULL 2    /* the writer takes a full ring for one with room */
+#define REFUSES_EARLY 3       /* the writer takes a ring with room for one frame for full */
+#define RELEASES_FIRST 4      /* the reader releases its frames before it is done with them */
+#define CROSSES_THE_END 5     /* the reader takes a run across the end of the ring */
+#define FORGETS_THE_ROUND 6   /* the reader does not count its rounds */
+#define RELEASES_ONE_LESS 7   /* the reader releases one frame less than it took */
+#define WAITS_FOR_EVER 8      /* the reader waits for the signal without a deadline */
+#define LOCKS_SHARED_MUTEX 9  /* the reader's wait ends in a lock of the shared mutex, without a deadline */
+#define NEEDS_INNER_LOCK 10   /* the reader's wait needs the lock that a signal holds in the condition */
+#define UNMAPS_TOO_EARLY 11   /* the caller unmaps the block although the thread did not end */
+
+#define MOST_FRAMES 4
+#define MOST_WAITS 3
+#define WRAP(number) ((number) % (2 * frames))
+#define MINUS(a, b) WRAP((a) + 2 * frames - (b))
+
+byte frames;                      /* bufferFrames: frames in the ring */
+
+/* the shared block */
+byte read, write, readWrap;
+byte head[MOST_FRAMES], tail[MOST_FRAMES];
+bool signalled;                   /* the condition: a signal that nobody has taken */
+bool mutexHeld;                   /* the shared mutex, held by the writer */
+bool innerHeld;                   /* the condition's own lock, held by the writer in its signal */
+
+bool dead;                        /* the writer */
+bool stopAsked, stopped;          /* stopRecord(): entered, returned */
+bool exitPending, threadEnded;    /* the recording thread: asked to end, ended */
+bool mapped = true;
+byte delivered;                   /* the number that the next frame has to have */
+
+/* ---- the service ---- */
+
+proctype writer() {
+    byte next, slot, waiting;
+    bool room, takesIt;
+    {
+        do
+        :: d_step {
+               waiting = MINUS(next, read);
+               room = (MINUS(write, read) < frames);
+               takesIt = (waiting < frames + (DEFECT == WRITES_INTO_FULL) - (DEFECT == REFUSES_EARLY));
+               assert(takesIt || !room);   /* no frame is refused while there is room */
+               waiting = 0;
+               room = false
+           }
+           if
+           :: !takesIt
+           :: else ->
+               if
+               :: DEFECT == PUBLISHES_FIRST -> write = WRAP(next + 1)
+               :: else
+               fi;
+               head[slot] = next;
+               tail[slot] = next;
+               d_step {
+                   slot = (slot + 1) % frames;
+                   next = WRAP(next + 1);
+                   write = next       /* publishIndex() */
+               }
+               mutexHeld = true;      /* not every service signals under the mutex; this one is the worse */
+               innerHeld = true;
+               d_step { signalled = true; innerHeld = false; mutexHeld = false }
+           fi
+        od
+    } unless { dead }
+}
+
+proctype killer() {
+    if
+    :: dead = true
+    :: true
+    fi
+}
+
+/* ---- the client ---- */
+
+/* One wait. It ends with the signal or at its deadline, whatever the shared words hold. */
+inline waitForWriter() {
+    assert(mapped);
+    if
+    :: signalled -> signalled = false
+    :: DEFECT != WAITS_FOR_EVER
+    fi;
+    if
+    :: DEFECT == LOCKS_SHARED_MUTEX -> !mutexHeld
+    :: DEFECT == NEEDS_INNER_LOCK -> !innerHeld
+    :: else
+    fi
+}
+
+/* acquireBuffer(): yields taken frames from slot on, or timedOut. */
+inline acquireBuffer() {
+    d_step { assert(mapped); seen = write };
+    if
+    :: seen != read
+    :: else ->
+        do
+        :: seen = write;
+           atomic {
+               waitForWriter();
+               waits++;
+               if
+               :: waits == MOST_WAITS -> timedOut = true; break
+               :: waits != MOST_WAITS && seen != read -> break
+               :: else
+               fi
+           }
+        od
+    fi;
+    if
+    :: timedOut
+    :: else -> atomic {
+        waits = 0;
+        if
+        :: taken = 1              /* processData() wants 1 */
+        :: taken = frames         /* others may want more */
+        fi;
+        d_step {
+            available = MINUS(seen, read);
+            taken = (available < taken -> available : taken);
+            untilEnd = MINUS(WRAP((readWrap + 1) * frames), read);
+            taken = (untilEnd < taken && DEFECT != CROSSES_THE_END -> untilEnd : taken);
+            slot = MINUS(read, readWrap * frames);
+            available = 0;
+            untilEnd = 0;
+            seen = 0
+        }
+    }
+    fi
+}
+
+inline releaseBuffer(count) {
+    d_step {
+        assert(mapped);
+        if
+        :: count > 0 && (read + count) % frames == 0 && DEFECT != FORGETS_THE_ROUND ->
+            readWrap = 1 - readWrap
+        :: else
+        fi;
+        read = WRAP(read + count)     /* publishIndex() */
+    }
+}
+
+proctype recordingThread() {
+    byte seen, waits, available, untilEnd, taken, slot, i, first;
+    bool timedOut;
+    do
+    :: exitPending -> break
+    :: else ->
+        acquireBuffer();
+        if
+        :: timedOut -> d_step { timedOut = false; waits = 0; seen = 0 }
+        :: else ->
+            if
+            :: DEFECT == RELEASES_FIRST -> releaseBuffer(taken)
+            :: else
+            fi;
+            do
+            :: i < taken ->
+                d_step {
+                    assert(mapped && slot + i < frames);
+                    first = head[slot + i]
+                };
+                d_step {
+                    assert(mapped);
+                    assert(first == tail[slot + i]);   /* no frame is torn */
+                    assert(first == delivered);        /* none comes twice, none is left out */
+                    delivered = WRAP(delivered + 1);
+                    first = 0;
+                    i++
+                }
+            :: else -> break
+            od;
+            if
+            :: DEFECT == RELEASES_FIRST
+            :: DEFECT == RELEASES_ONE_LESS && taken > 0 -> releaseBuffer(taken - 1)
+            :: else -> releaseBuffer(taken)
+            fi;
+            d_step { taken = 0; slot = 0; i = 0 }
+        fi
+    od;
+    threadEnded = true
+}
+
+/* stopRecord(), at any time or never. A thread that does not end in time is left behind with all that it
+ * needs. */
+proctype caller() {
+    if
+    :: true
+    :: stopAsked = true;
+       exitPending = true;
+       if
+       :: threadEnded -> mapped = false
+       :: DEFECT == UNMAPS_TOO_EARLY -> mapped = false
+       :: true
+       fi;
+       stopped = true
+    fi
+}
+
+init {
+    atomic {
+        select(frames : 1 .. MOST_FRAMES);
+        run writer();
+        run killer();
+        run recordingThread();
+        run caller()
+    }
+}
+
+/* Whatever became of the writer: stopRecord() returns, and the thread ends by itself. */
+ltl ends { [] (stopAsked -> <> (stopped && threadEnded)) }
+
+/* What a writer published before it died is delivered. */
+ltl survives { [] (dead -> <> (delivered == write || stopAsked)) }
+
+/* A frame in the ring does not wait without end; number 0 stands for all. */
+ltl arrives { [] ((delivered == 0 && write != 0) -> <> (delivered != 0 || stopAsked)) }
