@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "frames/FrameFile.h"
 
+#include <android-base/errno_restorer.h>
+#include <android-base/macros.h>
 #include <fcntl.h>
 #include <unistd.h>
 
@@ -9,6 +11,30 @@
 #include <cstring>
 
 namespace pemaro::frames {
+namespace {
+
+bool takeBack(int fd, size_t bytes) {
+    const off_t end = ::lseek(fd, -static_cast<off_t>(bytes), SEEK_CUR);
+    return end >= 0 && ::ftruncate(fd, end) == 0;
+}
+
+}  // namespace
+
+Appended appendFrame(int fd, const void* frame, size_t length) {
+    const auto* next = static_cast<const uint8_t*>(frame);
+    size_t left = length;
+    while (left > 0) {
+        const ssize_t written = TEMP_FAILURE_RETRY(::write(fd, next, left));
+        if (written < 0) {
+            const android::base::ErrnoRestorer reason;
+            return left == length || takeBack(fd, length - left) ? Appended::kNothing
+                                                                 : Appended::kPart;
+        }
+        next += written;
+        left -= static_cast<size_t>(written);
+    }
+    return Appended::kWhole;
+}
 
 FrameFile::~FrameFile() {
     close();
@@ -16,43 +42,27 @@ FrameFile::~FrameFile() {
 
 bool FrameFile::open(const std::string& path) {
     mPath = path;
-    mFd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
-    return mFd >= 0 || fail("open");
+    mFd.reset(::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644));
+    return mFd.ok() || fail("open");
 }
 
 bool FrameFile::write(const void* frame, size_t length) {
     if (!mProblem.empty()) {
         return false;
     }
-    const auto* next = static_cast<const uint8_t*>(frame);
-    size_t left = length;
-    while (left > 0) {
-        const ssize_t written = ::write(mFd, next, left);
-        if (written < 0 && errno == EINTR) {
-            continue;
-        }
-        if (written < 0) {
-            fail("write");
-            // What was written of this frame is taken back; a pipe has nothing to take back.
-            if (left < length && ::ftruncate(mFd, mEnd) != 0) {
-                mProblem += ", which ends within a frame";
-            }
-            return false;
-        }
-        next += written;
-        left -= static_cast<size_t>(written);
+    const Appended appended = appendFrame(mFd.get(), frame, length);
+    if (appended == Appended::kWhole) {
+        return true;
     }
-    mEnd += static_cast<off_t>(length);
-    return true;
+    fail("write");
+    if (appended == Appended::kPart) {
+        mProblem += ", which ends within a frame";
+    }
+    return false;
 }
 
 bool FrameFile::close() {
-    if (mFd < 0) {
-        return mProblem.empty();
-    }
-    const int status = ::close(mFd);
-    mFd = -1;
-    if (status != 0 && mProblem.empty()) {
+    if (mFd.ok() && ::close(mFd.release()) != 0 && mProblem.empty()) {
         fail("write");
     }
     return mProblem.empty();

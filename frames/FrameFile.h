@@ -1,12 +1,22 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <sys/types.h>
+#include <android-base/unique_fd.h>
 
 #include <cstddef>
 #include <string>
 
 namespace pemaro::frames {
+
+enum class Appended {
+    kWhole,
+    kNothing,
+    kPart,  ///< of a pipe, which has nothing to take back
+};
+
+/// Writes a frame to a file. One that does not fit whole (the disk is full) is taken back, so that the
+/// file stays readable frame by frame; errno tells why.
+Appended appendFrame(int fd, const void* frame, size_t length);
 
 /// A file of raw frames, one after another. It never keeps a part of a frame.
 class FrameFile {
@@ -30,8 +40,7 @@ class FrameFile {
 
     std::string mPath;
     std::string mProblem;
-    int mFd = -1;
-    off_t mEnd = 0;
+    android::base::unique_fd mFd;
 };
 
 }  // namespace pemaro::frames

@@ -8,7 +8,6 @@
 namespace pemaro::frames {
 namespace {
 
-constexpr double kPi = 3.14159265358979323846;
 constexpr uint32_t kPositionMax = 65535;
 constexpr uint32_t kMaxSide = 65535;
 /// A finger touches this many cells to each side of its centre.
@@ -17,8 +16,8 @@ constexpr float kSigma = 1.3f;
 constexpr int16_t kPeak = 1200;
 
 FingerRecord fingerAt(uint32_t id, double seconds) {
-    const double x = std::sin(2 * kPi * (0.31 + 0.07 * id) * seconds + id);
-    const double y = std::sin(2 * kPi * (0.23 + 0.05 * id) * seconds + 2 * id);
+    const double x = std::sin(2 * M_PI * (0.31 + 0.07 * id) * seconds + id);
+    const double y = std::sin(2 * M_PI * (0.23 + 0.05 * id) * seconds + 2 * id);
     FingerRecord finger{};
     finger.id = static_cast<uint16_t>(id);
     finger.x = static_cast<uint16_t>((0.5 + 0.45 * x) * kPositionMax);

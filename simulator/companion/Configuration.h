@@ -13,8 +13,8 @@ namespace pemaro::simulator {
 /// The configuration of the simulated touch stack: named values, and a calibration table with a
 /// baseline for each cell of the sensor.
 ///
-/// A file holds the named values in the text form of a map. The binary form holds everything,
-/// little-endian:
+/// A file holds the named values in the text form of a map.
+/// The binary form holds everything, little-endian:
 ///
 ///   offset  size  field
 ///        0     4  magic: "ZCFG"

@@ -1,8 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <android-base/unique_fd.h>
+
 #include <memory>
 #include <string>
+#include <utility>
 
 #include "simulator/companion/FrameSink.h"
 
@@ -14,14 +17,12 @@ class FileWriter : public FrameSink {
     /// Creates or empties the file; null when it cannot be opened. Never waits for a pipe.
     static std::shared_ptr<FileWriter> open(const std::string& path);
 
-    ~FileWriter() override;
-
     bool put(const void* frame, size_t length) override;
 
   private:
-    explicit FileWriter(int fd) : mFd(fd) {}
+    explicit FileWriter(android::base::unique_fd fd) : mFd(std::move(fd)) {}
 
-    const int mFd;
+    const android::base::unique_fd mFd;
 };
 
 }  // namespace pemaro::simulator

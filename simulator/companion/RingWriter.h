@@ -17,9 +17,9 @@ namespace pemaro::simulator {
 ///
 /// The other end is a process that may die or misbehave at any moment, so nothing in the block is
 /// believed but `read`, and that only as a number: the writer keeps its own copies of the geometry
-/// and of its index. It never takes the block's mutex, which a reader that was killed may hold for
-/// ever, and never destroys the mutex or the condition, for which it would have to wait for a reader
-/// that is no more.
+/// and of its index.
+/// It never takes the block's mutex, which a reader that was killed may hold for ever, and never
+/// destroys the mutex or the condition, for which it would have to wait for a reader that is no more.
 class RingWriter : public FrameSink {
   public:
     /// Null when there is no memory for the block.

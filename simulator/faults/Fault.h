@@ -20,8 +20,8 @@ namespace pemaro::simulator {
 ///     getCblk=null                there is no control block
 ///
 /// OPERATION is a member function of ITouchCompanionService, where a name with two overloads means
-/// both; or one of a manager's service behind the manager's name: touch.enable, gesture.addGesture,
-/// hand.scan.
+/// both; or one of a manager's service behind the manager's name:
+/// touch.enable, gesture.addGesture, hand.scan.
 struct Fault {
     enum class Kind { kStatus, kDelay, kDie, kNull };
 

@@ -9,7 +9,6 @@
 namespace pemaro::simulator {
 namespace {
 
-constexpr double kPi = 3.14159265358979323846;
 constexpr int kWaves = 12;
 constexpr double kMean = 128;
 constexpr double kDeviation = 40;
@@ -24,9 +23,9 @@ Plane veins(uint32_t person) {
     };
     Plane plane{};
     for (int wave = 0; wave < kWaves; ++wave) {
-        const double direction = upTo(2 * kPi);
+        const double direction = upTo(2 * M_PI);
         const double perCell = 0.15 + upTo(0.35);
-        const double phase = upTo(2 * kPi);
+        const double phase = upTo(2 * M_PI);
         for (size_t i = 0; i < plane.size(); ++i) {
             const double x = static_cast<double>(i % kHandColumns);
             const double y = static_cast<double>(i / kHandColumns);

@@ -11,8 +11,8 @@
 
 namespace pemaro::simulator {
 
-// What all records of the managers begin with, field for field as a frame does, so that a frame's
-// checksum serves them too.
+// What all records of the managers begin with, field for field as a frame does,
+// so that a frame's checksum serves them too.
 
 /// Fills in what is the same in every record of a kind, the time, and last the checksum.
 template <typename Record>

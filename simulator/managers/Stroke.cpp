@@ -8,7 +8,6 @@
 namespace pemaro::simulator {
 namespace {
 
-constexpr double kPi = 3.14159265358979323846;
 constexpr size_t kPoints = 60;
 constexpr uint32_t kPointMs = 8;
 constexpr double kUnsteadiness = 2;  ///< pixels
@@ -47,7 +46,7 @@ Path corners(int shape) {
     }
     Path circle;
     for (int i = 0; i <= 48; ++i) {
-        const double angle = 2 * kPi * i / 48;
+        const double angle = 2 * M_PI * i / 48;
         circle.push_back({0.5 + 0.5 * std::sin(angle), 0.5 - 0.5 * std::cos(angle)});
     }
     return circle;

@@ -15,8 +15,8 @@ namespace pemaro::simulator {
 
 /// One subscriber of a manager: a queue of records and a thread that hands them over, one after
 /// another. A callback is a synchronous call into another process, which may take its time, stand
-/// still or call back meanwhile; with a thread to each, it is its own events alone that wait. Any
-/// thread may call.
+/// still or call back meanwhile; with a thread to each, it is its own events alone that wait.
+/// Any thread may call.
 class Subscriber : public std::enable_shared_from_this<Subscriber> {
   public:
     using Record = std::shared_ptr<const void>;

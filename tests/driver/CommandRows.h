@@ -13,8 +13,8 @@ using Words = std::vector<std::string>;
 /// Runs zelkctl to its end.
 RunResult zelkctl(Words arguments);
 
-/// A command, its exit status, and all that it prints to stdout, or to stderr (behind "zelkctl: ")
-/// when it fails.
+/// A command, its exit status, and all that it prints to stdout,
+/// or to stderr (behind "zelkctl: ") when it fails.
 struct Row {
     Words command;
     int status;

@@ -11,8 +11,8 @@
 
 namespace pemaro::test {
 
-/// Takes the frames of a client of this very process, and checks the checksum of each and that the
-/// sequence has no gap.
+/// Takes the frames of a client of this very process,
+/// and checks the checksum of each and that the sequence has no gap.
 ///
 ///     FrameCollector frames;
 ///     sp<TouchCompanionClient> client = frames.makeClient();

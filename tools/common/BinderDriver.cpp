@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/common/BinderDriver.h"
 
+#include <android-base/unique_fd.h>
 #include <binder/ProcessState.h>
 #include <fcntl.h>
-#include <unistd.h>
 
 #include <cerrno>
 #include <cstring>
@@ -11,11 +11,10 @@
 namespace pemaro::tools {
 
 std::string binderProblem() {
-    const int fd = open("/dev/binder", O_RDWR | O_CLOEXEC);
-    if (fd < 0) {
+    const android::base::unique_fd driver(open("/dev/binder", O_RDWR | O_CLOEXEC));
+    if (!driver.ok()) {
         return std::string("cannot use the Binder driver /dev/binder: ") + strerror(errno);
     }
-    close(fd);
     if (android::ProcessState::self()->getContextObject(nullptr) == nullptr) {
         return "no service manager is running";
     }
