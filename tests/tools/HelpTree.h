@@ -15,8 +15,8 @@ struct HelpEntry {
     WordSet commands;  ///< empty for a command that does something itself
 };
 
-/// A program's command, its words separated by spaces, and what its help lists. The program itself
-/// is "".
+/// A program's command, its words separated by spaces, and what its help lists.
+/// The program itself is "".
 using HelpTree = std::map<std::string, HelpEntry>;
 
 /// Asks a program of this build for its help, and for that of all its commands.

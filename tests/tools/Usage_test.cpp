@@ -165,8 +165,8 @@ TEST(NoDriver, IsToldInOneLine) {
     EXPECT_EQ("zelk-touchstack" + problem, result.errors);
 }
 
-// What the command line itself cannot know to be wrong is a failure, found before the driver is
-// touched.
+// What the command line itself cannot know to be wrong is a failure,
+// found before the driver is touched.
 TEST(Arguments, AreLookedAtBeforeAnythingIsSent) {
     const auto noNumber = [](const std::string& command, const std::string& argument,
                              const std::string& range) {

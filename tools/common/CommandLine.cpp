@@ -4,6 +4,7 @@
 #include <android/log.h>
 #include <unistd.h>
 
+#include <CLI/CLI.hpp>
 #include <cstdio>
 
 namespace pemaro::tools {

@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <functional>
 #include <optional>
 #include <string>
+
+namespace CLI {
+class App;
+}
 
 namespace pemaro::tools {
 

@@ -4,8 +4,10 @@
 
 #include <signal.h>
 
+#include <CLI/CLI.hpp>
+
 #include "tools/common/CommandLine.h"
-#include "tools/zelkctl/Commands.h"
+#include "tools/zelkctl/commands/Commands.h"
 
 int main(int argc, char** argv) {
     CLI::App app("Talks to the touch service through libzelkclient.", "zelkctl");
@@ -17,7 +19,13 @@ int main(int argc, char** argv) {
     pemaro::zelkctl::addPingCommand(app, action);
     pemaro::zelkctl::addRecordCommand(app, action);
     pemaro::zelkctl::addRecordFileCommand(app, action);
-    pemaro::zelkctl::addDeviceCommands(app, action);
+    pemaro::zelkctl::addCommandCommand(app, action);
+    pemaro::zelkctl::addFilterCommand(app, action);
+    pemaro::zelkctl::addPropertySetCommand(app, action);
+    pemaro::zelkctl::addEventCommand(app, action);
+    pemaro::zelkctl::addInspectCommand(app, action);
+    pemaro::zelkctl::addPacketSizeCommand(app, action);
+    pemaro::zelkctl::addAuthCommand(app, action);
     pemaro::zelkctl::addConfigCommands(app, action);
     pemaro::zelkctl::addSessionCommands(app, action);
     pemaro::zelkctl::addTouchCommands(app, action);

@@ -1,0 +1,46 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <string>
+
+#include "tools/zelkctl/commands/Commands.h"
+#include "tools/zelkctl/services/EventReceiver.h"
+
+namespace pemaro::zelkctl {
+
+/// How to watch events, and for how long.
+struct WatchOptions {
+    uint64_t count = 0;  ///< events; 0: any number
+    double seconds = 0;  ///< 0: until told to stop
+    std::string output;
+    bool json = false;
+
+    bool isLimited() const { return count != 0 || seconds > 0; }
+};
+
+void addWatchOptions(CLI::App& command, WatchOptions& options);
+
+/// A command that watches, and has no other options.
+void addWatchCommand(CLI::App& app, Action& action, const char* name, const char* help,
+                     std::function<int(const WatchOptions&)> run);
+
+/// What is watched: a manager's name, and its client.
+struct Watched {
+    const char* service;
+    std::function<int()> init;
+    std::function<int()> deinit;
+    /// Run once, when the client is connected for the first time; may be null.
+    std::function<int()> begin;
+    const char* beginName;
+};
+
+/// Makes the client whose events go to the receiver.
+using MakeWatched = std::function<Watched(EventReceiver*)>;
+
+/// Prints events until there are enough or SIGINT or SIGTERM comes; returns the exit status. When
+/// the service dies, the client is disconnected, waits for a new service, and connects again.
+int watch(const WatchOptions& options, const MakeWatched& make);
+
+}  // namespace pemaro::zelkctl

@@ -1,0 +1,14 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/commands/hand/HandCommands.h"
+
+namespace pemaro::zelkctl {
+
+void addHandEnrollCommand(CLI::App& hand, Action& action) {
+    using Client = HandBiometricManagerClient;
+    addHandActivityCommand(
+            hand, action,
+            {"enroll", "Enroll a hand as a new profile", "enrollment", "startEnrollment",
+             &Client::startEnrollment, "stopEnrollment", &Client::stopEnrollment});
+}
+
+}  // namespace pemaro::zelkctl

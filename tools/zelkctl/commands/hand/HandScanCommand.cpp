@@ -1,0 +1,12 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/commands/hand/HandCommands.h"
+
+namespace pemaro::zelkctl {
+
+void addHandScanCommand(CLI::App& hand, Action& action) {
+    using Client = HandBiometricManagerClient;
+    addHandActivityCommand(
+            hand, action, {"scan", "Scan a hand", "scan", "scan", &Client::scan, nullptr, nullptr});
+}
+
+}  // namespace pemaro::zelkctl

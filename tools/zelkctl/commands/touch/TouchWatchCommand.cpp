@@ -1,0 +1,11 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/commands/ManagerCommands.h"
+#include "tools/zelkctl/commands/touch/TouchCommands.h"
+
+namespace pemaro::zelkctl {
+
+void addTouchWatchCommand(CLI::App& touch, Action& action) {
+    addManagerWatchCommand<TouchManager>(touch, action, "Print each gesture that is reported");
+}
+
+}  // namespace pemaro::zelkctl

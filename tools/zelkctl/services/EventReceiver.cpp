@@ -1,0 +1,75 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/services/EventReceiver.h"
+
+#include <fmt/chrono.h>
+
+#include <cstdio>
+
+#include "frames/Checksum.h"
+#include "tools/zelkctl/terminal/Json.h"
+
+namespace pemaro::zelkctl {
+namespace {
+
+using Clock = std::chrono::system_clock;
+
+std::string timeOfDay(Clock::time_point when) {
+    const auto rounded = std::chrono::floor<std::chrono::milliseconds>(when);
+    return fmt::format("{:%H:%M:%S}.{:03}", fmt::localtime(Clock::to_time_t(rounded)),
+                       rounded.time_since_epoch().count() % 1000);
+}
+
+void printLine(const std::string& line) {
+    fmt::print("{}\n", line);
+    fflush(stdout);
+}
+
+}  // namespace
+
+std::string eventLine(Clock::time_point when, const void* record, size_t size, bool json) {
+    const std::string digest = fmt::format("{:08x}", frames::crc32(record, size));
+    return json ? JsonObject().addTime("time", when).add("size", size).add("digest", digest).text()
+                : fmt::format("{}  {} bytes  {}", timeOfDay(when), size, digest);
+}
+
+std::string serviceLine(Clock::time_point when, const char* what, bool json) {
+    return json ? JsonObject().addTime("time", when).add("service", what).text()
+                : fmt::format("{}  the service {}", timeOfDay(when), what);
+}
+
+void EventReceiver::tellOfService(const char* what) {
+    std::lock_guard<std::mutex> guard(mLock);
+    printLine(serviceLine(Clock::now(), what, mJson));
+}
+
+bool EventReceiver::waitUntilDone(std::chrono::milliseconds patience) {
+    std::unique_lock<std::mutex> guard(mLock);
+    return mChanged.wait_for(guard, patience, [this] { return mDone; });
+}
+
+uint64_t EventReceiver::close() {
+    std::lock_guard<std::mutex> guard(mLock);
+    mDone = true;
+    return mTaken;
+}
+
+void EventReceiver::take(const void* record, size_t size) {
+    std::lock_guard<std::mutex> guard(mLock);
+    if (mDone) {
+        return;
+    }
+    // The library hands on a record that the service cut short as none at all.
+    const size_t present = record == nullptr ? 0 : size;
+    if (mFile != nullptr && present != 0 && !mFile->write(record, present)) {
+        mDone = true;
+    } else {
+        printLine(eventLine(Clock::now(), record, present, mJson));
+        mTaken += 1;
+        mDone = mTaken == mLimit;
+    }
+    if (mDone) {
+        mChanged.notify_all();
+    }
+}
+
+}  // namespace pemaro::zelkctl

@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <chrono>
+#include <condition_variable>
+#include <cstddef>
+#include <cstdint>
+#include <mutex>
+#include <string>
+
+#include "frames/FrameFile.h"
+
+namespace pemaro::zelkctl {
+
+/// Prints the events of a manager, one a line, and keeps their records. What is in a record is a
+/// matter between the service and its users; a line tells when it came, its size and a digest,
+/// the CRC-32 of its bytes:
+///
+///     19:14:05.123  72144 bytes  3f2a9c01
+///     {"time":1795201445.123,"size":72144,"digest":"3f2a9c01"}
+class EventReceiver {
+  public:
+    /// `file` may be null; `limit` events are taken, all if 0.
+    EventReceiver(frames::FrameFile* file, uint64_t limit, bool json)
+            : mFile(file), mLimit(limit), mJson(json) {}
+
+    /// The callback of a client; `context` is the receiver.
+    template <typename Record>
+    static void onEvent(Record* record, void* context) {
+        static_cast<EventReceiver*>(context)->take(record, sizeof(Record));
+    }
+
+    /// Prints a line about the service itself: "died" or "back".
+    void tellOfService(const char* what);
+
+    /// Waits until the receiver takes no more events, having enough of them or nowhere to write
+    /// them; false when that did not happen in time.
+    bool waitUntilDone(std::chrono::milliseconds patience);
+
+    /// Takes no more events, whatever still arrives; returns how many were taken.
+    uint64_t close();
+
+  private:
+    void take(const void* record, size_t size);
+
+    frames::FrameFile* const mFile;
+    const uint64_t mLimit;
+    const bool mJson;
+
+    std::mutex mLock;
+    std::condition_variable mChanged;
+    uint64_t mTaken = 0;
+    bool mDone = false;
+};
+
+/// The line of an event, or of one that came without a record, whose size is then 0.
+std::string eventLine(std::chrono::system_clock::time_point when, const void* record, size_t size,
+                      bool json);
+
+/// The line that tells that the service died or is back.
+std::string serviceLine(std::chrono::system_clock::time_point when, const char* what, bool json);
+
+}  // namespace pemaro::zelkctl
