@@ -13,6 +13,8 @@ PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev abigail-tools libc++-
     spin zsh)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
 PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev mandoc)
+# What makes Debian packages, looks at them and finds them used; the tests do so as well.
+PACKAGES_PACKAGING=(dpkg-dev debhelper lintian pkg-config)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 

@@ -73,6 +73,7 @@ report_stages() {
 }
 
 stage_native() {
+    need_packages "${PACKAGES_PACKAGING[@]}"
     run_ctest release native "$1"
 }
 

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "pemaro/Version.h"
 #include "tests/support/ChildProcess.h"
 
 namespace pemaro::test {
@@ -39,6 +40,15 @@ TEST_P(Usage, IsRefusedInOneLine) {
     EXPECT_EQ(2, result.status);
     EXPECT_EQ("", result.output);
     EXPECT_EQ(GetParam().error + std::string(" (--help tells more)\n"), result.errors);
+}
+
+TEST(Version, IsTheLibrarysOwn) {
+    for (const char* program : {"zelkctl", "zelk-touchstack"}) {
+        const RunResult result = runLine(std::string(program) + " --version");
+        EXPECT_EQ(0, result.status);
+        EXPECT_EQ(std::string(program) + " " ZELK_VERSION "\n", result.output);
+        EXPECT_EQ("", result.errors);
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(

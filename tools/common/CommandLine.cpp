@@ -7,6 +7,8 @@
 #include <CLI/CLI.hpp>
 #include <cstdio>
 
+#include "pemaro/Version.h"
+
 namespace pemaro::tools {
 
 std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
@@ -14,6 +16,8 @@ std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
     app.failure_message([](const CLI::App* failed, const CLI::Error& error) {
         return failed->get_name() + ": " + error.what() + " (--help tells more)\n";
     });
+    app.set_version_flag("--version", app.get_name() + " " ZELK_VERSION,
+                         "Print the version and exit");
     try {
         app.parse(argc, argv);
         if (check) {

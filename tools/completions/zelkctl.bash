@@ -6,7 +6,7 @@
 # words to choose from.
 _zelkctl_words() {
     case $1 in
-    '') echo '--help --log ping record record-file command filter property event inspect packet-size auth
+    '') echo '--help --version --log ping record record-file command filter property event inspect packet-size auth
         config session touch gesture hand' ;;
     ping | filter | event | auth | 'session restore') echo '--help' ;;
     record) echo '--help --frames --seconds --output' ;;
