@@ -12,9 +12,13 @@ private_apt() {
         -o APT::Sandbox::User=root -o APT::Update::Error-Mode=any "$@"
 }
 
-# Brings the private lists up to date. Call with the cache's lock held.
-update_private_lists() {
+# Brings the private lists up to date: once for all that a run fetches.
+update_private_lists() (
     local apt=$ZELK_CACHE/apt
+    lock_cache lists
+    if [[ -n $(find "$apt/updated" -newermt '-10 minutes' 2>/dev/null) ]]; then
+        exit 0
+    fi
     mkdir -p -- "$apt/lists/partial" "$apt/cache/archives/partial"
     rm -rf -- "$apt/sources"
     mkdir -- "$apt/sources"
@@ -22,7 +26,8 @@ update_private_lists() {
     compgen -G "$apt/sources/*" >/dev/null ||
         die "no source of Debian's main archive is set up in /etc/apt"
     run_logged "Debian's archive cannot be read (no network?)" private_apt apt-get update
-}
+    touch -- "$apt/updated"
+)
 
 # copy_sources <etc/apt> <folder>: the entries for this release's main archive, with source packages added.
 copy_sources() {

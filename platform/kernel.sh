@@ -3,18 +3,27 @@
 # shellcheck shell=bash disable=SC2153,SC2034 # variables shared with ./dev and vm.sh
 
 # In the order in which they are loaded.
-KERNEL_MODULES=(virtio_ring virtio virtio_pci_modern_dev virtio_pci_legacy_dev virtio_pci netfs fscache 9pnet
-    9pnet_virtio 9p binder_linux)
+KERNEL_MODULES=(virtio_ring virtio virtio_pci_modern_dev virtio_pci_legacy_dev virtio_pci
+    virtio_console netfs fscache 9pnet 9pnet_virtio 9p binder_linux)
 
-# Sets VM_KERNEL and VM_INITRAMFS. The kernel is the newest that the archive had when it was first needed.
+VM_KERNEL=$ZELK_CACHE/kernel/bookworm-$(printf '%s\n' "${KERNEL_MODULES[@]}" | short_hash)
+
+needs_kernel() {
+    [[ $VM_MODE == qemu && ! -d $VM_KERNEL ]]
+}
+
+ensure_kernel() {
+    make_cached kernel "$VM_KERNEL" 200 "fetching Debian's kernel (about 70 MB)" unpack_kernel
+}
+
+# Sets VM_INITRAMFS. The kernel is the newest that the archive had when it was first needed.
 ensure_vm_image() {
     local folder key
-    VM_KERNEL=$ZELK_CACHE/kernel/bookworm
-    make_cached "$VM_KERNEL" 200 "fetching Debian's kernel (about 70 MB)" unpack_kernel
-    key=$(cat "$VM_KERNEL/version" "$ROOT/platform/vm-init" /bin/busybox \
-        <(printf '%s\n' "${KERNEL_MODULES[@]}") | short_hash)
+    ensure_kernel
+    key=$({ printf '%s\n' "$VM_KERNEL" && cat "$VM_KERNEL/version" "$ROOT/platform/vm-init" /bin/busybox; } |
+        short_hash)
     folder=$ZELK_CACHE/initramfs/$key
-    make_cached "$folder" 20 "making the initramfs" make_initramfs "$VM_KERNEL"
+    make_cached initramfs "$folder" 20 "making the initramfs" make_initramfs "$VM_KERNEL"
     VM_INITRAMFS=$folder/initramfs
 }
 
@@ -23,7 +32,7 @@ unpack_kernel() {
     local scratch=$1 package
     local -a files=("${KERNEL_MODULES[@]/#/*/}")
     files=("${files[@]/%/.ko}")
-    update_private_lists
+    update_private_lists || exit
     package=$(private_apt apt-cache depends linux-image-amd64 | awk '$1 == "Depends:" { print $2; exit }')
     [[ -n $package ]] || die "Debian's archive has no linux-image-amd64"
     cd -- "$scratch" || exit

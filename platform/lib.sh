@@ -2,10 +2,55 @@
 # What the other scripts lean on: messages, the cache folder, logged commands. Sourced by ./dev.
 # shellcheck shell=bash
 
-ZELK_CACHE=${ZELK_CACHE:-${XDG_CACHE_HOME:-$HOME/.cache}/zelk}
+ZELK_CACHE=$(realpath -m -- "${ZELK_CACHE:-${XDG_CACHE_HOME:-$HOME/.cache}/zelk}")
+
+# The steps of this run that take long, in order, and when it began; see plan_steps.
+STEPS=()
+STEPS_START=$SECONDS
 
 say() {
     printf '==> %s\n' "$*" >&2
+}
+
+# plan_steps <step …>: of these steps those are counted for which needs_<step> holds.
+plan_steps() {
+    local step
+    for step in "$@"; do
+        if [[ " ${STEPS[*]} " != *" $step "* ]] && "needs_$step"; then
+            STEPS+=("$step")
+        fi
+    done
+}
+
+# say_step <step> <message>: the message, with the step's number and the time since the start.
+say_step() {
+    local index elapsed=$((SECONDS - STEPS_START))
+    for index in "${!STEPS[@]}"; do
+        if [[ ${STEPS[index]} == "$1" ]]; then
+            say "$(printf '[%d/%d %d:%02d] %s' $((index + 1)) ${#STEPS[@]} $((elapsed / 60)) \
+                $((elapsed % 60)) "$2")"
+            return
+        fi
+    done
+    say "$2"
+}
+
+# in_background <command …>: beside what follows, until await_background, which ends the script if it failed.
+in_background() {
+    set -m
+    "$@" </dev/null &
+    set +m
+    BACKGROUND=$!
+    trap 'kill -- "-$BACKGROUND" 2>/dev/null' EXIT
+    trap 'exit 130' INT
+    trap 'exit 143' TERM
+}
+
+await_background() {
+    local process=${BACKGROUND:-}
+    BACKGROUND=
+    trap - EXIT INT TERM
+    [[ -z $process ]] || wait "$process"
 }
 
 die() {
@@ -25,9 +70,9 @@ first_error() {
 }
 
 # run_logged <sentence for a failure> <command …>: runs it with its output in a log, which is named when
-# it fails.
+# it fails. MAKING is what is made, in make_cached.
 run_logged() {
-    local failure=$1 log=$ZELK_CACHE/logs/$2.log
+    local failure=$1 log=$ZELK_CACHE/logs/${MAKING:+$MAKING-}$2.log
     shift
     mkdir -p -- "$ZELK_CACHE/logs"
     "$@" >"$log" 2>&1 </dev/null || die "$failure: $(first_error "$log") (log: $log)"
@@ -48,12 +93,11 @@ make_cache_folder() {
     if ! mkdir -p -- "$ZELK_CACHE" 2>/dev/null || [[ ! -w $ZELK_CACHE ]]; then
         die "the cache folder $ZELK_CACHE cannot be written: set ZELK_CACHE to one that can"
     fi
-    ZELK_CACHE=$(realpath -- "$ZELK_CACHE")
 }
 
 # Only what these scripts made, should the folder hold anything else.
 remove_cache() {
-    (cd -- "$ZELK_CACHE" && rm -rf -- apt initramfs kernel lock logs platform sources)
+    (cd -- "$ZELK_CACHE" && rm -rf -- apt initramfs kernel locks logs platform sources)
     rmdir -- "$ZELK_CACHE" 2>/dev/null || true
 }
 
@@ -67,22 +111,30 @@ lock_file() {
     fi
 }
 
-# make_cached <folder> <megabytes needed> <message> <function …>: makes a folder of the cache unless it is
-# there. The function is given a scratch folder and leaves the content in its subfolder "result", which
+# Holds one of the cache's locks, which is known by a name.
+lock_cache() {
+    mkdir -p -- "$ZELK_CACHE/locks"
+    lock_file "$ZELK_CACHE/locks/$1" "$ZELK_CACHE"
+}
+
+# make_cached <step> <folder> <megabytes needed> <message> <function …>: makes a folder of the cache unless it
+# is there, as that step of the run. The function is given a scratch folder and leaves the content in its subfolder "result", which
 # gets its name in one step: what is in the cache is complete, whenever a run was cut short.
 make_cached() {
-    local folder=$1 megabytes=$2 message=$3
-    shift 3
+    local step=$1 folder=$2 megabytes=$3 message=$4
+    shift 4
     if [[ -d $folder ]]; then
         return
     fi
+    make_cache_folder
     (
-        lock_file "$ZELK_CACHE/lock" "$ZELK_CACHE"
+        MAKING=$step
+        lock_cache "$step"
         if [[ -d $folder ]]; then
             exit 0
         fi
         need_space "$megabytes" "$ZELK_CACHE"
-        say "$message"
+        say_step "$step" "$message"
         scratch=$folder.partial
         rm -rf -- "$scratch"
         trap 'rm -rf -- "$scratch"' EXIT

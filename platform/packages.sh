@@ -5,12 +5,12 @@
 # The Android platform's headers and libraries, and the compiler of its interface files.
 PACKAGES_PLATFORM=(android-libutils-dev android-libcutils-dev android-liblog-dev android-libbase-dev
     android-platform-system-core-headers android-platform-frameworks-native-headers aidl xz-utils)
-# Compilers; clang with its runtime and symbolizer is for the address sanitizer.
-PACKAGES_BUILD=(g++ cmake ninja-build clang libclang-rt-14-dev llvm)
-# The exported interface is compared by libabigail, and compiled with the device's C++ library as well; zsh
-# runs its completion; spin verifies the model of the shared ring.
-PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev abigail-tools libc++-14-dev libc++abi-14-dev
-    spin zsh)
+PACKAGES_BUILD=(g++ cmake ninja-build)
+# The address sanitizer is clang's, with its runtime and symbolizer. The exported interface is compared by
+# libabigail, and compiled with the device's C++ library as well; zsh runs its completion; spin verifies the
+# model of the shared ring.
+PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev clang libclang-rt-14-dev llvm abigail-tools
+    libc++-14-dev libc++abi-14-dev spin zsh)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
 PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev mandoc)
 # What makes Debian packages, looks at them and finds them used; the tests do so as well.
@@ -40,6 +40,11 @@ check_distribution() {
     [[ $ID == debian && $VERSION_ID == 12 ]] ||
         die "unsupported distribution ($PRETTY_NAME): the platform is built from the packages of Debian 12;" \
             "elsewhere bring the android:: targets along (docs/platform.md)"
+}
+
+# Where a command says beforehand what it needs, in PACKAGES_NEEDED.
+needs_packages() {
+    [[ -n $(missing_packages "${PACKAGES_NEEDED[@]}") ]]
 }
 
 missing_packages() {
@@ -83,7 +88,7 @@ ask() {
 install_packages() {
     local -a install=("${sudo[@]}" env DEBIAN_FRONTEND=noninteractive
         apt-get -q -y install --no-install-recommends "${missing[@]}")
-    say "installing ${missing[*]}"
+    say_step packages "installing ${missing[*]}"
     if all_have_candidates "${missing[@]}" && "${install[@]}" </dev/null >&2; then
         return
     fi

@@ -28,17 +28,21 @@ android_version() {
     printf '%s\n' "$version"
 }
 
+needs_sources() {
+    needs_packages || ! [[ -d $(sources_folder) ]]
+}
+
 ensure_sources() {
     local version
     version=$(android_version)
-    ANDROID_SOURCES=$ZELK_CACHE/sources/android-platform-tools-$version
-    make_cached "$ANDROID_SOURCES" 300 "fetching the sources of android-platform-tools $version (76 MB)" \
+    ANDROID_SOURCES=$(sources_folder)
+    make_cached sources "$ANDROID_SOURCES" 300 "fetching the sources of android-platform-tools $version (76 MB)" \
         unpack_sources "$version"
 }
 
 unpack_sources() {
     local version=$1 scratch=$2
-    update_private_lists
+    update_private_lists || exit
     cd -- "$scratch" || exit
     run_logged "the source package cannot be fetched" \
         private_apt apt-get source --download-only "android-platform-tools=$version"
@@ -48,12 +52,21 @@ unpack_sources() {
         "${ANDROID_PARTS[@]/#/android-platform-tools-${version%-*}/}"
 }
 
+needs_platform() {
+    needs_sources || ! [[ -d $(platform_folder '') ]]
+}
+
+needs_platform_thread() {
+    needs_sources || ! [[ -d $(platform_folder thread) ]]
+}
+
 # ensure_platform ["" | thread]: builds the platform, with that sanitizer, where build/platform… points.
 ensure_platform() {
     local sanitize=$1 folder link=$ROOT/build/platform
     ensure_sources
-    folder=$ZELK_CACHE/platform/$(platform_key "$sanitize")
-    make_cached "$folder" 500 "building the Android platform${sanitize:+ with -fsanitize=$sanitize} (about half a minute)" \
+    folder=$(platform_folder "$sanitize")
+    make_cached "platform${sanitize:+_$sanitize}" "$folder" 500 \
+        "building the Android platform${sanitize:+ with -fsanitize=$sanitize} (about half a minute)" \
         build_platform "$sanitize" "$folder"
     if [[ $sanitize == thread ]]; then
         link=$link-tsan
@@ -64,9 +77,20 @@ ensure_platform() {
     fi
 }
 
+sources_folder() {
+    local version
+    version=$(android_version) || exit
+    printf '%s\n' "$ZELK_CACHE/sources/android-platform-tools-$version"
+}
+
+platform_folder() {
+    printf '%s\n' "$ZELK_CACHE/platform/$(platform_key "$1")"
+}
+
 platform_key() {
     {
-        printf '%s\n' "$ANDROID_SOURCES" "$1"
+        sources_folder
+        printf '%s\n' "$1"
         g++ -dumpfullversion -dumpmachine
         dpkg-query -W android-libutils-dev android-libcutils-dev android-liblog-dev android-libbase-dev aidl
         (cd "$ROOT/platform" && find CMakeLists.txt ./*.in ./*.h servicemanager -type f -print0 |

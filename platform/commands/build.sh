@@ -14,11 +14,16 @@ TEXT
 
 command_build() {
     local preset
+    local -a needs=(all)
     (($# > 0)) || set -- release
     for preset in "$@"; do
         [[ " ${PRESETS[*]} " == *" $preset "* ]] ||
             die_usage "unknown preset '$preset': there are ${PRESETS[*]}"
     done
+    if [[ " $* " == *" tsan "* ]]; then
+        needs+=(thread)
+    fi
+    begin "${needs[@]}" -- "${@/#/build_}"
     for preset in "$@"; do
         build_preset "$preset"
     done

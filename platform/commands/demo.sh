@@ -14,8 +14,9 @@ TEXT
 
 command_demo() {
     (($# == 0)) || die_usage "demo takes no argument"
-    build_preset release
-    say "starting the demo (in QEMU, unless /dev/binder is usable)"
+    begin programs vm -- build_release demo
+    build_preset release "${PROGRAMS[@]}"
     setup_vm
+    say_step demo "starting the demo (in QEMU, unless /dev/binder is usable)"
     vm_run 170 "$ROOT/tools/demo"
 }

@@ -14,11 +14,9 @@ TEXT
 
 command_setup() {
     (($# == 0)) || die_usage "setup takes no argument"
-    check_host
-    need_packages "${PACKAGES_PLATFORM[@]}" "${PACKAGES_BUILD[@]}" "${PACKAGES_TESTS[@]}" \
-        "${PACKAGES_TOOLS[@]}" "${PACKAGES_PACKAGING[@]}" "${PACKAGES_VM[@]}"
-    setup_platform ''
-    setup_platform thread
+    begin all thread vm packaging --
+    ensure_platform ''
+    ensure_platform thread
     setup_vm
     say "everything is set up"
 }

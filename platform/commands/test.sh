@@ -2,14 +2,15 @@
 #: test [options] | build and run all tests, with sanitizers and over the real Binder driver
 # shellcheck shell=bash
 
-# In the order in which they run: the option's name and what it runs. stage_<name> does it, and is given the
-# regular expression that the tests' names have to match, or "".
+# In the order in which they run: the option's name, what it needs besides (one word; see begin), and
+# what it runs. stage_<name> does it, and is given the regular expression that the tests' names have to match,
+# or "".
 TEST_STAGES=(
-    'native|in one process, without the driver (release build)'
-    'asan|the native tests with AddressSanitizer and UndefinedBehaviorSanitizer'
-    'tsan|the native tests with ThreadSanitizer'
-    'driver|over the real Binder driver (release build; see ./dev vm)'
-    'dev|of ./dev itself'
+    'native||in one process, without the driver (release build)'
+    'asan||the native tests with AddressSanitizer and UndefinedBehaviorSanitizer'
+    'tsan|thread|the native tests with ThreadSanitizer'
+    'driver|vm|over the real Binder driver (release build; see ./dev vm)'
+    'dev|vm|of ./dev itself'
 )
 
 # The slowest that the tests over the driver may be, in seconds, on a busy machine.
@@ -20,14 +21,14 @@ usage_test() {
     printf 'usage: ./dev test%s [-R REGEX]\n\n' "$(printf ' [--%s]' "${names[@]}")"
     echo "Builds and runs the tests; without a selection all of them:"
     for stage in "${TEST_STAGES[@]}"; do
-        printf '  --%-9s %s\n' "${stage%%|*}" "${stage#*|}"
+        printf '  --%-9s %s\n' "${stage%%|*}" "${stage##*|}"
     done
     echo "  -R REGEX    only tests whose name matches"
 }
 
 command_test() {
     local stage regex=''
-    local -a names=("${TEST_STAGES[@]%%|*}") stages=() summary=()
+    local -a names=("${TEST_STAGES[@]%%|*}") stages=() summary=() needs=(all)
     while (($# > 0)); do
         case $1 in
         -R)
@@ -46,15 +47,29 @@ command_test() {
     ((${#stages[@]} > 0)) || stages=("${names[@]}")
     trap 'exit 130' INT
     for stage in "${stages[@]}"; do
+        needs+=("$(stage_needs "$stage")")
+    done
+    begin "${needs[@]}" -- "${stages[@]}"
+    for stage in "${stages[@]}"; do
+        [[ $(stage_needs "$stage") != vm ]] || await_background || true
         run_stage "$stage" "$regex"
     done
     report_stages
 }
 
+stage_needs() {
+    local stage
+    for stage in "${TEST_STAGES[@]}"; do
+        if [[ $stage == "$1|"* ]]; then
+            cut -d '|' -f 2 <<<"$stage"
+        fi
+    done
+}
+
 # Adds a line to summary. A stage that fails does not keep the others from running.
 run_stage() {
     local stage=$1 regex=$2 start=$SECONDS status result=passed
-    say "tests: $stage"
+    say_step "$stage" "tests: $stage"
     set +e
     (
         set -e

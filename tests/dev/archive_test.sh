@@ -77,7 +77,7 @@ test_without_network_one_sentence_and_nothing_left() {
     mkdir "$ZELK_CACHE"
     ANDROID_SOURCES=$ZELK_CACHE/sources/x
     export http_proxy=http://127.0.0.1:9 https_proxy=http://127.0.0.1:9
-    expect_status 1 make_cached "$ANDROID_SOURCES" 1 "fetching" unpack_sources 29.0.6-28
+    expect_status 1 make_cached thing "$ANDROID_SOURCES" 1 "fetching" unpack_sources 29.0.6-28
     expect_contains "dev: Debian's archive cannot be read (no network?)" "$ERRORS"
     expect_equal "" "$(ls "$ZELK_CACHE/sources")"
 }

@@ -23,9 +23,9 @@ use_cache() {
 
 test_makes_once() {
     use_cache
-    expect_status 0 make_cached "$thing" 1 "making" make_thing 0
+    expect_status 0 make_cached thing "$thing" 1 "making" make_thing 0
     expect_equal "==> making" "$ERRORS"
-    expect_status 0 make_cached "$thing" 1 "making" make_thing 0
+    expect_status 0 make_cached thing "$thing" 1 "making" make_thing 0
     expect_equal "" "$ERRORS"
     expect_equal "whole" "$(cat "$thing/thing")"
     expect_equal "made" "$(cat calls)"
@@ -37,29 +37,29 @@ test_failure_leaves_nothing() {
         mkdir "$1/result"
         run_logged "the thing cannot be made" ls /no/such/folder
     }
-    expect_status 1 make_cached "$thing" 1 "making" fail_half_way
+    expect_status 1 make_cached thing "$thing" 1 "making" fail_half_way
     expect_contains "dev: the thing cannot be made: ls: cannot access '/no/such/folder'" "$ERRORS"
-    expect_contains "(log: $ZELK_CACHE/logs/ls.log)" "$ERRORS"
+    expect_contains "(log: $ZELK_CACHE/logs/thing-ls.log)" "$ERRORS"
     expect_equal "" "$(ls "$ZELK_CACHE/things")"
 }
 
 test_killed_run_leaves_nothing_that_counts() {
     use_cache
     set -m
-    make_cached "$thing" 1 "making" make_thing 100 2>/dev/null &
+    make_cached thing "$thing" 1 "making" make_thing 100 2>/dev/null &
     set +m
     wait_until test -e "$thing.partial/result/thing"
     kill -KILL -- "-$!"
     [[ ! -e $thing ]] || fail "a half-made thing is in the cache"
-    expect_status 0 make_cached "$thing" 1 "making" make_thing 0
+    expect_status 0 make_cached thing "$thing" 1 "making" make_thing 0
     expect_equal "whole" "$(cat "$thing/thing")"
     expect_equal "one" "$(ls "$ZELK_CACHE/things")"
 }
 
 test_two_runs_at_once_make_it_once() {
     use_cache
-    make_cached "$thing" 1 "making" make_thing 1 2>first &
-    make_cached "$thing" 1 "making" make_thing 1 2>second &
+    make_cached thing "$thing" 1 "making" make_thing 1 2>first &
+    make_cached thing "$thing" 1 "making" make_thing 1 2>second &
     wait
     expect_equal "made" "$(cat calls)"
     expect_equal "whole" "$(cat "$thing/thing")"
@@ -68,7 +68,7 @@ test_two_runs_at_once_make_it_once() {
 
 test_full_disk_is_told_before_anything_is_made() {
     use_cache
-    expect_status 1 make_cached "$thing" 999999999999 "making" make_thing 0
+    expect_status 1 make_cached thing "$thing" 999999999999 "making" make_thing 0
     expect_one_error "not enough disk space: 999999999999 MB are needed in $ZELK_CACHE"
     [[ ! -e calls ]] || fail "it was made"
 }
