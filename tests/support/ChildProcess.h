@@ -9,8 +9,8 @@
 
 namespace pemaro::test {
 
-/// A program that runs beside the test, with its output kept. It never outlives the object, nor the
-/// test program.
+/// A program that runs beside the test, with its output kept.
+/// It never outlives the object, nor the test program.
 ///
 ///     ChildProcess touchStack({binary("zelk-touchstack"), "--rate", "100"});
 ///     ASSERT_TRUE(touchStack.awaitOutput("process "));

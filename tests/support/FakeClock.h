@@ -5,8 +5,8 @@
 
 namespace pemaro::test {
 
-/// While one lives android::systemTime(SYSTEM_TIME_MONOTONIC) tells the time that the test sets; 0
-/// at first.
+/// While one lives android::systemTime(SYSTEM_TIME_MONOTONIC) tells the time that the test sets;
+/// 0 at first.
 class FakeClock {
   public:
     FakeClock();

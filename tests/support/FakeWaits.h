@@ -14,8 +14,8 @@
 namespace pemaro::test {
 
 /// While one lives the library's waits return at once: a wait on a condition as if its time were
-/// over, a sleep as if it had been slept. What they were asked for is kept. Only one may live at a
-/// time.
+/// over, a sleep as if it had been slept. What they were asked for is kept.
+/// Only one may live at a time.
 class FakeWaits {
   public:
     FakeWaits();

@@ -9,8 +9,8 @@ namespace pemaro::test {
 
 namespace {
 
-// In the order of android_LogPriority: unknown, default, verbose, debug, info, warn, error, fatal,
-// silent.
+// In the order of android_LogPriority:
+// unknown, default, verbose, debug, info, warn, error, fatal, silent.
 constexpr char kLetters[] = "??VDIWEFS";
 
 char letterOf(int priority) {

@@ -30,8 +30,8 @@ class RecordCollector {
     /// Each event takes this long from now on.
     void setPause(std::chrono::milliseconds pause);
 
-    /// Waits until `count` events, or deaths, have come since the beginning; false when that takes
-    /// too long.
+    /// Waits until `count` events, or deaths, have come since the beginning;
+    /// false when that takes too long.
     bool await(size_t count);
     bool awaitDeaths(int count);
 

@@ -13,8 +13,8 @@
 namespace pemaro::test {
 
 /// A binder that stands for one in another process: a proxy is made around it because it answers no
-/// query for a local interface. It keeps every transaction and answers as it was told, and it can
-/// die.
+/// query for a local interface.
+/// It keeps every transaction and answers as it was told, and it can die.
 ///
 ///     sp<RecordingBinder> remote = new RecordingBinder;
 ///     remote->answer([](Parcel& reply) { reply.writeInt32(0); });
