@@ -14,10 +14,10 @@
 #include <vector>
 
 #include "pemaro/TouchCompanionClient.h"
-#include "tests/support/FakeServiceManager.h"
-#include "tests/support/FakeTouchCompanionService.h"
+#include "pemaro/testkit/FakeServiceManager.h"
+#include "pemaro/testkit/FakeTouchCompanionService.h"
+#include "pemaro/testkit/NativeBinder.h"
 #include "tests/support/LocalMemory.h"
-#include "tests/support/NativeBinder.h"
 
 namespace {
 

@@ -4,7 +4,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "tests/support/FakeServiceManager.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"

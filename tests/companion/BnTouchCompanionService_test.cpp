@@ -14,9 +14,10 @@
 
 #include "pemaro/BnTouchCompanionClient.h"
 #include "pemaro/Status.h"
-#include "tests/support/FakeTouchCompanionService.h"
+#include "pemaro/testkit/FakeTouchCompanionService.h"
 #include "tests/support/LocalMemory.h"
 #include "tests/support/LogLines.h"
+#include "tests/support/ParcelBytes.h"
 
 namespace pemaro::test {
 namespace {

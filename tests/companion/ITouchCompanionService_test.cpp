@@ -8,7 +8,7 @@
 #include "pemaro/BnTouchCompanionClient.h"
 #include "pemaro/BpTouchCompanionService.h"
 #include "pemaro/Status.h"
-#include "tests/support/FakeTouchCompanionService.h"
+#include "pemaro/testkit/FakeTouchCompanionService.h"
 #include "tests/support/RecordingBinder.h"
 #include "tests/support/VirtualSlot.h"
 

@@ -12,8 +12,8 @@
 
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
-#include "tests/support/FakeServiceManager.h"
-#include "tests/support/FakeTouchCompanionService.h"
+#include "pemaro/testkit/FakeServiceManager.h"
+#include "pemaro/testkit/FakeTouchCompanionService.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LocalMemory.h"
 #include "tests/support/LogLines.h"

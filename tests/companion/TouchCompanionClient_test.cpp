@@ -9,8 +9,8 @@
 
 #include <functional>
 
+#include "pemaro/testkit/NativeBinder.h"
 #include "tests/companion/TouchCompanionClientTest.h"
-#include "tests/support/NativeBinder.h"
 #include "tests/support/RecordingBinder.h"
 
 namespace pemaro::test {

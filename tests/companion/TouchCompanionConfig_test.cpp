@@ -10,8 +10,8 @@
 #include <string>
 #include <vector>
 
+#include "pemaro/testkit/LogRecorder.h"
 #include "tests/companion/TouchCompanionRemoteTest.h"
-#include "tests/support/LogRecorder.h"
 
 namespace pemaro::test {
 namespace {

@@ -12,8 +12,8 @@
 #include "pemaro/ISerializableParams4.h"
 #include "pemaro/ITouchCompanionFacade.h"
 #include "pemaro/ITouchCompanionFacadeOld.h"
-#include "tests/support/FakeServiceManager.h"
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/FakeServiceManager.h"
+#include "pemaro/testkit/LogRecorder.h"
 
 namespace pemaro::test {
 namespace {

@@ -14,8 +14,8 @@
 #include "pemaro/HandBiometricManagerClient.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchManagerClient.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 #include "tests/managers/ManagerParcels.h"
-#include "tests/support/FakeServiceManager.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"
 

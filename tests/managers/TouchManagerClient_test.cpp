@@ -9,9 +9,9 @@
 #include <vector>
 
 #include "pemaro/Status.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 #include "tests/managers/ManagerMocks.h"
 #include "tests/managers/ManagerParcels.h"
-#include "tests/support/FakeServiceManager.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"

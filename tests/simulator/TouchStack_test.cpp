@@ -8,7 +8,7 @@
 
 #include "pemaro/GestureManagerClient.h"
 #include "pemaro/TouchManagerClient.h"
-#include "tests/support/FakeServiceManager.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 
 using testing::ElementsAre;
 

@@ -3,7 +3,7 @@
 
 #include <cstdio>
 
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/LogRecorder.h"
 
 namespace pemaro::test {
 

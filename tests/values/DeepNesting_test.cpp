@@ -12,10 +12,12 @@
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/LogRecorder.h"
 
 namespace pemaro {
 namespace {
+
+using test::LogRecorder;
 
 constexpr size_t kMebibyte = 1 << 20;
 constexpr size_t kStackBytes = 256 * 1024;

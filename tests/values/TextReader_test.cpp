@@ -6,11 +6,13 @@
 
 #include "pemaro/SerializableValue.h"
 #include "pemaro/Status.h"
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/LogRecorder.h"
 
 namespace pemaro {
 namespace {
 
+using test::LogLine;
+using test::LogRecorder;
 using testing::ElementsAre;
 using testing::IsEmpty;
 

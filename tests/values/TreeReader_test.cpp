@@ -12,12 +12,14 @@
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/LogRecorder.h"
 #include "tests/values/reference/ReferenceTree.h"
 
 namespace pemaro {
 namespace {
 
+using test::LogLine;
+using test::LogRecorder;
 using testing::IsEmpty;
 
 struct Accepted {

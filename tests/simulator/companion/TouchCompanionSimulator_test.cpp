@@ -15,7 +15,7 @@
 #include "pemaro/BpTouchCompanionService.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
-#include "tests/support/FakeServiceManager.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 
 using android::sp;
 

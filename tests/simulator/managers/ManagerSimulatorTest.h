@@ -7,9 +7,9 @@
 #include <vector>
 
 #include "pemaro/Binder.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 #include "simulator/ServiceKind.h"
 #include "simulator/managers/ManagerOptions.h"
-#include "tests/support/FakeServiceManager.h"
 #include "tests/support/RecordCollector.h"
 #include "tests/support/RecordingBinder.h"
 

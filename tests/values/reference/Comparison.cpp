@@ -3,12 +3,15 @@
 
 #include <sstream>
 
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/LogRecorder.h"
 #include "tests/values/reference/ReferenceReader.h"
 
 namespace pemaro::reference {
 
 namespace {
+
+using test::LogLine;
+using test::LogRecorder;
 
 SerializableMap filled(const SerializableMap*) {
     SerializableMap map;

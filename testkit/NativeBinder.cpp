@@ -1,10 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tests/support/NativeBinder.h"
-
-#include "pemaro/Binder.h"
+#include "pemaro/testkit/NativeBinder.h"
 
 #include <binder/ProcessState.h>
-#include <gtest/gtest.h>
 #include <linux/android/binder.h>
 #include <sys/ioctl.h>
 #include <sys/syscall.h>
@@ -14,6 +11,7 @@
 #include <cstdarg>
 #include <cstdint>
 #include <cstring>
+#include <mutex>
 
 namespace pemaro::test {
 
@@ -21,14 +19,8 @@ namespace {
 
 std::atomic<int> gDriverWrites{0};
 
-// Registered while the program's static objects are made; runs before the first test.
-class OpenDriver : public ::testing::Environment {
-  public:
-    void SetUp() override { openDriver(); }
-};
-
-[[maybe_unused]] const ::testing::Environment* const gOpenDriver =
-        ::testing::AddGlobalTestEnvironment(new OpenDriver);
+std::mutex gManagerLock;
+android::sp<android::IServiceManager> gManager;
 
 int writeRead(binder_write_read& transfer) {
     ++gDriverWrites;
@@ -48,11 +40,22 @@ void openDriver() {
     android::ProcessState::initWithDriver("/dev/zero");
 }
 
+void useServiceManager(const android::sp<android::IServiceManager>& manager) {
+    std::lock_guard<std::mutex> lock(gManagerLock);
+    gManager = manager;
+}
+
 int driverWrites() {
     return gDriverWrites;
 }
 
 }  // namespace pemaro::test
+
+// Takes the place of libbinder's.
+android::sp<android::IServiceManager> android::defaultServiceManager() {
+    std::lock_guard<std::mutex> lock(pemaro::test::gManagerLock);
+    return pemaro::test::gManager;
+}
 
 // Takes the place of the C library's, for libbinder as well; requests that are not the driver's go
 // to the kernel. A sanitizer's interceptor of the same name gives way to it too.

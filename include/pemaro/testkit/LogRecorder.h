@@ -6,6 +6,8 @@
 #include <string>
 #include <vector>
 
+namespace pemaro::test {
+
 /// One line of the platform's log, its text formatted.
 struct LogLine {
     int priority;
@@ -42,3 +44,5 @@ class LogRecorder {
     mutable std::mutex mMutex;
     std::vector<LogLine> mLines;
 };
+
+}  // namespace pemaro::test

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tests/support/FakeTouchCompanionService.h"
+#include "pemaro/testkit/FakeTouchCompanionService.h"
 
 #include <algorithm>
 #include <cstring>

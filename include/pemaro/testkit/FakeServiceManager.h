@@ -52,7 +52,8 @@ class FakeServiceManager : public android::IServiceManager {
 };
 
 /// While one lives its manager is the process's default service manager; without one there is none,
-/// and android::defaultServiceManager() returns null.
+/// and android::defaultServiceManager() returns null. Binder is made to work in this process alone
+/// (NativeBinder.h).
 class ScopedServiceManager {
   public:
     ScopedServiceManager();

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tests/support/LogRecorder.h"
+#include "pemaro/testkit/LogRecorder.h"
 
 #include <android/log.h>
 
@@ -7,6 +7,8 @@
 #include <cstdio>
 #include <cstdlib>
 #include <ostream>
+
+namespace pemaro::test {
 
 bool operator==(const LogLine& a, const LogLine& b) {
     return a.priority == b.priority && a.tag == b.tag && a.text == b.text;
@@ -54,12 +56,17 @@ std::string format(const char* text, va_list arguments) {
 
 }  // namespace
 
+}  // namespace pemaro::test
+
+using pemaro::test::LogRecorder;
+
 // The platform's entry points; what a program defines itself comes before what a library offers.
 
 extern "C" int __android_log_print(int priority, const char* tag, const char* text, ...) {
     va_list arguments;
     va_start(arguments, text);
-    LogRecorder::instance().record({priority, tag == nullptr ? "" : tag, format(text, arguments)});
+    LogRecorder::instance().record(
+            {priority, tag == nullptr ? "" : tag, pemaro::test::format(text, arguments)});
     va_end(arguments);
     return 1;
 }
@@ -70,7 +77,7 @@ extern "C" void __android_log_assert(const char* condition, const char* tag, con
     if (text != nullptr) {
         va_list arguments;
         va_start(arguments, text);
-        message = format(text, arguments);
+        message = pemaro::test::format(text, arguments);
         va_end(arguments);
     }
     fprintf(stderr, "%s|%s|%s\n", condition == nullptr ? "" : condition, tag == nullptr ? "" : tag,

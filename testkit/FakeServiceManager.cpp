@@ -1,17 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tests/support/FakeServiceManager.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 
 #include <utils/String16.h>
 #include <utils/String8.h>
 
 #include <utility>
 
+#include "pemaro/testkit/NativeBinder.h"
+
 namespace pemaro::test {
 
 namespace {
-
-std::mutex gDefaultLock;
-android::sp<FakeServiceManager> gDefault;
 
 std::string textOf(const android::String16& name) {
     return android::String8(name).c_str();
@@ -93,19 +92,12 @@ bool FakeServiceManager::isDeclared(const android::String16& name) {
 }
 
 ScopedServiceManager::ScopedServiceManager() : mManager(new FakeServiceManager) {
-    std::lock_guard<std::mutex> lock(gDefaultLock);
-    gDefault = mManager;
+    openDriver();
+    useServiceManager(mManager);
 }
 
 ScopedServiceManager::~ScopedServiceManager() {
-    std::lock_guard<std::mutex> lock(gDefaultLock);
-    gDefault = nullptr;
+    useServiceManager(nullptr);
 }
 
 }  // namespace pemaro::test
-
-// Takes the place of libbinder's.
-android::sp<android::IServiceManager> android::defaultServiceManager() {
-    std::lock_guard<std::mutex> lock(pemaro::test::gDefaultLock);
-    return pemaro::test::gDefault;
-}

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <map>
 #include <mutex>
@@ -8,7 +9,6 @@
 #include <vector>
 
 #include "pemaro/BnTouchCompanionService.h"
-#include "tests/support/ParcelBytes.h"
 
 namespace pemaro::test {
 
@@ -44,7 +44,7 @@ class FakeTouchCompanionService : public BnTouchCompanionService {
     SerializableMap response;            ///< sendCommand()
     SerializableMap afeParams;           ///< getAFEParams(map)
     SerializableMapArray afeArray;       ///< getAFEParams(array)
-    Bytes config;                        ///< getConfigParams(binary); see `configLength`
+    std::vector<uint8_t> config;         ///< getConfigParams(binary); see `configLength`
     int configLength = -1;               ///< its result, where it is not the size of `config`
     int packetSize = 0;                  ///< getPacketSize()
     unsigned int inspection = 0;         ///< inspect()
@@ -52,7 +52,7 @@ class FakeTouchCompanionService : public BnTouchCompanionService {
 
     // What the operations were given last.
     android::sp<ITouchCompanionClient> client;  ///< registerClient()
-    Bytes receivedConfig;                       ///< setConfigParams()
+    std::vector<uint8_t> receivedConfig;        ///< setConfigParams()
 
     int registerClient(const android::sp<ITouchCompanionClient>& client) override;
     int unregisterClient() override;
