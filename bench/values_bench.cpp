@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 
-// Reading, writing and copying maps, beside RapidJSON doing the same with the same text (its document
-// keeps numbers as numbers, not as text); numbers to text and back, beside snprintf and sscanf.
+// Reading, writing, copying and looking up, by this library and by those that a user would take
+// otherwise, with the same texts. Each benchmark is named operation/payload/who; "floor" makes the same
+// tree without reading anything (Floor.h). What is made is also destroyed in the time measured.
 
 #include <benchmark/benchmark.h>
 #include <rapidjson/document.h>
@@ -10,56 +11,17 @@
 
 #include <cstdio>
 #include <cstdlib>
+#include <nlohmann/json.hpp>
 #include <string>
 
+#include "bench/Floor.h"
+#include "bench/Payloads.h"
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
 #include "values/NumberText.h"
 
+namespace pemaro::bench {
 namespace {
-
-using pemaro::SerializableMap;
-using pemaro::SerializableMapArray;
-
-/// A command's request, as it crosses Binder with each call.
-std::string smallText() {
-    return "{\"DEBUG_COMMAND\":{\"ARGS\":[\"12\",\"34\"],\"NAME\":\"set_gain\"},\"VERSION\":3}";
-}
-
-/// A configuration: many entries of one map, in the order of their keys.
-std::string flatText() {
-    std::string text = "{";
-    for (int i = 0; i < 2000; ++i) {
-        char entry[64];
-        snprintf(entry, sizeof(entry), "%s\"parameter_%04d\":%d.%06d", i == 0 ? "" : ",", i, i,
-                 i * 7);
-        text += entry;
-    }
-    return text + "}";
-}
-
-/// An array of arrays of small numbers, as an image has.
-std::string listText() {
-    std::string text = "{\"rows\":[";
-    for (int row = 0; row < 40; ++row) {
-        text += row == 0 ? "[" : ",[";
-        for (int column = 0; column < 60; ++column) {
-            text += (column == 0 ? "" : ",") + std::to_string(row * column);
-        }
-        text += "]";
-    }
-    return text + "]}";
-}
-
-std::string deepText() {
-    std::string text;
-    for (int i = 0; i < 1000; ++i) text += "{\"a\":[";
-    text += "1";
-    for (int i = 0; i < 1000; ++i) text += "]}";
-    return text;
-}
-
-using MakeText = std::string (*)();
 
 SerializableMap mapOf(const std::string& text) {
     SerializableMap map;
@@ -67,76 +29,209 @@ SerializableMap mapOf(const std::string& text) {
     return map;
 }
 
-void readMap(benchmark::State& state, MakeText make) {
-    const std::string text = make();
+void setBytes(benchmark::State& state, const std::string& text) {
+    state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
+}
+
+// ---- this library ------------------------------------------------------------------------------
+
+void readZelk(benchmark::State& state, const std::string& text) {
     for (auto _ : state) {
         SerializableMap map;
         benchmark::DoNotOptimize(map.unserialize(text));
     }
-    state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
+    setBytes(state, text);
 }
 
-void writeMap(benchmark::State& state, MakeText make) {
-    const std::string text = make();
+void writeZelk(benchmark::State& state, const std::string& text) {
     const SerializableMap map = mapOf(text);
     for (auto _ : state) benchmark::DoNotOptimize(map.serialize());
-    state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
+    setBytes(state, text);
 }
 
-void copyMap(benchmark::State& state, MakeText make) {
-    const std::string text = make();
+void copyZelk(benchmark::State& state, const std::string& text) {
     const SerializableMap map = mapOf(text);
     for (auto _ : state) {
         const SerializableMap copy(map);
         benchmark::DoNotOptimize(&copy);
     }
-    state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
+    setBytes(state, text);
 }
 
-void readRapidJson(benchmark::State& state, MakeText make) {
-    const std::string text = make();
+void buildFloor(benchmark::State& state, const std::string& text) {
+    const Floor floor(mapOf(text));
+    for (auto _ : state) {
+        SerializableMap map;
+        floor.build(map);
+        benchmark::DoNotOptimize(&map);
+    }
+    setBytes(state, text);
+}
+
+// ---- RapidJSON: numbers become numbers, strings stay in a pool -------------------------------------
+
+void readRapidJson(benchmark::State& state, const std::string& text) {
     for (auto _ : state) {
         rapidjson::Document document;
-        document.Parse<rapidjson::kParseIterativeFlag>(text.c_str());
+        document.Parse(text.data(), text.size());
         benchmark::DoNotOptimize(document.HasParseError());
     }
-    state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
+    setBytes(state, text);
 }
 
-void writeRapidJson(benchmark::State& state, MakeText make) {
-    const std::string text = make();
+void writeRapidJson(benchmark::State& state, const std::string& text) {
     rapidjson::Document document;
-    document.Parse<rapidjson::kParseIterativeFlag>(text.c_str());
+    document.Parse(text.data(), text.size());
     for (auto _ : state) {
         rapidjson::StringBuffer buffer;
         rapidjson::Writer<rapidjson::StringBuffer> writer(buffer);
         document.Accept(writer);
-        benchmark::DoNotOptimize(std::string(buffer.GetString(), buffer.GetSize()));
+        benchmark::DoNotOptimize(buffer.GetString());
     }
-    state.SetBytesProcessed(static_cast<int64_t>(state.iterations() * text.size()));
+    setBytes(state, text);
 }
 
-#define ZELK_BENCH_TEXTS(function)                 \
-    BENCHMARK_CAPTURE(function, small, smallText); \
-    BENCHMARK_CAPTURE(function, flat, flatText);   \
-    BENCHMARK_CAPTURE(function, list, listText);   \
-    BENCHMARK_CAPTURE(function, deep, deepText)
+void copyRapidJson(benchmark::State& state, const std::string& text) {
+    rapidjson::Document document;
+    document.Parse(text.data(), text.size());
+    for (auto _ : state) {
+        rapidjson::Document copy;
+        copy.CopyFrom(document, copy.GetAllocator());
+        benchmark::DoNotOptimize(&copy);
+    }
+    setBytes(state, text);
+}
 
-ZELK_BENCH_TEXTS(readMap);
-ZELK_BENCH_TEXTS(readRapidJson);
-ZELK_BENCH_TEXTS(writeMap);
-ZELK_BENCH_TEXTS(writeRapidJson);
-ZELK_BENCH_TEXTS(copyMap);
+// ---- nlohmann: a std::map of variants --------------------------------------------------------------
+
+void readNlohmann(benchmark::State& state, const std::string& text) {
+    for (auto _ : state) benchmark::DoNotOptimize(nlohmann::json::parse(text));
+    setBytes(state, text);
+}
+
+void writeNlohmann(benchmark::State& state, const std::string& text) {
+    const nlohmann::json document = nlohmann::json::parse(text);
+    for (auto _ : state) benchmark::DoNotOptimize(document.dump());
+    setBytes(state, text);
+}
+
+void copyNlohmann(benchmark::State& state, const std::string& text) {
+    const nlohmann::json document = nlohmann::json::parse(text);
+    for (auto _ : state) {
+        const nlohmann::json copy(document);
+        benchmark::DoNotOptimize(&copy);
+    }
+    setBytes(state, text);
+}
+
+struct Contender {
+    const char* operation;
+    const char* name;
+    void (*run)(benchmark::State& state, const std::string& text);
+};
+
+constexpr Contender kContenders[] = {
+        {"read", "zelk", readZelk},           {"read", "floor", buildFloor},
+        {"read", "rapidjson", readRapidJson}, {"read", "nlohmann", readNlohmann},
+        {"write", "zelk", writeZelk},         {"write", "rapidjson", writeRapidJson},
+        {"write", "nlohmann", writeNlohmann}, {"copy", "zelk", copyZelk},
+        {"copy", "floor", buildFloor},        {"copy", "rapidjson", copyRapidJson},
+        {"copy", "nlohmann", copyNlohmann},
+};
+
+/// The contenders of one payload follow each other, so that what is compared runs at the same time.
+[[maybe_unused]] const bool gRegistered = [] {
+    for (const Payload& payload : payloads()) {
+        for (const Contender& contender : kContenders) {
+            const std::string name =
+                    std::string(contender.operation) + '/' + payload.name + '/' + contender.name;
+            benchmark::RegisterBenchmark(name.c_str(), [&](benchmark::State& state) {
+                contender.run(state, payload.text);
+            });
+        }
+    }
+    return true;
+}();
+
+// ---- looking up: every key of a thousand, in another order ----------------------------------------
+
+std::vector<std::string> keysOf(const std::string& text) {
+    const nlohmann::json document = nlohmann::json::parse(text);
+    std::vector<std::string> keys;
+    for (const auto& entry : document.items()) keys.push_back(entry.key());
+    std::vector<std::string> mixed;
+    for (size_t i = 0; i < keys.size(); ++i) mixed.push_back(keys[i * 389 % keys.size()]);
+    return mixed;
+}
+
+template <typename Use>
+void lookUp(benchmark::State& state, Use use) {
+    const std::vector<std::string> keys = keysOf(payload("flat").text);
+    for (auto _ : state) {
+        for (const std::string& key : keys) benchmark::DoNotOptimize(use(key));
+    }
+    state.SetItemsProcessed(static_cast<int64_t>(state.iterations() * keys.size()));
+}
+
+void lookUpContains(benchmark::State& state) {
+    SerializableMap map = mapOf(payload("flat").text);
+    lookUp(state, [&](const std::string& key) { return map.contains(key); });
+}
+BENCHMARK(lookUpContains)->Name("lookup/contains/zelk");
+
+void lookUpContainsText(benchmark::State& state) {
+    SerializableMap map = mapOf(payload("flat").text);
+    lookUp(state, [&](const std::string& key) { return map.contains(key.c_str()); });
+}
+BENCHMARK(lookUpContainsText)->Name("lookup/containsText/zelk");
+
+void lookUpType(benchmark::State& state) {
+    SerializableMap map = mapOf(payload("flat").text);
+    lookUp(state, [&](const std::string& key) { return map.getType(key); });
+}
+BENCHMARK(lookUpType)->Name("lookup/getType/zelk");
+
+void lookUpPlatform(benchmark::State& state) {
+    const SerializableMap map = mapOf(payload("flat").text);
+    lookUp(state, [&](const std::string& key) { return map.indexOfKey(key); });
+}
+BENCHMARK(lookUpPlatform)->Name("lookup/indexOfKey/platform");
+
+void lookUpRapidJson(benchmark::State& state) {
+    rapidjson::Document document;
+    document.Parse(payload("flat").text.c_str());
+    lookUp(state, [&](const std::string& key) { return document.HasMember(key.c_str()); });
+}
+BENCHMARK(lookUpRapidJson)->Name("lookup/HasMember/rapidjson");
+
+void lookUpNlohmann(benchmark::State& state) {
+    const nlohmann::json document = nlohmann::json::parse(payload("flat").text);
+    lookUp(state, [&](const std::string& key) { return document.contains(key); });
+}
+BENCHMARK(lookUpNlohmann)->Name("lookup/contains/nlohmann");
+
+void merge(benchmark::State& state) {
+    const SerializableMap odd = mapOf(payload("flat").text);
+    const SerializableMap even = mapOf(payload("short").text);
+    for (auto _ : state) {
+        SerializableMap sum(odd);
+        sum += even;
+        benchmark::DoNotOptimize(&sum);
+    }
+}
+BENCHMARK(merge)->Name("merge/flat+short/zelk");
+
+// ---- numbers ---------------------------------------------------------------------------------------
 
 constexpr float kFloats[] = {0.0f, 1.25f, -0.5f, 1234.5678f, 3.14159265f, 60000.0f, -1e-5f, 1e20f};
 
-void formatFloat(benchmark::State& state) {
+void formatFloats(benchmark::State& state) {
     size_t i = 0;
-    for (auto _ : state) benchmark::DoNotOptimize(pemaro::formatFloat(kFloats[i++ % 8]));
+    for (auto _ : state) benchmark::DoNotOptimize(formatFloat(kFloats[i++ % 8]));
 }
-BENCHMARK(formatFloat);
+BENCHMARK(formatFloats)->Name("number/format/zelk");
 
-void formatFloatByPrintf(benchmark::State& state) {
+void formatFloatsByPrintf(benchmark::State& state) {
     size_t i = 0;
     for (auto _ : state) {
         char buffer[51];
@@ -144,22 +239,22 @@ void formatFloatByPrintf(benchmark::State& state) {
         benchmark::DoNotOptimize(std::string(buffer));
     }
 }
-BENCHMARK(formatFloatByPrintf);
+BENCHMARK(formatFloatsByPrintf)->Name("number/format/snprintf");
 
 constexpr const char* kFloatTexts[] = {"0.000000", "1.250000",     "-0.500000", "1234.567749",
                                        "3.141593", "60000.000000", "-0.000010", "42"};
 
-void scanFloat(benchmark::State& state) {
+void scanFloats(benchmark::State& state) {
     size_t i = 0;
     float value = 0;
     for (auto _ : state) {
-        benchmark::DoNotOptimize(pemaro::scanFloat(kFloatTexts[i++ % 8], value));
+        benchmark::DoNotOptimize(scanFloat(kFloatTexts[i++ % 8], value));
         benchmark::DoNotOptimize(value);
     }
 }
-BENCHMARK(scanFloat);
+BENCHMARK(scanFloats)->Name("number/scan/zelk");
 
-void scanFloatByScanf(benchmark::State& state) {
+void scanFloatsByScanf(benchmark::State& state) {
     size_t i = 0;
     float value = 0;
     for (auto _ : state) {
@@ -167,6 +262,7 @@ void scanFloatByScanf(benchmark::State& state) {
         benchmark::DoNotOptimize(value);
     }
 }
-BENCHMARK(scanFloatByScanf);
+BENCHMARK(scanFloatsByScanf)->Name("number/scan/sscanf");
 
 }  // namespace
+}  // namespace pemaro::bench

@@ -1,0 +1,154 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "bench/Payloads.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <cstdlib>
+#include <functional>
+#include <random>
+
+namespace pemaro::bench {
+
+namespace {
+
+/// `count` numbers from 0 on, shuffled alike in every run.
+std::vector<int> shuffled(int count) {
+    std::vector<int> numbers(static_cast<size_t>(count));
+    for (int i = 0; i < count; ++i) numbers[static_cast<size_t>(i)] = i;
+    std::mt19937 random(4711);
+    for (size_t i = numbers.size(); i > 1; --i) std::swap(numbers[i - 1], numbers[random() % i]);
+    return numbers;
+}
+
+std::vector<int> ascending(int count) {
+    std::vector<int> numbers = shuffled(count);
+    std::sort(numbers.begin(), numbers.end());
+    return numbers;
+}
+
+/// A map with one entry, by a printf format of two numbers, for each of `numbers`.
+std::string flat(const std::vector<int>& numbers, const char* format) {
+    std::string text = "{";
+    for (const int number : numbers) {
+        char entry[96];
+        snprintf(entry, sizeof(entry), format, number, number * 7 % 1000000);
+        if (text.size() > 1) text += ',';
+        text += entry;
+    }
+    return text + "}";
+}
+
+constexpr const char* kLongKey = "\"touch_parameter_%05d\":12.%06d";
+constexpr const char* kShortKey = "\"p%05d\":%d";
+
+std::string command() {
+    return "{\"DEBUG_COMMAND\":{\"COMMAND\":\"set_gain\",\"PARAMS\":{\"MASK\":4294967295,"
+           "\"NUM_OF_ELEMENTS\":6,\"VALUES\":[12,34,-5,6.250000,78,90]},\"TIMEOUT\":1500},"
+           "\"REQUEST\":\"DEBUG\",\"SESSION\":12345,\"VERSION\":3}";
+}
+
+/// Modules of groups of parameters, an array in each group: some 70 KB.
+std::string nestedMaps(int modules) {
+    std::string text = "{";
+    for (int module = 0; module < modules; ++module) {
+        char head[48];
+        snprintf(head, sizeof(head), "%s\"module_%04d\":{", module == 0 ? "" : ",", module);
+        text += head;
+        for (int group = 0; group < 4; ++group) {
+            char entry[160];
+            snprintf(entry, sizeof(entry),
+                     "%s\"group_%d\":{\"enabled\":true,\"gain\":%d.500000,\"name\":\"channel %d\","
+                     "\"taps\":[%d,%d,3,4],\"threshold_low\":-%d}",
+                     group == 0 ? "" : ",", group, module, group, group, module, module + group);
+            text += entry;
+        }
+        text += '}';
+    }
+    return text + "}";
+}
+
+std::string strings(int count, size_t length) {
+    std::string text = "{";
+    for (int i = 0; i < count; ++i) {
+        char key[32];
+        snprintf(key, sizeof(key), "%s\"note_%02d\":\"", i == 0 ? "" : ",", i);
+        text += key;
+        for (size_t n = 0; n < length; ++n) text += static_cast<char>('a' + (n * 7 + n / 31) % 26);
+        text += '"';
+    }
+    return text + "}";
+}
+
+std::string numbers(int count) {
+    std::string text = "{\"image\":[";
+    for (int i = 0; i < count; ++i) {
+        if (i != 0) text += ',';
+        text += std::to_string(i * 37 % 65536);
+    }
+    return text + "]}";
+}
+
+std::string repeated(const std::string& piece, size_t count) {
+    std::string text;
+    text.reserve(piece.size() * count);
+    for (size_t i = 0; i < count; ++i) text += piece;
+    return text;
+}
+
+std::string enclosed(const std::string& open, const std::string& core, const std::string& close,
+                     size_t count) {
+    return repeated(open, count) + core + repeated(close, count);
+}
+
+}  // namespace
+
+const std::vector<Payload>& payloads() {
+    static const std::vector<Payload> all = {
+            {"command", command()},
+            {"flat", flat(ascending(1000), kLongKey)},
+            {"random", flat(shuffled(1000), kLongKey)},
+            {"short", flat(ascending(1000), kShortKey)},
+            {"nested", nestedMaps(180)},
+            {"strings", strings(16, 4096)},
+            {"array", numbers(10000)},
+            {"flat1M", flat(ascending(29000), kLongKey)},
+            {"random1M", flat(shuffled(29000), kLongKey)},
+    };
+    return all;
+}
+
+const Payload& payload(const std::string& name) {
+    for (const Payload& one : payloads()) {
+        if (name == one.name) return one;
+    }
+    abort();
+}
+
+const std::vector<Shape>& shapes() {
+    static const std::vector<Shape> all = {
+            {"flat", [](size_t n) { return flat(ascending(static_cast<int>(n)), kLongKey); }},
+            {"random", [](size_t n) { return flat(shuffled(static_cast<int>(n)), kLongKey); }},
+            {"array", [](size_t n) { return numbers(static_cast<int>(n)); }},
+            {"nested", [](size_t n) { return nestedMaps(static_cast<int>(n / 30 + 1)); }},
+            {"deepMaps", [](size_t n) { return enclosed("{\"a\":", "{\"a\":1}", "}", n); }},
+            {"deepArrays", [](size_t n) { return "{\"a\":" + enclosed("[", "1", "]", n) + "}"; }},
+            // Hostile: each of these has a place to which a simpler reader would return again and again.
+            {"unclosed", [](size_t n) { return repeated("{\"a\":[", n) + "}"; }},
+            {"noTokenEnds", [](size_t n) { return "{\"a\":[" + repeated("x", n) + "\"]}"; }},
+            {"escapedQuotes", [](size_t n) { return "{\"a\":\"" + repeated("\\\"", n) + "\"}"; }},
+            {"equalKeys", [](size_t n) { return "{" + repeated("\"a\":1,", n) + "\"b\":2}"; }},
+            {"longEqualStarts",
+             [](size_t n) {
+                 std::string text = "{";
+                 for (size_t i = n; i > 0; --i) {
+                     text += '"' + repeated("k", 64) + std::to_string(i) + "\":1,";
+                 }
+                 return text + "\"b\":2}";
+             }},
+            {"bracketsInQuotes",
+             [](size_t n) { return "{\"a\":[\"" + repeated("[{", n) + "\"]}"; }},
+    };
+    return all;
+}
+
+}  // namespace pemaro::bench

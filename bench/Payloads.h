@@ -1,0 +1,30 @@
+// SPDX-License-Identifier: Apache-2.0
+#pragma once
+
+#include <string>
+#include <vector>
+
+/// The texts that reading, writing and copying are measured with.
+namespace pemaro::bench {
+
+struct Payload {
+    const char* name;
+    std::string text;  ///< of a map, as its writer writes it
+};
+
+/// A command's request, flat configurations (of sorted and of shuffled keys, of long and of short
+/// ones), nested maps, long strings, an image's worth of numbers, and a mebibyte of configuration.
+const std::vector<Payload>& payloads();
+
+/// The payload of that name.
+const Payload& payload(const std::string& name);
+
+/// The text of one shape with `size` entries, elements or levels. The hostile shapes are those whose
+/// reading a simpler reader would repeat.
+struct Shape {
+    const char* name;
+    std::string (*text)(size_t size);
+};
+const std::vector<Shape>& shapes();
+
+}  // namespace pemaro::bench
