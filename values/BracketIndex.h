@@ -2,7 +2,8 @@
 #pragma once
 
 #include <cstddef>
-#include <vector>
+
+#include "values/WorkStack.h"
 
 namespace pemaro {
 
@@ -12,12 +13,12 @@ namespace pemaro {
 /// by counting those, disregarding whatever stands in quoted stretches, where a stretch begins and
 /// ends at a double quote without a backslash before it. What counts as quoted thus depends on
 /// where the counting begins, but only on the parity of the quotes before that place: there are two
-/// readings of a text, each with braces and with square brackets to match, which is four stacks and
-/// one pass.
+/// readings of a text. Each is matched in one pass, from the first bracket on that is asked for and
+/// stands outside the quotes of that reading; a text that a writer made needs but one of them.
 class BracketIndex {
   public:
-    /// Matches the brackets in [from, limit).
-    BracketIndex(const char* from, const char* limit);
+    /// Knows the brackets before `limit`, where the text ends with a NUL.
+    explicit BracketIndex(const char* limit) : mLimit(limit) {}
 
     /// The bracket that closes the one at `open`, or null when there is none. Asked for ascending
     /// places only.
@@ -26,15 +27,23 @@ class BracketIndex {
   private:
     struct Pair {
         const char* open;
-        const char* close;
-        size_t outer;  ///< of the brackets of its stack, the one open around it
+        union {
+            const char* close;
+            size_t outer;  ///< while it is open: the one of its kind around it
+        };
     };
 
-    void push(size_t& top, const char* open);
-    void pop(size_t& top, const char* close);
+    struct Reading {
+        bool matched = false;
+        size_t next = 0;
+        WorkStack<Pair, 16> pairs;
 
-    std::vector<Pair> mPairs;
-    size_t mNext = 0;
+        void match(const char* from, const char* limit);
+        const Pair* find(const char* open);
+    };
+
+    const char* const mLimit;
+    Reading mReadings[2];
 };
 
 }  // namespace pemaro

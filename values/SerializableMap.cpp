@@ -3,38 +3,80 @@
 
 #include "pemaro/SerializableMap.h"
 
-#include <vector>
+#include <string_view>
 
 #include "pemaro/Status.h"
 #include "values/TextWriter.h"
 #include "values/TreeReader.h"
 #include "values/ValueAccess.h"
 #include "values/ValueTree.h"
+#include "values/VectorStorage.h"
+#include "values/WorkStack.h"
 
 namespace pemaro {
 
 namespace {
 
-using Entries = ValueAccess::Entries;
+/// Where `key` is in `map`, or where it would have to be.
+struct Place {
+    size_t index;
+    bool found;
+};
 
-/// Moves the values at `positions` of `from`, whose keys `to` lacks, into `to`, between its own.
-void mergeNew(SerializableMap& to, Entries& from, const std::vector<size_t>& positions) {
-    Entries& own = to;
-    Entries merged;
-    merged.setCapacity(own.size() + positions.size());
-    const auto append = [&merged](Entries& source, size_t index) {
-        const ssize_t at = merged.add(source.keyAt(index), defaultValue());
-        merged.editValueAt(static_cast<size_t>(at)).swap(source.editValueAt(index));
-    };
-    size_t next = 0;
-    for (const size_t position : positions) {
-        for (; next < own.size() && own.keyAt(next) < from.keyAt(position); ++next) {
-            append(own, next);
+/// Looks in [from, map.size()), where `key` has to be if anywhere.
+Place find(const SerializableMap& map, std::string_view key, size_t from = 0) {
+    const EntryView entries = viewOf(map);
+    size_t end = ValueAccess::size(map);
+    while (from < end) {
+        const size_t middle = from + (end - from) / 2;
+        const int order = key.compare(entries.key(middle));
+        if (order == 0) return {middle, true};
+        if (order < 0) {
+            end = middle;
+        } else {
+            from = middle + 1;
         }
-        append(from, position);
     }
-    for (; next < own.size(); ++next) append(own, next);
-    own = merged;
+    return {from, false};
+}
+
+/// find(), fast where the key is close to `from`: looks one, two, four … entries ahead first.
+Place findAhead(const SerializableMap& map, std::string_view key, size_t from) {
+    const EntryView entries = viewOf(map);
+    const size_t size = ValueAccess::size(map);
+    size_t end = from;
+    for (size_t step = 1; end < size && key > entries.key(end); step *= 2) {
+        from = end + 1;
+        end = from + step;
+    }
+    return find(map, key, from);
+}
+
+/// An entry that a map lacks: the index it has in the other one, and the one it will stand before.
+struct Absent {
+    size_t incoming;
+    size_t before;
+};
+using Absents = WorkStack<Absent, 16>;
+
+/// Moves the `absent` entries of `from` into `to`, between its own.
+void mergeAbsent(SerializableMap& to, SerializableMap& from, Absents& absents) {
+    const EntryEditor own = editorOf(to);
+    const EntryEditor incoming = editorOf(from);
+    const Absent* absent = absents.begin();
+    size_t next = 0;
+    const auto isIncoming = [&] { return absent != absents.end() && absent->before == next; };
+    ValueAccess::Entries merged;
+    fillEntries(
+            merged, ValueAccess::size(to) + absents.size(),
+            [&](size_t) {
+                return isIncoming() ? incoming.takeKey(absent->incoming) : own.takeKey(next);
+            },
+            [&](size_t) {
+                return ValueAccess::take(isIncoming() ? incoming.value(absent++->incoming)
+                                                      : own.value(next++));
+            });
+    ValueAccess::entries(to) = merged;
 }
 
 }  // namespace
@@ -56,7 +98,9 @@ SerializableMap& SerializableMap::operator=(const SerializableMap& other) {
 }
 
 int SerializableMap::getType(const std::string& key) {
-    return static_cast<int>(ValueAccess::type(valueFor(key)));
+    const Place place = find(*this, key);
+    return static_cast<int>(ValueAccess::type(place.found ? viewOf(*this).value(place.index)
+                                                          : nullItem(*this, key)));
 }
 
 int SerializableMap::keyAt(unsigned long index, std::string& key) {
@@ -72,27 +116,29 @@ int SerializableMap::valueAt(unsigned long index, SerializableValue& value) {
 }
 
 bool SerializableMap::contains(const std::string& key) {
-    return indexOfKey(key) >= 0;
+    return find(*this, key).found;
 }
 
 bool SerializableMap::contains(const char* key) {
-    return contains(std::string(key));
+    return find(*this, key).found;
 }
 
 SerializableMap& SerializableMap::operator+=(const SerializableMap& other) {
     // A copy, for `other` may be this map or be held by one of its values.
     SerializableMap copy(other);
-    Entries& incoming = copy;
-    std::vector<size_t> absent;
-    for (size_t i = 0; i < incoming.size(); ++i) {
-        const ssize_t at = indexOfKey(incoming.keyAt(i));
-        if (at < 0) {
-            absent.push_back(i);
+    const EntryEditor incoming = editorOf(copy);
+    const EntryEditor own = editorOf(*this);
+    Absents absents;
+    Place place = {0, false};
+    for (size_t i = 0; i < copy.size(); ++i) {
+        place = findAhead(*this, incoming.key(i), place.index);
+        if (place.found) {
+            own.value(place.index++).swap(incoming.value(i));
         } else {
-            editValueAt(static_cast<size_t>(at)).swap(incoming.editValueAt(i));
+            absents.push({i, place.index});
         }
     }
-    if (!absent.empty()) mergeNew(*this, incoming, absent);
+    if (!absents.empty()) mergeAbsent(*this, copy, absents);
     return *this;
 }
 
@@ -103,7 +149,7 @@ SerializableMap SerializableMap::operator+(const SerializableMap& other) const {
 }
 
 int SerializableMap::clear() {
-    static_cast<Entries&>(*this) = Entries();
+    ValueAccess::entries(*this) = ValueAccess::Entries();
     return STATUS_NO_ERROR;
 }
 

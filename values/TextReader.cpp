@@ -19,7 +19,10 @@ int removeWhitesSpaces(std::string& text) {
 
 int findKey(const char* from, char** colon, std::string& key) {
     FoundKey found;
-    if (!scanKey(from, from + strlen(from), found)) return STATUS_INVALID_FORMAT;
+    if (!findKey(from, from + strlen(from), found)) {
+        logMissingKey();
+        return STATUS_INVALID_FORMAT;
+    }
     *colon = const_cast<char*>(found.colon);
     key = found.key;
     return STATUS_NO_ERROR;

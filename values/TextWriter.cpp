@@ -17,9 +17,12 @@
 
 #include "values/TextWriter.h"
 
-#include <vector>
+#include <algorithm>
+#include <cstring>
 
 #include "values/ValueAccess.h"
+#include "values/VectorStorage.h"
+#include "values/WorkStack.h"
 
 namespace pemaro {
 
@@ -27,99 +30,146 @@ namespace {
 
 using A = ValueAccess;
 
-/// A container that is being written: one of the two pointers is set.
-struct Level {
-    const SerializableMap* map;
-    const SerializableMapArray* array;
-    size_t size;
-    size_t next;
-
-    explicit Level(const SerializableMap* m)
-            : map(m), array(nullptr), size(m == nullptr ? 0 : A::size(*m)), next(0) {}
-    explicit Level(const SerializableMapArray* a)
-            : map(nullptr), array(a), size(a == nullptr ? 0 : A::size(*a)), next(0) {}
-};
-
 class TextWriter {
   public:
-    std::string write(Level level, bool isMap);
+    std::string write(const SerializableMap* map, const SerializableMapArray* array);
 
   private:
-    void open(Level level, bool isMap);
-    void writeNext();
-    void writeValue(const SerializableValue& value);
-
-    struct OpenLevel {
-        Level level;
-        char close;
+    /// A container that is being written: one of the two pointers is set.
+    struct Level {
+        const SerializableMap* map;
+        const SerializableMapArray* array;
+        size_t next;
     };
-    std::vector<OpenLevel> mOpen;
+
+    bool writeEntries(Level& level);
+    bool writeElements(Level& level);
+    bool writeOrOpen(const SerializableValue& value);
+    void open(const SerializableMap* map, const SerializableMapArray* array, char bracket);
+
+    /// Makes room for `size` bytes and what may stand around them.
+    void ensure(size_t size) {
+        if (static_cast<size_t>(mLimit - mAt) < size + kPunctuation) grow(size + kPunctuation);
+    }
+    void grow(size_t size);
+    void put(char c) { *mAt++ = c; }
+    void put(const std::string& text) {
+        memcpy(mAt, text.data(), text.size());
+        mAt += text.size();
+    }
+
+    static constexpr size_t kPunctuation = 16;
+    static constexpr size_t kFirstRoom = 240;
+
+    WorkStack<Level, 16> mOpen;
     std::string mText;
+    char* mAt = nullptr;
+    char* mLimit = nullptr;
 };
 
-std::string TextWriter::write(Level level, bool isMap) {
-    open(level, isMap);
+std::string TextWriter::write(const SerializableMap* map, const SerializableMapArray* array) {
+    ensure(0);
+    open(map, array, map != nullptr ? '{' : '[');
     while (!mOpen.empty()) {
-        if (mOpen.back().level.next < mOpen.back().level.size) {
-            writeNext();
-        } else {
-            mText += mOpen.back().close;
-            mOpen.pop_back();
+        Level& level = mOpen.top();
+        const bool isMap = level.map != nullptr;
+        if (isMap ? writeEntries(level) : writeElements(level)) {
+            ensure(0);
+            put(isMap ? '}' : ']');
+            mOpen.pop();
         }
     }
+    mText.resize(static_cast<size_t>(mAt - mText.data()));
     return std::move(mText);
 }
 
-void TextWriter::open(Level level, bool isMap) {
-    mText += isMap ? '{' : '[';
-    mOpen.push_back({level, isMap ? '}' : ']'});
+void TextWriter::open(const SerializableMap* map, const SerializableMapArray* array, char bracket) {
+    put(bracket);
+    mOpen.push({map, array, 0});
 }
 
-void TextWriter::writeNext() {
-    Level& level = mOpen.back().level;
-    const size_t index = level.next++;
-    if (index != 0) mText += ',';
-    if (level.map == nullptr) {
-        writeValue(A::at(*level.array, index));
-        return;
+/// Writes what is left of a map, up to its end (then true) or to a container that is opened.
+bool TextWriter::writeEntries(Level& level) {
+    const EntryView entries = viewOf(*level.map);
+    const size_t count = A::size(*level.map);
+    for (size_t i = level.next; i < count; ++i) {
+        const std::string& key = entries.key(i);
+        const SerializableValue& value = entries.value(i);
+        ensure(key.size() + A::text(value).size());
+        if (i != 0) put(',');
+        put('"');
+        put(key);
+        put('"');
+        put(':');
+        level.next = i + 1;
+        if (writeOrOpen(value)) return false;
     }
-    mText += '"';
-    mText += A::entries(*level.map).keyAt(index);
-    mText += "\":";
-    writeValue(A::at(*level.map, index));
+    return true;
 }
 
-void TextWriter::writeValue(const SerializableValue& value) {
+bool TextWriter::writeElements(Level& level) {
+    const ElementView elements = viewOf(*level.array);
+    const size_t count = A::size(*level.array);
+    for (size_t i = level.next; i < count; ++i) {
+        const SerializableValue& value = elements.value(i);
+        ensure(A::text(value).size());
+        if (i != 0) put(',');
+        level.next = i + 1;
+        if (writeOrOpen(value)) return false;
+    }
+    return true;
+}
+
+/// Writes a value, in the room ensured for it. True when it is a container that is only opened.
+bool TextWriter::writeOrOpen(const SerializableValue& value) {
     switch (A::type(value)) {
         case VALUE_TYPE_NULL:
-            break;
+            return false;
         case VALUE_TYPE_STRING:
-            mText += '"';
-            mText += A::text(value);
-            mText += '"';
-            break;
+            put('"');
+            put(A::text(value));
+            put('"');
+            return false;
         case VALUE_TYPE_OBJECT:
-            open(Level(A::map(value)), true);
-            break;
+            if (A::map(value) != nullptr) {
+                open(A::map(value), nullptr, '{');
+                return true;
+            }
+            put('{');
+            put('}');
+            return false;
         case VALUE_TYPE_ARRAY:
-            open(Level(A::array(value)), false);
-            break;
+            if (A::array(value) != nullptr) {
+                open(nullptr, A::array(value), '[');
+                return true;
+            }
+            put('[');
+            put(']');
+            return false;
         case VALUE_TYPE_BLOB:
-            mText += "blob";
-            break;
+            for (const char c : {'b', 'l', 'o', 'b'}) put(c);
+            return false;
         default:
-            mText += A::text(value);
+            put(A::text(value));
+            return false;
     }
+}
+
+void TextWriter::grow(size_t size) {
+    const size_t used = mAt == nullptr ? 0 : static_cast<size_t>(mAt - mText.data());
+    mText.resize(std::max(kFirstRoom, 2 * used + size));
+    mAt = mText.data() + used;
+    mLimit = mText.data() + mText.size();
 }
 
 }  // namespace
 
 std::string writeText(const SerializableMap& map) {
-    return TextWriter().write(Level(&map), true);
+    return TextWriter().write(&map, nullptr);
 }
 
 std::string writeText(const SerializableMapArray& array) {
-    return TextWriter().write(Level(&array), false);
+    return TextWriter().write(nullptr, &array);
 }
 
 }  // namespace pemaro

@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <string>
+#include <utility>
 
 #include "pemaro/SerializableBlob.h"
 #include "pemaro/SerializableMap.h"
@@ -43,20 +44,32 @@ struct ValueAccess {
     static Elements& elements(SerializableMapArray& a) { return a.mElements; }
     static const Elements& elements(const SerializableMapArray& a) { return a.mElements; }
 
+    /// Values made in place: of a container, which becomes theirs and may be null, and of the text
+    /// that `makeText` returns.
+    static SerializableValue make(uint32_t type, SerializableMap* map, SerializableMapArray* array,
+                                  SerializableBlob* blob) {
+        return SerializableValue(type, map, array, blob, [] { return std::string(); });
+    }
+    template <typename MakeText>
+    static SerializableValue make(uint32_t type, MakeText makeText) {
+        return SerializableValue(type, nullptr, nullptr, nullptr, makeText);
+    }
+    /// What `v` is, leaving a null value.
+    static SerializableValue take(SerializableValue& v) {
+        const uint32_t type = std::exchange(v.mType, VALUE_TYPE_NULL);
+        return SerializableValue(type, std::exchange(v.mMap, nullptr),
+                                 std::exchange(v.mArray, nullptr), std::exchange(v.mBlob, nullptr),
+                                 [&] { return std::move(v.mValue); });
+    }
+
     static size_t size(const SerializableMap& m) { return entries(m).size(); }
     static size_t size(const SerializableMapArray& a) { return a.mElements.size(); }
-    static const SerializableValue& at(const SerializableMap& m, size_t index) {
-        return entries(m).valueAt(index);
-    }
-    static const SerializableValue& at(const SerializableMapArray& a, size_t index) {
-        return a.mElements.itemAt(index);
-    }
-    static SerializableValue& edit(SerializableMap& m, size_t index) {
-        return entries(m).editValueAt(index);
-    }
-    static SerializableValue& edit(SerializableMapArray& a, size_t index) {
-        return a.mElements.editItemAt(index);
-    }
 };
+
+template <typename MakeText>
+inline SerializableValue::SerializableValue(uint32_t type, SerializableMap* map,
+                                            SerializableMapArray* array, SerializableBlob* blob,
+                                            MakeText makeText)
+        : mType(type), mMap(map), mArray(array), mBlob(blob), mValue(makeText()) {}
 
 }  // namespace pemaro

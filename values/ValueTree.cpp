@@ -9,9 +9,9 @@
 
 #include "values/ValueTree.h"
 
-#include <vector>
-
 #include "values/ValueAccess.h"
+#include "values/VectorStorage.h"
+#include "values/WorkStack.h"
 
 namespace pemaro {
 
@@ -26,89 +26,60 @@ struct CopyStep {
     const SerializableMapArray* fromArray;
     SerializableMapArray* toArray;
 };
-using CopySteps = std::vector<CopyStep>;
+using CopySteps = WorkStack<CopyStep, 16>;
 
 /// A container no longer held by any value.
 struct Orphan {
     SerializableMap* map;
     SerializableMapArray* array;
 };
-using Orphans = std::vector<Orphan>;
+using Orphans = WorkStack<Orphan, 32>;
 
-bool holdsContainer(const SerializableValue& value) {
-    return (A::type(value) == VALUE_TYPE_OBJECT && A::map(value) != nullptr) ||
-           (A::type(value) == VALUE_TYPE_ARRAY && A::array(value) != nullptr);
+inline bool holdsContainer(const SerializableValue& value) {
+    const uint32_t type = A::type(value);
+    if (type != VALUE_TYPE_OBJECT && type != VALUE_TYPE_ARRAY) return false;
+    return type == VALUE_TYPE_OBJECT ? A::map(value) != nullptr : A::array(value) != nullptr;
 }
 
-template <typename Container>
-bool isFlat(const Container& container) {
-    for (size_t i = 0; i < A::size(container); ++i) {
-        if (holdsContainer(A::at(container, i))) return false;
+/// A copy of `from`. What a container holds is left to a step.
+SerializableValue copyOf(const SerializableValue& from, CopySteps& steps) {
+    const uint32_t type = A::type(from);
+    SerializableMap* map = nullptr;
+    SerializableMapArray* array = nullptr;
+    SerializableBlob* blob = nullptr;
+    if (type == VALUE_TYPE_OBJECT && A::map(from) != nullptr) {
+        map = new SerializableMap;
+        steps.push({A::map(from), map, nullptr, nullptr});
+    } else if (type == VALUE_TYPE_ARRAY && A::array(from) != nullptr) {
+        array = new SerializableMapArray;
+        steps.push({nullptr, nullptr, A::array(from), array});
+    } else if (type == VALUE_TYPE_BLOB && A::blob(from) != nullptr) {
+        blob = new SerializableBlob(*A::blob(from));
+    } else if (!A::hasContainerTag(from)) {
+        return A::make(type, [&]() -> const std::string& { return A::text(from); });
     }
-    return true;
+    return A::make(type, map, array, blob);
 }
 
-/// Makes `to` hold no entries, and the null item of `from`.
-void adoptNullItem(const SerializableMap& from, SerializableMap& to) {
-    static_cast<A::DefaultEntries&>(to) = from;
-    A::entries(to) = A::Entries();
+void copyLevel(const SerializableMap& from, SerializableMap& to, CopySteps& steps) {
+    const EntryView entries = viewOf(from);
+    fillEntries(
+            A::entries(to), A::size(from),
+            [&](size_t i) -> const std::string& { return entries.key(i); },
+            [&](size_t i) { return copyOf(entries.value(i), steps); });
 }
 
-// A copy of a flat container first shares its buffer. Editing an element then makes the platform copy
-// all of them at once, without the cost of inserting them one by one.
-
-void copyFlat(const SerializableMap& from, SerializableMap& to) {
-    static_cast<A::DefaultEntries&>(to) = from;
-    A::entries(to).editValueAt(0);
-}
-
-void copyFlat(const SerializableMapArray& from, SerializableMapArray& to) {
-    A::elements(to) = A::elements(from);
-    A::elements(to).editItemAt(0);
-}
-
-void copyKeys(const SerializableMap& from, SerializableMap& to) {
-    adoptNullItem(from, to);
-    appendEmpty(to, A::size(from), [&from](size_t i) { return A::entries(from).keyAt(i); });
-}
-
-void copyKeys(const SerializableMapArray& from, SerializableMapArray& to) {
-    appendEmpty(to, A::size(from));
-}
-
-/// Gives `to`, a null value, a new container of the kind that `from` holds, to be filled later.
-void copyShell(const SerializableValue& from, SerializableValue& to, CopySteps& steps) {
-    A::type(to) = A::type(from);
-    if (A::type(from) == VALUE_TYPE_OBJECT) {
-        A::map(to) = new SerializableMap;
-        steps.push_back({A::map(from), A::map(to), nullptr, nullptr});
-    } else {
-        A::array(to) = new SerializableMapArray;
-        steps.push_back({nullptr, nullptr, A::array(from), A::array(to)});
-    }
-}
-
-template <typename Container>
-void copyLevel(const Container& from, Container& to, CopySteps& steps) {
-    const size_t count = A::size(from);
-    if (count != 0 && isFlat(from)) return copyFlat(from, to);
-    copyKeys(from, to);
-    for (size_t i = 0; i < count; ++i) {
-        const SerializableValue& value = A::at(from, i);
-        if (holdsContainer(value)) {
-            copyShell(value, A::edit(to, i), steps);
-        } else {
-            SerializableValue copy(value);
-            A::edit(to, i).swap(copy);
-        }
-    }
+void copyLevel(const SerializableMapArray& from, SerializableMapArray& to, CopySteps& steps) {
+    const ElementView elements = viewOf(from);
+    fillElements(A::elements(to), A::size(from),
+                 [&](size_t i) { return copyOf(elements.value(i), steps); });
 }
 
 void runCopySteps(CopySteps& steps) {
     while (!steps.empty()) {
-        const CopyStep step = steps.back();
-        steps.pop_back();
+        const CopyStep step = steps.pop();
         if (step.fromMap != nullptr) {
+            static_cast<A::DefaultEntries&>(*step.toMap) = *step.fromMap;  // for the null item
             copyLevel(*step.fromMap, *step.toMap, steps);
         } else {
             copyLevel(*step.fromArray, *step.toArray, steps);
@@ -118,15 +89,19 @@ void runCopySteps(CopySteps& steps) {
 
 template <typename Container>
 void orphanNested(Container& container, Orphans& orphans) {
-    for (size_t i = 0; i < A::size(container); ++i) {
-        if (!holdsContainer(A::at(container, i))) continue;
-        SerializableValue& value = A::edit(container, i);
+    const size_t count = A::size(container);
+    const auto items = viewOf(container);
+    size_t i = 0;
+    while (i < count && !holdsContainer(items.value(i))) ++i;
+    if (i == count) return;
+    const auto editor = editorOf(container);
+    for (; i < count; ++i) {
+        SerializableValue& value = editor.value(i);
+        if (!holdsContainer(value)) continue;
         if (A::type(value) == VALUE_TYPE_OBJECT) {
-            orphans.push_back({A::map(value), nullptr});
-            A::map(value) = nullptr;
+            orphans.push({std::exchange(A::map(value), nullptr), nullptr});
         } else {
-            orphans.push_back({nullptr, A::array(value)});
-            A::array(value) = nullptr;
+            orphans.push({nullptr, std::exchange(A::array(value), nullptr)});
         }
     }
 }
@@ -136,8 +111,7 @@ void destroyNestedOf(Container& container) {
     Orphans orphans;
     orphanNested(container, orphans);
     while (!orphans.empty()) {
-        const Orphan orphan = orphans.back();
-        orphans.pop_back();
+        const Orphan orphan = orphans.pop();
         if (orphan.map != nullptr) {
             orphanNested(*orphan.map, orphans);
             delete orphan.map;
@@ -188,11 +162,6 @@ void destroyNested(SerializableMap& map) {
 
 void destroyNested(SerializableMapArray& array) {
     destroyNestedOf(array);
-}
-
-void appendEmpty(SerializableMapArray& array, size_t count) {
-    A::elements(array).setCapacity(count);
-    A::elements(array).insertAt(defaultValue(), 0, count);
 }
 
 }  // namespace pemaro

@@ -129,6 +129,11 @@ class ZELK_API SerializableValue {
   private:
     friend struct ValueAccess;
 
+    /// Takes over what is given, unchecked, and the text that `makeText` returns.
+    template <typename MakeText>
+    ZELK_LOCAL SerializableValue(uint32_t type, SerializableMap* map, SerializableMapArray* array,
+                                 SerializableBlob* blob, MakeText makeText);
+
     uint32_t mType;
     SerializableMap* mMap;
     SerializableMapArray* mArray;
