@@ -47,7 +47,7 @@ std::string command() {
            "\"REQUEST\":\"DEBUG\",\"SESSION\":12345,\"VERSION\":3}";
 }
 
-/// Modules of groups of parameters, an array in each group: some 70 KB.
+/// Modules of groups of parameters: some 70 KB.
 std::string nestedMaps(int modules) {
     std::string text = "{";
     for (int module = 0; module < modules; ++module) {
@@ -55,16 +55,38 @@ std::string nestedMaps(int modules) {
         snprintf(head, sizeof(head), "%s\"module_%04d\":{", module == 0 ? "" : ",", module);
         text += head;
         for (int group = 0; group < 4; ++group) {
-            char entry[160];
+            char entry[200];
             snprintf(entry, sizeof(entry),
-                     "%s\"group_%d\":{\"enabled\":true,\"gain\":%d.500000,\"name\":\"channel %d\","
-                     "\"taps\":[%d,%d,3,4],\"threshold_low\":-%d}",
-                     group == 0 ? "" : ",", group, module, group, group, module, module + group);
+                     "%s\"group_%d\":{\"calibration_offset\":-%d,\"enabled\":true,"
+                     "\"gain\":%d.500000,\"name\":\"channel %d\",\"threshold_high\":%d,"
+                     "\"threshold_low\":-%d}",
+                     group == 0 ? "" : ",", group, module * 3, module, group, module + 300,
+                     module + group);
             text += entry;
         }
         text += '}';
     }
     return text + "}";
+}
+
+/// Gestures of strokes of points: maps and short arrays in turn, some 70 KB.
+std::string gestures(int count) {
+    std::string text = "{\"gestures\":[";
+    for (int gesture = 0; gesture < count; ++gesture) {
+        char head[64];
+        snprintf(head, sizeof(head), "%s{\"id\":%d,\"strokes\":[", gesture == 0 ? "" : ",",
+                 gesture);
+        text += head;
+        for (int stroke = 0; stroke < 4; ++stroke) {
+            char entry[160];
+            snprintf(
+                    entry, sizeof(entry), "%s{\"from\":[%d,%d],\"pressure\":0.%06d,\"to\":[%d,%d]}",
+                    stroke == 0 ? "" : ",", gesture, stroke * 7, gesture * 31, stroke, gesture * 5);
+            text += entry;
+        }
+        text += "]}";
+    }
+    return text + "]}";
 }
 
 std::string strings(int count, size_t length) {
@@ -108,7 +130,8 @@ const std::vector<Payload>& payloads() {
             {"flat", flat(ascending(1000), kLongKey)},
             {"random", flat(shuffled(1000), kLongKey)},
             {"short", flat(ascending(1000), kShortKey)},
-            {"nested", nestedMaps(180)},
+            {"nested", nestedMaps(130)},
+            {"mixed", gestures(280)},
             {"strings", strings(16, 4096)},
             {"array", numbers(10000)},
             {"flat1M", flat(ascending(29000), kLongKey)},

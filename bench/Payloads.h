@@ -13,7 +13,8 @@ struct Payload {
 };
 
 /// A command's request, flat configurations (of sorted and of shuffled keys, of long and of short
-/// ones), nested maps, long strings, an image's worth of numbers, and a mebibyte of configuration.
+/// ones), maps of maps, maps and arrays in turn, long strings, an image's worth of numbers, and a
+/// mebibyte of configuration.
 const std::vector<Payload>& payloads();
 
 /// The payload of that name.

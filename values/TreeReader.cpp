@@ -29,8 +29,9 @@
 
 #include <algorithm>
 #include <cstring>
-#include <vector>
+#include <memory>
 
+#include "values/EntrySorter.h"
 #include "values/TextScan.h"
 #include "values/ValueAccess.h"
 #include "values/VectorStorage.h"
@@ -48,25 +49,14 @@ bool isOpenBracket(char c) {
     return kTextClasses.is(c, kOpensNested);
 }
 
+/// Whether the keys, which have at least one character each, are in order and not equal.
+inline bool ascends(const ReadItem& a, const ReadItem& b) {
+    const auto first = static_cast<unsigned char>(a.text().front());
+    const auto second = static_cast<unsigned char>(b.text().front());
+    return first != second ? first < second : a.text() < b.text();
+}
+
 }  // namespace
-
-inline SerializableValue TreeReader::Item::value() const {
-    switch (type()) {
-        case VALUE_TYPE_OBJECT:
-            return ValueAccess::make(VALUE_TYPE_OBJECT, mMap, nullptr, nullptr);
-        case VALUE_TYPE_ARRAY:
-            return ValueAccess::make(VALUE_TYPE_ARRAY, nullptr, mArray, nullptr);
-        case VALUE_TYPE_NULL:
-            return ValueAccess::make(VALUE_TYPE_NULL, nullptr, nullptr, nullptr);
-        default:
-            return ValueAccess::make(type(), [&] { return std::string(text()); });
-    }
-}
-
-void TreeReader::Item::destroyContainer() const {
-    if (type() == VALUE_TYPE_OBJECT) delete mMap;
-    if (type() == VALUE_TYPE_ARRAY) delete mArray;
-}
 
 TreeReader::TreeReader(const char* text)
         : mText(text),
@@ -80,7 +70,7 @@ TreeReader::TreeReader(const char* text)
           mReading(false) {}
 
 TreeReader::~TreeReader() {
-    for (const Item& item : mItems) item.destroyContainer();
+    for (const ReadItem& item : mItems) item.destroyContainer();
 }
 
 bool TreeReader::read(SerializableMap& result) {
@@ -159,7 +149,7 @@ TreeReader::Step TreeReader::readEntries(bool atFirstKey) {
         }
         const char* const start = skipSpaces(found.colon + 1, end);
         if (start >= end) return Step::kClosed;
-        mItems.push(Item(found.key, VALUE_TYPE_STRING));
+        mItems.push(ReadItem(found.key, VALUE_TYPE_STRING));
         if (isOpenBracket(*start)) return openNested(start);
         at = readScalar(start);
     }
@@ -192,11 +182,11 @@ void TreeReader::closeNested() {
     if (*closed.end == '}') {
         SerializableMap* const map = new SerializableMap;
         fill(*map, closed.firstItem);
-        mItems.push(Item(map));
+        mItems.push(ReadItem(map));
     } else {
         SerializableMapArray* const array = new SerializableMapArray;
         fill(*array, closed.firstItem);
-        mItems.push(Item(array));
+        mItems.push(ReadItem(array));
     }
     mEnd = mLevels.top().end;
     mLimit = mLevels.size() == 1 ? mTextEnd : mEnd + 1;
@@ -224,7 +214,7 @@ inline const char* TreeReader::readScalar(const char* start) {
     const char* const end = findTokenEnd(start);
     if (end == nullptr) {
         logReadError("pemaro: ERROR");
-        mItems.push(Item({}, VALUE_TYPE_NULL));
+        mItems.push(ReadItem({}, VALUE_TYPE_NULL));
         return start;
     }
     const char* trimmed = end;
@@ -235,7 +225,7 @@ inline const char* TreeReader::readScalar(const char* start) {
         text.remove_prefix(1);
         if (!text.empty()) text.remove_suffix(1);
     }
-    mItems.push(Item(text, type));
+    mItems.push(ReadItem(text, type));
     return end;
 }
 
@@ -279,170 +269,40 @@ bool TreeReader::readingAt(const char* at) {
 }
 
 void TreeReader::fill(SerializableMap& map, size_t firstItem) {
-    Entry* const entries = reinterpret_cast<Entry*>(mItems.begin() + firstItem);
+    const ReadEntry* entries = reinterpret_cast<const ReadEntry*>(mItems.begin() + firstItem);
     size_t count = (mItems.size() - firstItem) / 2;
-    for (size_t i = 1; i < count; ++i) {
-        if (entries[i - 1].key.text() < entries[i].key.text()) continue;
-        count = sortEntries(entries, count);
-        break;
+    size_t ascending = 1;
+    while (ascending < count && ascends(entries[ascending - 1].key, entries[ascending].key)) {
+        ++ascending;
     }
+    std::unique_ptr<ReadEntry[]> sorted;
+    if (ascending < count) {
+        sorted.reset(new ReadEntry[count]);
+        count = EntrySorter(entries, count, mTextEnd).sortInto(sorted.get());
+        entries = sorted.get();
+        mItems.shrinkToFit(firstItem);
+    }
+    const bool fetch = sorted != nullptr && count >= kManyEntries;
     fillEntries(
-            ValueAccess::entries(map), count, [&](size_t i) { return entries[i].key.text(); },
+            ValueAccess::entries(map), count,
+            [&](size_t i) {
+                if (fetch) {
+                    // These texts are taken from all over what is read.
+                    const ReadEntry& next = entries[std::min(i + kFetchAhead, count - 1)];
+                    __builtin_prefetch(next.key.address());
+                    __builtin_prefetch(next.value.address());
+                }
+                return entries[i].key.text();
+            },
             [&](size_t i) { return entries[i].value.value(); });
     mItems.shrink(firstItem);
 }
 
 void TreeReader::fill(SerializableMapArray& array, size_t firstItem) {
-    const Item* const items = mItems.begin() + firstItem;
+    const ReadItem* const items = mItems.begin() + firstItem;
     fillElements(ValueAccess::elements(array), mItems.size() - firstItem,
                  [&](size_t i) { return items[i].value(); });
     mItems.shrink(firstItem);
-}
-
-// ---- sorting -------------------------------------------------------------------------------------
-
-/// The first eight bytes in which keys may differ, as a number in the same order, and which of the
-/// entries has that key. Keys have no NUL, so that what is missing of eight counts as less.
-struct TreeReader::KeyRecord {
-    uint64_t prefix;
-    size_t index;
-};
-
-/// Sorts many entries by moving small records of them: by the prefixes, digit by digit, and where
-/// these are equal by the keys themselves.
-class TreeReader::EntrySorter {
-  public:
-    EntrySorter(const Entry* entries, size_t count, const char* textEnd);
-
-    /// Copies the entries to `to` in the order of their keys, of equal keys only the last, and
-    /// returns how many these are. Destroys the containers of those that it leaves out.
-    size_t sortInto(Entry* to);
-
-  private:
-    static constexpr size_t kFewRecords = 128;
-
-    size_t commonPrefix() const;
-    uint64_t prefixOf(std::string_view key) const;
-    std::string_view restOf(const KeyRecord& record) const;
-    bool less(const KeyRecord& a, const KeyRecord& b) const;
-    void sort(KeyRecord* from, KeyRecord* to);
-    void sortByPrefix();
-    void sortEqualPrefixes();
-
-    const Entry* const mEntries;
-    const size_t mCount;
-    const char* const mTextEnd;
-    const size_t mCommon;  ///< bytes with which all keys begin
-    std::vector<KeyRecord> mRecords;
-};
-
-TreeReader::EntrySorter::EntrySorter(const Entry* entries, size_t count, const char* textEnd)
-        : mEntries(entries), mCount(count), mTextEnd(textEnd), mCommon(commonPrefix()) {
-    mRecords.reserve(count);
-    for (size_t i = 0; i < count; ++i) mRecords.push_back({prefixOf(entries[i].key.text()), i});
-}
-
-size_t TreeReader::EntrySorter::commonPrefix() const {
-    const std::string_view first = mEntries[0].key.text();
-    size_t common = first.size();
-    for (size_t i = 1; i < mCount && common != 0; ++i) {
-        const std::string_view key = mEntries[i].key.text();
-        common = std::min(common, key.size());
-        if (memcmp(key.data(), first.data(), common) == 0) continue;
-        common = static_cast<size_t>(
-                std::mismatch(key.begin(), key.begin() + common, first.begin()).first -
-                key.begin());
-    }
-    return common;
-}
-
-uint64_t TreeReader::EntrySorter::prefixOf(std::string_view key) const {
-    key.remove_prefix(mCommon);
-    uint64_t prefix = 0;
-    if (mTextEnd - key.data() >= static_cast<ptrdiff_t>(sizeof(prefix))) {
-        memcpy(&prefix, key.data(), sizeof(prefix));
-        prefix = __builtin_bswap64(prefix);
-        if (key.size() < sizeof(prefix)) prefix &= ~(~uint64_t{0} >> 8 * key.size());
-    } else {
-        for (size_t i = 0; i < sizeof(prefix); ++i) {
-            prefix = prefix << 8 | (i < key.size() ? static_cast<unsigned char>(key[i]) : 0);
-        }
-    }
-    return prefix;
-}
-
-std::string_view TreeReader::EntrySorter::restOf(const KeyRecord& record) const {
-    const std::string_view key = mEntries[record.index].key.text();
-    return key.substr(std::min(key.size(), mCommon + sizeof(record.prefix)));
-}
-
-bool TreeReader::EntrySorter::less(const KeyRecord& a, const KeyRecord& b) const {
-    if (a.prefix != b.prefix) return a.prefix < b.prefix;
-    const int order = restOf(a).compare(restOf(b));
-    return order != 0 ? order < 0 : a.index < b.index;
-}
-
-void TreeReader::EntrySorter::sort(KeyRecord* from, KeyRecord* to) {
-    const auto inOrder = [this](const KeyRecord& a, const KeyRecord& b) { return less(a, b); };
-    // What is in order already, as many times the same key, is not sorted again.
-    if (!std::is_sorted(from, to, inOrder)) std::sort(from, to, inOrder);
-}
-
-/// Sorts the records by their prefixes and leaves those of equal ones in the order of the text.
-void TreeReader::EntrySorter::sortByPrefix() {
-    uint64_t differing = 0;
-    for (const KeyRecord& record : mRecords) differing |= record.prefix ^ mRecords[0].prefix;
-    std::vector<KeyRecord> sorted(mCount);
-    for (size_t shift = 0; shift < 64; shift += 8) {
-        if ((differing >> shift & 0xff) == 0) continue;
-        size_t places[256] = {};
-        for (const KeyRecord& record : mRecords) ++places[record.prefix >> shift & 0xff];
-        size_t sum = 0;
-        for (size_t& place : places) sum += std::exchange(place, sum);
-        for (const KeyRecord& record : mRecords) {
-            sorted[places[record.prefix >> shift & 0xff]++] = record;
-        }
-        mRecords.swap(sorted);
-    }
-}
-
-void TreeReader::EntrySorter::sortEqualPrefixes() {
-    KeyRecord* const end = mRecords.data() + mCount;
-    for (KeyRecord* from = mRecords.data(); from != end;) {
-        KeyRecord* to = from + 1;
-        while (to != end && to->prefix == from->prefix) ++to;
-        sort(from, to);
-        from = to;
-    }
-}
-
-size_t TreeReader::EntrySorter::sortInto(Entry* to) {
-    if (mCount < kFewRecords) {
-        sort(mRecords.data(), mRecords.data() + mCount);
-    } else {
-        sortByPrefix();
-        sortEqualPrefixes();
-    }
-    size_t kept = 0;
-    for (size_t i = 0; i < mCount; ++i) {
-        const Entry& entry = mEntries[mRecords[i].index];
-        if (i + 1 < mCount && mRecords[i].prefix == mRecords[i + 1].prefix &&
-            restOf(mRecords[i]) == restOf(mRecords[i + 1])) {
-            entry.value.destroyContainer();
-        } else {
-            to[kept++] = entry;
-        }
-    }
-    return kept;
-}
-
-/// Puts the entries in the order of their keys, keeping the last of equal ones, and returns how many
-/// are kept.
-size_t TreeReader::sortEntries(Entry* entries, size_t count) {
-    std::vector<Entry> sorted(count);
-    const size_t kept = EntrySorter(entries, count, mTextEnd).sortInto(sorted.data());
-    std::copy_n(sorted.begin(), kept, entries);
-    return kept;
 }
 
 }  // namespace pemaro

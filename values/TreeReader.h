@@ -6,6 +6,7 @@
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
 #include "values/BracketIndex.h"
+#include "values/ReadItem.h"
 #include "values/WorkStack.h"
 
 namespace pemaro {
@@ -24,38 +25,6 @@ class TreeReader {
     bool read(SerializableMapArray& result);
 
   private:
-    /// What was read and waits for its container to be complete: a key, a scalar's text with its
-    /// tag, or a map or array. Texts are views into what is read.
-    class Item {
-      public:
-        Item() = default;
-        Item(std::string_view text, int type)
-                : mText(text.data()),
-                  mLengthAndType(text.size() << 8 | static_cast<size_t>(type)) {}
-        explicit Item(SerializableMap* map) : mMap(map), mLengthAndType(VALUE_TYPE_OBJECT) {}
-        explicit Item(SerializableMapArray* array)
-                : mArray(array), mLengthAndType(VALUE_TYPE_ARRAY) {}
-
-        std::string_view text() const { return {mText, mLengthAndType >> 8}; }
-        unsigned type() const { return mLengthAndType & 0xff; }
-        SerializableValue value() const;
-        void destroyContainer() const;
-
-      private:
-        union {
-            const char* mText;
-            SerializableMap* mMap;
-            SerializableMapArray* mArray;
-        };
-        size_t mLengthAndType;
-    };
-    struct Entry {
-        Item key;
-        Item value;
-    };
-    struct KeyRecord;
-    class EntrySorter;
-
     /// A map or an array that is being read.
     struct Level {
         const char* end;   ///< its closing bracket
@@ -80,7 +49,6 @@ class TreeReader {
     bool isDeadStart(const char* start);
     bool readingAt(const char* at);
 
-    size_t sortEntries(Entry* entries, size_t count);
     void fill(SerializableMap& map, size_t firstItem);
     void fill(SerializableMapArray& array, size_t firstItem);
 
@@ -92,7 +60,7 @@ class TreeReader {
     const char* mEnd;
     const char* mLimit;
     WorkStack<Level, 16> mLevels;
-    WorkStack<Item, 48> mItems;
+    WorkStack<ReadItem, 48> mItems;
     BracketIndex mBrackets;
 
     // Of the two readings of the text (see BracketIndex), up to where each is known to have nothing
