@@ -43,6 +43,10 @@ vm --timeout|--timeout needs a number
 vm --timeout 0 true|'0' is not a number of seconds
 vm --timeout=1h true|'1h' is not a number of seconds
 vm --verbose true|unknown option '--verbose'
+fuzz nothing|unknown target 'nothing'
+fuzz --seconds|--seconds needs a number
+fuzz --seconds 1h|'1h' is not a number of seconds
+fuzz --fast|unknown option '--fast'
 clean everything|clean takes no argument but --all
 ROWS
 }

@@ -21,13 +21,19 @@ std::ostream& operator<<(std::ostream& out, const Tree& tree) {
 
 namespace {
 
+// A value that was made of a text and a container's tag holds no container, which is an empty one.
+template <typename Container>
+Tree treeOfHeld(const Container* held) {
+    return reference::treeOf(held != nullptr ? *held : Container());
+}
+
 Tree treeOf(const SerializableValue& value) {
     Tree tree;
     switch (ValueAccess::type(value)) {
         case VALUE_TYPE_OBJECT:
-            return reference::treeOf(*ValueAccess::map(value));
+            return treeOfHeld(ValueAccess::map(value));
         case VALUE_TYPE_ARRAY:
-            return reference::treeOf(*ValueAccess::array(value));
+            return treeOfHeld(ValueAccess::array(value));
         default:
             tree.type = static_cast<int>(ValueAccess::type(value));
             tree.text = ValueAccess::text(value);

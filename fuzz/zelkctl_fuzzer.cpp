@@ -1,0 +1,162 @@
+// SPDX-License-Identifier: Apache-2.0
+
+// What zelkctl and the simulated stack read from users, files and frames: numbers and lists of them, orders of
+// faults, configurations, files of gestures and recorded frames.
+
+#include <fcntl.h>
+#include <fuzzer/FuzzedDataProvider.h>
+#include <rapidjson/document.h>
+#include <sys/mman.h>
+#include <unistd.h>
+
+#include <cctype>
+#include <cerrno>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <string>
+#include <vector>
+
+#include "frames/Frame.h"
+#include "fuzz/support/ParcelInput.h"
+#include "simulator/companion/Configuration.h"
+#include "simulator/faults/Fault.h"
+#include "tools/zelkctl/files/ConfigFile.h"
+#include "tools/zelkctl/files/GestureFile.h"
+#include "tools/zelkctl/services/FrameReceiver.h"
+#include "tools/zelkctl/terminal/Json.h"
+#include "tools/zelkctl/terminal/Number.h"
+
+namespace {
+
+using namespace pemaro;
+
+/// A file in memory with these bytes.
+class File {
+  public:
+    explicit File(const std::string& bytes) : mFd(memfd_create("input", MFD_CLOEXEC)) {
+        fuzz::expect(write(mFd, bytes.data(), bytes.size()) == static_cast<ssize_t>(bytes.size()),
+                     "the file was not written");
+    }
+    ~File() { close(mFd); }
+    File(const File&) = delete;
+    File& operator=(const File&) = delete;
+
+    std::string path() const { return "/proc/self/fd/" + std::to_string(mFd); }
+
+  private:
+    const int mFd;
+};
+
+void checkNumber(const std::string& text) {
+    const auto number = zelkctl::parseNumber(text, zelkctl::kAny32);
+    errno = 0;
+    char* end = nullptr;
+    const long long expected = strtoll(text.c_str(), &end, 0);
+    const bool whole = !text.empty() && isspace(static_cast<unsigned char>(text[0])) == 0 &&
+                       end == text.c_str() + text.size() && errno == 0 && expected >= INT32_MIN &&
+                       expected <= UINT32_MAX;
+    fuzz::expect(number.has_value() == whole && (!whole || *number == expected), "another number");
+}
+
+void checkJson(const std::string& name, const std::string& value) {
+    zelkctl::JsonObject object;
+    object.add("x" + name, value)
+            .add("list", std::vector<std::string>{value, name})
+            .add("number", 3);
+    rapidjson::Document read;
+    read.Parse(object.text().c_str());
+    fuzz::expect(!read.HasParseError() && read.IsObject() && read["number"].GetInt() == 3,
+                 "what was written is no JSON");
+}
+
+void checkFault(const std::string& text) {
+    std::string problem;
+    const auto fault = simulator::Fault::parse(text, &problem);
+    fuzz::expect(fault.has_value() == problem.empty(), "a refusal without a reason");
+}
+
+void checkConfiguration(const std::string& bytes) {
+    simulator::Configuration configuration;
+    const std::string before = configuration.toBinary();
+    const bool read = configuration.fromBinary(bytes.data(), bytes.size()) == 0;
+    fuzz::expect(read || configuration.toBinary() == before, "a failure changed something");
+    if (!fuzz::isFatalText(bytes.c_str())) {
+        const std::string now = configuration.toBinary();
+        const bool loaded = configuration.load(File(bytes).path()) == 0;
+        fuzz::expect(loaded || configuration.toBinary() == now, "a failure changed something");
+    }
+}
+
+void checkFiles(const std::string& bytes, size_t limit) {
+    const File file(bytes);
+    std::string read;
+    const zelkctl::FileResult result = zelkctl::readConfigFile(file.path(), limit, read);
+    fuzz::expect(result.isGood() == (bytes.size() <= limit), "a size that was misjudged");
+    fuzz::expect(!result.isGood() || read == bytes, "a file was read as another");
+}
+
+// About as many bytes as a few records have.
+void checkGestures(uint32_t number) {
+    constexpr size_t kRecord = sizeof(IGestureManagerClient::GestureData);
+    constexpr size_t kMost = 3;
+    const size_t size = number % 6 * kRecord + number / 6 % 3;
+    std::vector<IGestureManagerClient::GestureData> records;
+    const std::string problem =
+            zelkctl::readGestures(File(std::string(size, 'r')).path(), kMost, records);
+    const bool good = size > 0 && size % kRecord == 0 && size / kRecord <= kMost;
+    fuzz::expect(problem.empty() == good, "records that were misjudged");
+    fuzz::expect(!good || records.size() == size / kRecord, "another number of records");
+}
+
+void checkFrame(const std::string& bytes, uint32_t packet) {
+    frames::FrameHeader header;
+    frames::readFrameHeader(bytes.data(), bytes.size(), &header);
+    const char* fault = frames::frameFault(bytes.data(), bytes.size());
+    fuzz::touch(fault, fault == nullptr ? 0 : 1);
+    // A packet's bytes are always there.
+    std::string frame = bytes;
+    frame.resize(packet);
+    zelkctl::FrameReceiver receiver(nullptr, 0);
+    receiver.setPacketSize(packet);
+    uint32_t length = 0;
+    if (packet >= 12) {
+        memcpy(&length, &frame[8], sizeof(length));
+    }
+    zelkctl::FrameReceiver::onFrame(0, frame.data(), length, &receiver);
+    fuzz::expect(receiver.stats().frames + receiver.stats().corrupt == 1, "a frame is missing");
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+    FuzzedDataProvider input(data, size);
+    const int reader = input.ConsumeIntegralInRange(0, 6);
+    const auto number = input.ConsumeIntegralInRange<uint32_t>(0, 4096);
+    const std::string first = input.ConsumeRandomLengthString(64);
+    const std::string rest = input.ConsumeRemainingBytesAsString();
+    switch (reader) {
+        case 0:
+            checkNumber(first.c_str());
+            break;
+        case 1:
+            checkJson(first.c_str(), rest);
+            break;
+        case 2:
+            checkFault(first);
+            break;
+        case 3:
+            checkConfiguration(rest);
+            break;
+        case 4:
+            checkFiles(rest, number);
+            break;
+        case 5:
+            checkGestures(number);
+            break;
+        default:
+            checkFrame(rest, number);
+            break;
+    }
+    return 0;
+}
