@@ -15,6 +15,9 @@ PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev va
 PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev mandoc)
 # What makes Debian packages, looks at them and finds them used; the tests do so as well.
 PACKAGES_PACKAGING=(dpkg-dev debhelper lintian pkg-config)
+# What the Android tree is given is formatted and compiled by these: bpfmt, the policy's compilers, and the
+# compiler for 64-bit Arm.
+PACKAGES_ANDROID=(blueprint-tools checkpolicy secilc g++-aarch64-linux-gnu)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 
