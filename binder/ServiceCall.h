@@ -6,6 +6,7 @@
 #include <functional>
 #include <utility>
 
+#include "binder/Guard.h"
 #include "pemaro/Binder.h"
 #include "pemaro/Status.h"
 
@@ -27,8 +28,8 @@ struct CallFailure {
 template <typename Service, typename Operation, typename... Arguments>
 int callService(const CallFailure& failure, const android::sp<Service>& service,
                 Operation&& operation, Arguments&&... arguments) {
-    // Kept for the call, during which a callback on this thread may let go of the service.
-    const android::sp<Service> held = service;
+    // Kept for the call, during which another thread or a callback may let go of the service.
+    const android::sp<Service> held = copyGuarded(service);
     const int status = held == nullptr ? STATUS_INVALID_STATE
                                        : std::invoke(std::forward<Operation>(operation), *held,
                                                      std::forward<Arguments>(arguments)...);

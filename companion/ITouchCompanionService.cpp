@@ -278,7 +278,13 @@ int BpTouchCompanionService::getConfigParams(SerializableMap& params) {
 int BpTouchCompanionService::setConfigParams(const void* data, size_t size) {
     Call call(kSetConfigBinary);
     call.request.writeInt32(static_cast<int32_t>(size));
-    call.request.write(data, size);
+    // A parcel that refuses bytes may say so, or only leave them out.
+    const size_t begin = call.request.dataPosition();
+    if (size > std::numeric_limits<int32_t>::max() || call.request.write(data, size) != NO_ERROR ||
+        call.request.dataPosition() - begin < size) {
+        ALOGE(kSetConfigBinary.remoteError, errStr(STATUS_DATA_EXCEEDS_BUFFER));
+        return STATUS_DATA_EXCEEDS_BUFFER;
+    }
     return call.transactForStatus(remote());
 }
 

@@ -17,6 +17,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "companion/ClientFailure.h"
 #include "companion/ResultText.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
@@ -24,6 +25,8 @@
 namespace pemaro {
 
 namespace {
+
+using Service = ITouchCompanionService;
 
 constexpr char kDebugCommand[] = "DEBUG_COMMAND";
 constexpr char kPropertyCommand[] = "PROPERTY_COMMAND";
@@ -122,20 +125,11 @@ int TouchCompanionClient::getToolCmdValue(char* text, int& value) {
 }
 
 int TouchCompanionClient::sendCommand(SerializableMap& request, SerializableMap& response) {
-    if (mService == nullptr) {
-        return STATUS_INVALID_STATE;
-    }
-    int status = mService->sendCommand(request, response);
-    if (status != STATUS_NO_ERROR) {
-        ALOGE("sendCommand failed");
-    }
-    return status;
+    return callService(clientFailure("sendCommand failed"), mService, &Service::sendCommand,
+                       request, response);
 }
 
 int TouchCompanionClient::sendCommand(const char* command, char** result) {
-    if (mService == nullptr) {
-        return STATUS_INVALID_STATE;
-    }
     ALOGD("sendCommand: char E");
     if (command == nullptr) {
         ALOGD("sendCommand: req null");
@@ -158,7 +152,7 @@ int TouchCompanionClient::sendCommand(const char* command, char** result) {
 
     SerializableMap request = makeRequest(kDebugCommand, "SEND_COMMAND", parameters);
     SerializableMap response;
-    int status = mService->sendCommand(request, response);
+    int status = callService(kUnloggedFailure, mService, &Service::sendCommand, request, response);
     if (status == STATUS_NO_ERROR) {
         status = readCommandResponse(response, result);
     }
@@ -188,15 +182,12 @@ int TouchCompanionClient::readCommandResponse(SerializableMap& response, char** 
 
 // The number under "RESULTS" is only logged: the filter is set whatever it says.
 int TouchCompanionClient::setRecordFilter(unsigned int mask) {
-    if (mService == nullptr) {
-        return STATUS_INVALID_STATE;
-    }
     ALOGD("setRecordFilter: E");
     SerializableMap parameters;
     parameters.add("MASK", mask);
     SerializableMap request = makeRequest(kDebugCommand, "SET_RECORD_FILTER", parameters);
     SerializableMap response;
-    int status = mService->sendCommand(request, response);
+    int status = callService(kUnloggedFailure, mService, &Service::sendCommand, request, response);
     if (status == STATUS_NO_ERROR) {
         int result = 0;
         status = getResultFromResponseCmd(response, result, kDebugCommand);
@@ -209,9 +200,6 @@ int TouchCompanionClient::setRecordFilter(unsigned int mask) {
 }
 
 int TouchCompanionClient::setProperty(const char* name, const char* value) {
-    if (mService == nullptr) {
-        return STATUS_INVALID_STATE;
-    }
     ALOGD("setProperty: char E");
     if (name == nullptr || value == nullptr) {
         ALOGD("setProperty: name or value null");
@@ -236,7 +224,7 @@ int TouchCompanionClient::setProperty(const char* name, const char* value) {
 
     SerializableMap request = makeRequest(kPropertyCommand, "STR_SET_ROLLINGLOG_SIZE", parameters);
     SerializableMap response;
-    int status = mService->sendCommand(request, response);
+    int status = callService(kUnloggedFailure, mService, &Service::sendCommand, request, response);
     ALOGD("setProperty: char X retval =%d", status);
     return status;
 }

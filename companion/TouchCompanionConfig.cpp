@@ -6,61 +6,51 @@
 
 #include <log/log.h>
 
-#include "binder/ServiceCall.h"
+#include "companion/ClientFailure.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
 
 namespace pemaro {
 
-namespace {
-
 using Service = ITouchCompanionService;
 
-constexpr CallFailure failure(const char* text) {
-    return {LOG_TAG, text, WithoutService::Quiet};
-}
-
-constexpr CallFailure kUnlogged = failure(nullptr);
-
-}  // namespace
-
 int TouchCompanionClient::sendEvent(eventType type, eventParam param) {
-    return callService(failure("sendEvent failed"), mService, &Service::sendEvent,
+    return callService(clientFailure("sendEvent failed"), mService, &Service::sendEvent,
                        static_cast<int>(type), static_cast<int>(param));
 }
 
 int TouchCompanionClient::reloadConfig(const std::string* path) {
-    return callService(failure("reloadConfig failed"), mService, &Service::reloadConfig, path);
+    return callService(clientFailure("reloadConfig failed"), mService, &Service::reloadConfig,
+                       path);
 }
 
 int TouchCompanionClient::saveConfig(const std::string* path) {
-    return callService(failure("saveConfig failed"), mService, &Service::saveConfig, path);
+    return callService(clientFailure("saveConfig failed"), mService, &Service::saveConfig, path);
 }
 
 int TouchCompanionClient::setConfigParams(const void* data, size_t size) {
-    return callService(failure("setConfigParams (binary) failed"), mService,
+    return callService(clientFailure("setConfigParams (binary) failed"), mService,
                        &Service::setConfigParams, data, size);
 }
 
 int TouchCompanionClient::getConfigParams(void* buffer, size_t* len) {
-    if (mService == nullptr) {
-        return STATUS_INVALID_STATE;
-    }
     if (len == nullptr) {
         ALOGE("Error: len cannot be null!");
         return STATUS_NULL_POINTER;
     }
-    const size_t length = mService->getConfigParams(buffer, *len);
-    if (length == 0) {
-        ALOGE("getConfigParams (binary) failed");
-        return STATUS_UNKNOWN_ERROR;
-    }
-    if (*len != 0 && length > *len) {
-        ALOGE("something went wrong! returned len should not be larger than expected len.");
-        return STATUS_UNKNOWN_ERROR;
-    }
-    *len = length;
-    return STATUS_NO_ERROR;
+    return callService(kUnloggedFailure, mService, [&](Service& service) {
+        const size_t length = service.getConfigParams(buffer, *len);
+        if (length == 0) {
+            ALOGE("getConfigParams (binary) failed");
+            return STATUS_UNKNOWN_ERROR;
+        }
+        if (*len != 0 && length > *len) {
+            ALOGE("something went wrong! returned len should not be larger than expected len.");
+            return STATUS_UNKNOWN_ERROR;
+        }
+        *len = length;
+        return STATUS_NO_ERROR;
+    });
 }
 
 int TouchCompanionClient::getConfigParams(SerializableMap& params) {
@@ -69,38 +59,34 @@ int TouchCompanionClient::getConfigParams(SerializableMap& params) {
         ALOGD("params map is empty...no config values were retrieved");
         return STATUS_NO_ERROR;
     }
-    return callService(kUnlogged, mService,
+    return callService(kUnloggedFailure, mService,
                        [&](Service& service) { return service.getConfigParams(params); });
 }
 
 int TouchCompanionClient::getPacketSize() {
-    return callService(kUnlogged, mService, &Service::getPacketSize);
+    return callService(kUnloggedFailure, mService, &Service::getPacketSize);
 }
 
 int TouchCompanionClient::inspect(unsigned int* value) {
-    return callService(kUnlogged, mService, &Service::inspect, value);
+    return callService(kUnloggedFailure, mService, &Service::inspect, value);
 }
 
 int TouchCompanionClient::saveSession(int& sessionID) {
-    return callService(kUnlogged, mService, [&](Service& service) {
-        ALOGD("saveSession E %d", sessionID);
-        int status = service.saveSession(sessionID);
-        ALOGD("saveSession X= %d", status);
-        return status;
-    });
+    ALOGD("saveSession E %d", sessionID);
+    int status = callService(kUnloggedFailure, mService, &Service::saveSession, sessionID);
+    ALOGD("saveSession X= %d", status);
+    return status;
 }
 
 int TouchCompanionClient::restoreSession(int sessionID) {
-    return callService(kUnlogged, mService, [&](Service& service) {
-        ALOGD("restoreSession E %d", sessionID);
-        int status = service.restoreSession(sessionID);
-        ALOGD("restoreSession X= %d", status);
-        return status;
-    });
+    ALOGD("restoreSession E %d", sessionID);
+    int status = callService(kUnloggedFailure, mService, &Service::restoreSession, sessionID);
+    ALOGD("restoreSession X= %d", status);
+    return status;
 }
 
 int TouchCompanionClient::setAuth(const char* auth) {
-    return callService(failure("setAuth failed"), mService,
+    return callService(clientFailure("setAuth failed"), mService,
                        [&](Service& service) { return service.setAuth(std::string(auth)); });
 }
 

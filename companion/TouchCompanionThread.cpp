@@ -1,20 +1,87 @@
 // SPDX-License-Identifier: Apache-2.0
+#define LOG_TAG "TouchCompanionClient"
+
 #include "companion/TouchCompanionThread.h"
 
-#include "pemaro/TouchCompanionClient.h"
+#include <log/log.h>
+#include <time.h>
 
 namespace pemaro {
 
-TouchCompanionThread::TouchCompanionThread(TouchCompanionClient& client)
-        : android::Thread(true /* canCallJava */), mClient(client) {}
+namespace {
+
+constexpr nsecs_t kMillisecond = 1000000;
+
+// A wait takes 16 ms. One that takes so much longer waits for somebody who is dead.
+constexpr nsecs_t kOverdue = 1000 * kMillisecond;
+
+// How often end() looks whether the thread still runs where nothing tells it.
+constexpr nsecs_t kLook = 10 * kMillisecond;
+
+// Between passes over a ring that paces nothing by itself.
+constexpr nsecs_t kPause = 16 * kMillisecond;
+
+int64_t now() {
+    timespec time;
+    clock_gettime(CLOCK_MONOTONIC, &time);
+    return time.tv_sec * int64_t{1000000000} + time.tv_nsec;
+}
+
+}  // namespace
+
+TouchCompanionThread::TouchCompanionThread(const MappedBlock& block,
+                                           FrameDelivery::DataCallback callback, void* context)
+        : android::Thread(true /* canCallJava */), mDelivery(block, callback, context, this) {}
 
 void TouchCompanionThread::requestExit() {
     android::Thread::requestExit();
+    android::AutoMutex lock(mStateLock);
+    mStateChanged.broadcast();
+}
+
+void TouchCompanionThread::end() {
+    requestExit();
+    {
+        android::AutoMutex lock(mStateLock);
+        if (mHasSelf && pthread_equal(mSelf, pthread_self()) != 0) {
+            return;
+        }
+        while (isRunning()) {
+            if (mWaitingSince != 0 && now() - mWaitingSince > kOverdue) {
+                mLeftBehind = true;
+                ALOGE("the recording thread is left behind: a wait in the shared memory does not "
+                      "end");
+                return;
+            }
+            mStateChanged.waitRelative(mStateLock, kLook);
+        }
+    }
+    requestExitAndWait();
 }
 
 bool TouchCompanionThread::threadLoop() {
-    mClient.processData();
-    return true;
+    {
+        android::AutoMutex lock(mStateLock);
+        mSelf = pthread_self();
+        mHasSelf = true;
+    }
+    mDelivery.pass(mStatistics);
+    android::AutoMutex lock(mStateLock);
+    if (mDelivery.isStuck() && !exitPending()) {
+        mStateChanged.waitRelative(mStateLock, kPause);
+    }
+    return !mLeftBehind;
+}
+
+void TouchCompanionThread::waitBegins() {
+    android::AutoMutex lock(mStateLock);
+    mWaitingSince = now();
+}
+
+bool TouchCompanionThread::waitEnded() {
+    android::AutoMutex lock(mStateLock);
+    mWaitingSince = 0;
+    return !mLeftBehind;
 }
 
 }  // namespace pemaro

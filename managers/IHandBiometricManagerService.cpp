@@ -149,14 +149,15 @@ int BpHandBiometricManagerService::getProfileList(std::vector<std::string>& name
     }
     const int32_t count = call.reply.readInt32();
     for (int32_t i = 0; i < count; ++i) {
-        const char* name = call.reply.readCString();
+        // The last number of a reply is the status: its bytes must not become a name.
+        const bool onlyStatus = call.reply.dataAvail() <= sizeof(int32_t);
+        const char* name = onlyStatus ? nullptr : call.reply.readCString();
         if (name == nullptr) {
             return STATUS_CORRUPT_DATA;
         }
         ALOGD("Bp::getProfileList pName is %s", name);
         names.emplace_back(name);
     }
-    // The bytes of the status read as a name where the reply is one name short.
     if (count > 0 && call.reply.dataAvail() < sizeof(int32_t)) {
         return STATUS_CORRUPT_DATA;
     }

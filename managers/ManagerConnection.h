@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include "binder/Guard.h"
 #include "binder/Log.h"
 #include "binder/ServiceLookup.h"
 #include "pemaro/Binder.h"
@@ -16,7 +17,9 @@ namespace pemaro {
 //   orphaned    flag on, service dead    the service's process died; deinit() leads back to idle
 //
 // (A touch manager client keeps the service when subscribing failed, and is not told of a death.)
-// Nothing is locked: see the clients' headers for what must not coincide.
+// Both are reached by the caller's threads and by Binder's, and are copied and replaced under the
+// guard of Guard.h; a call goes to a copy. An operation that overlaps with deinit() reaches the
+// service or finds none held.
 
 /// What distinguishes the connection of one client class from that of another. The texts of a
 /// client that does not watch its service are null where they are about that.
@@ -46,19 +49,19 @@ class ManagerConnection {
         if (binder == nullptr) {
             return STATUS_ERROR_ACQUIRING_RESOURCE;
         }
-        int status = hold(binder);
-        if (status != STATUS_NO_ERROR) {
-            return status;
+        const android::sp<Service> service = hold(binder);
+        if (service == nullptr) {
+            return STATUS_BAD_PARAMETER;
         }
-        status = mService->subscribe(mSelf);
+        int status = service->subscribe(mSelf);
         if (status != STATUS_NO_ERROR) {
-            mService.clear();
+            letGo(service);
             return refused(status);
         }
         if (binder->linkToDeath(watcher, nullptr, 0) != android::NO_ERROR) {
             logText(ANDROID_LOG_ERROR, mTexts.tag, mTexts.linkFailed);
-            unsubscribe();
-            mService.clear();
+            service->unsubscribe(mSelf);
+            letGo(service);
             return STATUS_UNKNOWN_ERROR;
         }
         return connected();
@@ -66,14 +69,15 @@ class ManagerConnection {
 
     // ---- the steps of init() ----
 
-    /// Keeps the service behind `binder`, in place of any that was held.
-    int hold(const android::sp<android::IBinder>& binder) {
-        mService = Service::asInterface(binder);
-        if (mService == nullptr) {
+    /// Keeps the service behind `binder`, in place of any that was held, and returns it; null, with
+    /// the reason logged, when the binder is none.
+    android::sp<Service> hold(const android::sp<android::IBinder>& binder) {
+        android::sp<Service> service = Service::asInterface(binder);
+        exchangeGuarded(mService, service);
+        if (service == nullptr) {
             logText(ANDROID_LOG_ERROR, mTexts.tag, "wrong service interface?");
-            return STATUS_BAD_PARAMETER;
         }
-        return STATUS_NO_ERROR;
+        return service;
     }
 
     int refused(int status) {
@@ -83,7 +87,7 @@ class ManagerConnection {
 
     /// Success is logged as an error so that it shows in every log.
     int connected() {
-        mInitialized = true;
+        exchangeGuarded(mInitialized, true);
         logText(ANDROID_LOG_ERROR, mTexts.tag, mTexts.connected);
         return STATUS_NO_ERROR;
     }
@@ -93,14 +97,16 @@ class ManagerConnection {
     /// `watcher` is the one of initWatched(), null where there is none.
     int deinit(DeathRecipient* watcher) {
         logText(ANDROID_LOG_DEBUG, mTexts.tag, "deinit: E");
-        if (mInitialized && mService != nullptr) {
-            unsubscribe();
-            android::sp<android::IBinder> binder = android::IInterface::asBinder(mService);
+        const android::sp<Service> service = copyGuarded(mService);
+        if (copyGuarded(mInitialized) && service != nullptr) {
+            service->unsubscribe(mSelf);
+            android::sp<android::IBinder> binder = android::IInterface::asBinder(service);
             if (binder != nullptr && watcher != nullptr) {
                 binder->unlinkToDeath(watcher, nullptr, 0, nullptr);
             }
-            mService.clear();
-            mInitialized = false;
+            if (letGo(service)) {
+                exchangeGuarded(mInitialized, false);
+            }
         }
         logText(ANDROID_LOG_DEBUG, mTexts.tag, "deinit: X");
         return STATUS_NO_ERROR;
@@ -116,18 +122,24 @@ class ManagerConnection {
         }
         if (context == nullptr) {
             logText(ANDROID_LOG_ERROR, mTexts.tag, "JNI context is null...unsubscribing client");
-            unsubscribe();
+            const android::sp<Service> service = copyGuarded(mService);
+            if (service != nullptr) {
+                service->unsubscribe(mSelf);
+            }
             return false;
         }
         return true;
     }
 
   private:
-    void unsubscribe() {
-        android::sp<Service> service = mService;
-        if (service != nullptr) {
-            service->unsubscribe(mSelf);
+    /// False when another init() has put another service in its place.
+    bool letGo(android::sp<Service> service) {
+        ClientGuard guard;
+        if (mService != service) {
+            return false;
         }
+        mService.clear();  // the caller holds it still
+        return true;
     }
 
     const ManagerTexts& mTexts;

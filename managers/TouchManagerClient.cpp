@@ -5,6 +5,7 @@
 
 #include <log/log.h>
 
+#include "binder/Guard.h"
 #include "binder/ServiceCall.h"
 #include "managers/ManagerConnection.h"
 #include "pemaro/Status.h"
@@ -29,6 +30,7 @@ TouchManagerClient::GestureCallback TouchManagerClient::mCallback = nullptr;
 void* TouchManagerClient::mCtx = nullptr;
 
 TouchManagerClient::TouchManagerClient(GestureCallback callback, void* ctx) : TouchManagerClient() {
+    ClientGuard guard;
     mCallback = callback;
     mCtx = ctx;
 }
@@ -52,12 +54,12 @@ int TouchManagerClient::init() {
     if (binder == nullptr) {
         return STATUS_ERROR_ACQUIRING_RESOURCE;
     }
-    int status = connection.hold(binder);
-    if (status != STATUS_NO_ERROR) {
-        return status;
+    const sp<Service> service = connection.hold(binder);
+    if (service == nullptr) {
+        return STATUS_BAD_PARAMETER;
     }
     ALOGD("before subscribe: mTchMgrClient ref count = %d", getStrongCount());
-    status = mService->subscribe(this);
+    int status = service->subscribe(this);
     ALOGD("after subscribe: mTchMgrClient ref count = %d", getStrongCount());
     return status == STATUS_NO_ERROR ? connection.connected() : connection.refused(status);
 }
@@ -94,8 +96,15 @@ int TouchManagerClient::configure_vm_region(Rect& region, bool flag) {
 int TouchManagerClient::gestureCallback(ITouchManagerClient::GestureData* data) {
     Connection connection(kTexts, mInitialized, mService, this);
     ALOGE("Gesture event detected (client address = %p)", this);
-    if (connection.accepts(mCallback, mCtx, "callback is null")) {
-        mCallback(data, mCtx);
+    GestureCallback callback;
+    void* context;
+    {
+        ClientGuard guard;  // for both: another client's constructor replaces the pair
+        callback = mCallback;
+        context = mCtx;
+    }
+    if (connection.accepts(callback, context, "callback is null")) {
+        callback(data, context);
     }
     return STATUS_NO_ERROR;
 }

@@ -22,6 +22,8 @@ class ZELK_API BnTouchCompanionService : public android::BnInterface<ITouchCompa
     ///   - a binary configuration transfer returns 0x40000006 when its buffer cannot be allocated,
     ///     0x40000000 when the bytes cannot be read or there are none, and 0x4000000A when the
     ///     configuration does not fit the caller's buffer.
+    /// These results are positive, and the driver sends a result only when it is negative: a caller
+    /// in another process receives what the reply holds at that point, and success.
     android::status_t onTransact(uint32_t code, const android::Parcel& data, android::Parcel* reply,
                                  uint32_t flags = 0) override;
 };

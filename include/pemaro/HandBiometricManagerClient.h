@@ -33,8 +33,9 @@ namespace pemaro {
 /// Every operation is one synchronous Binder call on the caller's thread and returns a status of
 /// Status.h: 0, the service's own status unchanged, 0x40000000 when the transaction failed, or
 /// 0x4000000B when the client holds no service (before init(), after deinit()). Failures are
-/// logged. The client takes no lock: deinit() and destruction must not coincide with a callback
-/// on another thread. Log tag: "HandBiometricManagerClient".
+/// logged. Operations, events, init() and deinit() may come from several threads at once; no lock
+/// is held while one calls. A callback that runs when deinit() is called may still run when that
+/// has returned, so what `ctx` points to must outlive it. Log tag: "HandBiometricManagerClient".
 class ZELK_API HandBiometricManagerClient : public BnHandBiometricManagerClient,
                                             public android::IBinder::DeathRecipient {
   public:
@@ -51,11 +52,11 @@ class ZELK_API HandBiometricManagerClient : public BnHandBiometricManagerClient,
     /// A client without callbacks and context, whose events are dropped.
     HandBiometricManagerClient();
 
-    /// Looks the service up, in ten attempts with half a second of sleep after each that failed,
-    /// subscribes and watches for the service's death. 0x4000000A: no service manager or no such
-    /// service; 0x4000000D: the binder found is no hand biometric manager; 0x40000000: the service
-    /// cannot be watched; else what subscribing returned. A further call looks up and subscribes
-    /// again.
+    /// Looks the service up, subscribes and watches for the service's death. 0x4000000A: no service
+    /// manager or no such service; 0x4000000D: the binder found is no hand biometric manager;
+    /// 0x40000000: the service cannot be watched; else what subscribing returned. A further call
+    /// looks up and subscribes again. How long an absent service takes is told at
+    /// GestureManagerClient::init().
     int init();
 
     /// Unsubscribes and ends the watch, if init() had succeeded, and lets go of the service. Always

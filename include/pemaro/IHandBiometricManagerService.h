@@ -70,8 +70,8 @@ class ZELK_API IHandBiometricManagerService : public android::IInterface {
     virtual int getMaxUser(unsigned int& count) = 0;
 
     /// Appends the names of all profiles to `names`, which keeps what it held. A proxy returns
-    /// 0x4000001D, and appends what it could read, when the reply held fewer names than it
-    /// announced.
+    /// 0x4000001D when the reply holds fewer names than it announces, or no status behind them; the
+    /// names before that are appended, and the four bytes of a status never are.
     virtual int getProfileList(std::vector<std::string>& names) = 0;
 
     /// Lets a hand wake the device.

@@ -31,7 +31,8 @@ class ZELK_API ITouchCompanionService : public android::IInterface {
     virtual int registerClient(const android::sp<ITouchCompanionClient>& client) = 0;
 
     /// Forgets the calling process's client. The stub answers with the status as the result of the
-    /// transaction, so that a failure reaches a proxy's caller as 0x40000000.
+    /// transaction, and the driver carries negative results alone: through a proxy this is 0
+    /// whatever the service returned, unless the transaction itself failed.
     virtual int unregisterClient() = 0;
 
     /// Opens the service for the registered client.
@@ -72,14 +73,17 @@ class ZELK_API ITouchCompanionService : public android::IInterface {
     /// bytes.
     ///
     /// 0 is any failure. With a `size` of 0 nothing is read: the result is the length that a buffer
-    /// needs. Through a proxy, a buffer that is too small yields 0, because the stub fails the
-    /// transaction.
+    /// needs. Through a proxy, a buffer that is too small stays as it was and yields the length
+    /// too: the stub's failure does not cross the driver, what it wrote before does. (Where stub
+    /// and proxy meet in one process, it yields 0.)
     virtual size_t getConfigParams(void* buffer, size_t size) = 0;
 
     /// Reads configuration values: `params` names the wanted keys and receives their values.
     virtual int getConfigParams(SerializableMap& params) = 0;
 
-    /// Replaces the binary configuration by the `size` bytes at `data`.
+    /// Replaces the binary configuration by the `size` bytes at `data`. A proxy returns 0x4000001A,
+    /// without a call, for more bytes than a request can hold. A stub that finds fewer bytes than
+    /// announced, or no memory for them, answers nothing, which a proxy reads as 0.
     virtual int setConfigParams(const void* data, size_t size) = 0;
 
     /// Fills `out` with the service's properties.

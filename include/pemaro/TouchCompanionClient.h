@@ -18,6 +18,7 @@
 namespace pemaro {
 
 class TouchCompanionThread;
+struct MappedBlock;
 
 /// Kinds and parameters of TouchCompanionClient::sendEvent(); the service alone defines their
 /// values.
@@ -41,15 +42,21 @@ enum eventParam : int32_t {};
 /// Every operation is one synchronous Binder call on the caller's thread unless told otherwise, and
 /// returns a status of Status.h: 0, the service's own status unchanged, 0x40000000 when the
 /// transaction failed, or 0x4000000B when the client holds no service (before init(), or after an
-/// init() that found none). The client takes no lock: calls may come from several threads, but
-/// init(), startRecord(), stopRecord() and destruction exclude one another. Log tag:
-/// "TouchCompanionClient".
+/// init() that found none). What an operation requires of its caller is looked at first, and the
+/// service is missed when it is to be called. Calls may come from several threads, at once too; the
+/// client holds no lock while it calls. Log tag: "TouchCompanionClient".
+///
+/// A service may die or misbehave at any point of a recording. The library waits for it in the
+/// shared memory for no longer than a second before it gives up on the recording's thread: that is
+/// left behind, with an error in the log, when the client stops or is destroyed.
 class ZELK_API TouchCompanionClient : public android::RefBase {
   public:
     /// Receives a recorded frame on the client's recording thread: (0, frame, bytes, context).
     /// `frame` lies in the shared ring and is valid until the callback returns; `bytes` is the
-    /// length in the frame's own header, the unsigned 32-bit number at byte 8. The callback must
-    /// not stop the recording or drop the client's last reference.
+    /// length in the frame's own header, the unsigned 32-bit number at byte 8, which the service
+    /// alone vouches for. A whole packet at `frame` is mapped, in memory that the service can write
+    /// to at any time; a frame that would lie outside of it is delivered as the first byte of the
+    /// ring with 0 bytes. The callback may drop the client's last reference, and no frame follows.
     using DataCallback = void (*)(int, void*, unsigned long, void*);
 
     /// A contiguous run of frames in the ring.
@@ -86,11 +93,14 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
 
     /// Starts a recording. With output 1 the service's block is mapped and, if there is a data
     /// callback, a thread delivers the frames from before the service starts until stopRecord().
-    /// 0x4000000D: no output was chosen; 0x4000000A: the service gave no usable block.
+    /// 0x4000000D: no output was chosen; 0x4000000A: the service gave no block, or one that is too
+    /// small, mapped read-only or misaligned, of which the last two are logged.
     int startRecord();
 
-    /// Ends a recording: first the thread, then the service, then the block. When the service
-    /// refuses, its status is returned and the block stays mapped.
+    /// Ends a recording: first the thread, then the service, then the block. It waits for a
+    /// callback that runs, however long that takes, and not for a thread whose wait in the shared
+    /// memory does not end. When the service refuses, its status is returned and the block stays
+    /// mapped. From within the callback it only asks the thread to end.
     int stopRecord();
 
     /// Does nothing and returns 0.
@@ -159,7 +169,8 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     /// Makes the service write its configuration, as reloadConfig() reads it.
     int saveConfig(const std::string* path);
 
-    /// Replaces the service's binary configuration by `size` bytes.
+    /// Replaces the service's binary configuration by `size` bytes. 0x4000001A, without a call, for
+    /// more than a request can hold.
     int setConfigParams(const void* data, size_t size);
 
     /// Reads the binary configuration. `*len` is the capacity of `buffer` in bytes and receives the
@@ -192,12 +203,10 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     ~TouchCompanionClient() override;
 
   private:
-    ZELK_LOCAL int mapBlock();
-    ZELK_LOCAL void startThread();
+    ZELK_LOCAL int mapBlock(ITouchCompanionService& service, MappedBlock& block);
+    ZELK_LOCAL MappedBlock mappedBlock() const;
+    ZELK_LOCAL void startThread(const MappedBlock& block);
     ZELK_LOCAL void endThread();
-    ZELK_LOCAL int waitForFrames(uint32_t& write, uint32_t& available);
-    ZELK_LOCAL uint32_t frameLength(const void* frame) const;
-    ZELK_LOCAL void countFrame();
     ZELK_LOCAL int readCommandResponse(SerializableMap& response, char** result);
 
     bool mInitialized = false;

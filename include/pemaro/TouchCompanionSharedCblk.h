@@ -15,7 +15,7 @@ namespace pemaro {
 /// little-endian:
 ///
 ///   offset  size  field          written by
-///        0    40  mutex          both (guards only the wait on `cond`)
+///        0    40  mutex          the service, if it likes; the client never takes it
 ///       40    48  cond           both; the service signals it after adding frames
 ///       88     4  read           client: frames consumed since the start
 ///       92     4  write          service: frames produced since the start

@@ -30,8 +30,10 @@ namespace pemaro {
 /// Every operation is one synchronous Binder call on the caller's thread and returns a status of
 /// Status.h: 0, the service's own status unchanged, 0x40000000 when the transaction failed, or
 /// 0x4000000B when the client holds no service (before init(), after deinit()). Failures are
-/// logged. The client takes no lock: deinit(), destruction and the construction of another client
-/// with another callback must not coincide with a gesture. Log tag: "TouchManagerClient".
+/// logged. Operations, events, init() and deinit() may come from several threads at once; no lock
+/// is held while one calls. A callback that runs when deinit() is called, or when another client
+/// replaces it, may still run when that has returned, so what `ctx` points to must outlive it. Log
+/// tag: "TouchManagerClient".
 class ZELK_API TouchManagerClient : public BnTouchManagerClient {
   public:
     /// Receives a gesture on a Binder thread: (record, context). The record is valid until the

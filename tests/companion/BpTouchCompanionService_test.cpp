@@ -629,6 +629,20 @@ TEST_F(TouchCompanionProxyAndStub, CarriesTheBinaryConfigurationBothWays) {
     EXPECT_EQ(config, mService->receivedConfig);
 }
 
+// The first is more than a length on the wire can tell, the second more than a parcel holds.
+TEST_F(TouchCompanionProxyAndStub, RefusesABinaryConfigurationThatCannotBeSent) {
+    const char first = 0;  // nothing of it is read
+    for (size_t size : {size_t{INT32_MAX} + 1, size_t{INT32_MAX}, SIZE_MAX}) {
+        clearLog();
+        EXPECT_EQ(STATUS_DATA_EXCEEDS_BUFFER, mProxy->setConfigParams(&first, size)) << size;
+        EXPECT_THAT(linesOf(kTag),
+                    ElementsAre("D Bp::setConfigParams(binary)",
+                                "E setConfigParams() (binary) error: Data size exceeds size of "
+                                "buffer"));
+    }
+    EXPECT_THAT(mService->calls(), ::testing::IsEmpty());
+}
+
 TEST_F(TouchCompanionProxyAndStub, YieldsZeroForABinaryConfigurationThatDoesNotFit) {
     mService->config = {1, 2, 3, 4, 5};
     Bytes config(4);

@@ -149,16 +149,42 @@ TEST_F(TouchCompanionClientTest, HasNothingToPingBeforeInit) {
 
 // ---- without a service ----
 
+// What an operation needs is looked at before the service, which is missed only when it is called.
 struct Operation {
     const char* name;
     std::function<int(TouchCompanionClient&)> call;
+    int status;
+    Lines lines;
 };
 
 const Operation kOperations[] = {
-        {"setRecordOutput", [](auto& c) { return c.setRecordOutput(1); }},
-        {"setRecordFile", [](auto& c) { return c.setRecordFile("/f"); }},
-        {"startRecord", [](auto& c) { return c.startRecord(); }},
-        {"stopRecord", [](auto& c) { return c.stopRecord(); }},
+        {"setRecordOutput", [](auto& c) { return c.setRecordOutput(1); }, STATUS_INVALID_STATE, {}},
+        {"setRecordFileWithoutOutput",
+         [](auto& c) { return c.setRecordFile("/f"); },
+         STATUS_BAD_PARAMETER,
+         {"E setRecordFile can be called only with OUTPUT_FILE option"}},
+        {"setRecordFile",
+         [](auto& c) {
+             c.setRecordOutput(0);
+             return c.setRecordFile("/f");
+         },
+         STATUS_INVALID_STATE,
+         {}},
+        {"startRecordWithoutOutput",
+         [](auto& c) { return c.startRecord(); },
+         STATUS_BAD_PARAMETER,
+         {"E recording parameter is wrong(-1)"}},
+        {"startRecord",
+         [](auto& c) {
+             c.setRecordOutput(1);
+             return c.startRecord();
+         },
+         STATUS_INVALID_STATE,
+         {}},
+        {"stopRecord",
+         [](auto& c) { return c.stopRecord(); },
+         STATUS_INVALID_STATE,
+         {"D stopRecord: E", "D stopRecord: call stopRecord on remote side"}},
 };
 
 class TouchCompanionClientWithoutService : public TouchCompanionClientTest,
@@ -168,23 +194,27 @@ INSTANTIATE_TEST_SUITE_P(EveryOperation, TouchCompanionClientWithoutService,
                          ::testing::ValuesIn(kOperations),
                          [](const auto& info) { return info.param.name; });
 
-TEST_P(TouchCompanionClientWithoutService, IsInAnInvalidState) {
-    const sp<TouchCompanionClient> client = new TouchCompanionClient;
-    EXPECT_EQ(STATUS_INVALID_STATE, GetParam().call(*client)) << "before init()";
-    EXPECT_THAT(clientLines(), IsEmpty());
+TEST_P(TouchCompanionClientWithoutService, LooksAtWhatItNeedsAndMissesTheServiceThen) {
+    sp<TouchCompanionClient> client = new TouchCompanionClient;
+    EXPECT_EQ(GetParam().status, GetParam().call(*client)) << "before init()";
+    EXPECT_EQ(GetParam().lines, clientLines());
 
     mServices->remove("pemaro.TouchService");
+    client = new TouchCompanionClient;
     client->init();
     clearLog();
-    EXPECT_EQ(STATUS_INVALID_STATE, GetParam().call(*client)) << "after an init() that found none";
-    EXPECT_THAT(clientLines(), IsEmpty());
+    EXPECT_EQ(GetParam().status, GetParam().call(*client)) << "after an init() that found none";
+    EXPECT_EQ(GetParam().lines, clientLines());
 }
 
-TEST_F(TouchCompanionClientTest, DoesNotKeepAnOutputChosenBeforeInit) {
+// It is stored before the service is told, of which this one then has heard nothing.
+TEST_F(TouchCompanionClientTest, KeepsAnOutputChosenBeforeInit) {
     const sp<TouchCompanionClient> client = new TouchCompanionClient;
-    client->setRecordOutput(1);
+    EXPECT_EQ(STATUS_INVALID_STATE, client->setRecordOutput(0));
     EXPECT_EQ(0, client->init());
-    EXPECT_EQ(STATUS_BAD_PARAMETER, client->startRecord());
+    mService->clearCalls();
+    EXPECT_EQ(0, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "startRecord"));
 }
 
 // ---- destruction ----

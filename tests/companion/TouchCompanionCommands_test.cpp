@@ -462,14 +462,42 @@ TEST_F(TouchCompanionCommands, RefusedRequestIsAnError) {
 
 // ---- without a service ----
 
-TEST(TouchCompanionCommandsUnconnected, EveryCommandSaysThatThereIsNoService) {
+// What a command needs is looked at before the service, which is missed only when it is called.
+TEST(TouchCompanionCommandsUnconnected, EveryCommandMissesTheServiceWhenItIsCalled) {
     const sp<TouchCompanionClient> client = new TouchCompanionClient;
     clearLog();
     EXPECT_EQ((Answer{0x4000000B, kUntouched}), send(client, "status"));
-    EXPECT_EQ((Answer{0x4000000B, kUntouched}), send(client, nullptr));
+    EXPECT_THAT(linesOf(kClientTag),
+                ElementsAre("D sendCommand: char E", "D sendCommand:: req = status\n",
+                            "D sendCommand: char X retval =1073741835"));
+
+    clearLog();
+    EXPECT_EQ((Answer{0x40000000, kUntouched}), send(client, nullptr));
+    EXPECT_THAT(linesOf(kClientTag),
+                ElementsAre("D sendCommand: char E", "D sendCommand: req null"));
+
+    clearLog();
     EXPECT_EQ(0x4000000B, client->setRecordFilter(1));
+    EXPECT_THAT(linesOf(kClientTag),
+                ElementsAre("D setRecordFilter: E", "D setRecordFilter: X retval =1073741835"));
+
+    clearLog();
     EXPECT_EQ(0x4000000B, client->setProperty("setRollingLogSize", "5"));
-    EXPECT_EQ(0x4000000B, client->setProperty("other", nullptr));
+    EXPECT_THAT(linesOf(kClientTag),
+                ElementsAre("D setProperty: char E",
+                            "D setProperty:: name = setRollingLogSize, value =5\n",
+                            "D setProperty: char X retval =1073741835"));
+
+    clearLog();
+    EXPECT_EQ(0x40000005, client->setProperty("other", "5"));
+    EXPECT_EQ(0x40000005, client->setProperty("other", nullptr));
+    EXPECT_EQ(0x40000005, client->setProperty(nullptr, "5"));
+    EXPECT_THAT(linesOf(kClientTag),
+                ElementsAre("D setProperty: char E", "D setProperty:: name = other, value =5\n",
+                            "D setProperty: char E", "D setProperty: name or value null",
+                            "D setProperty: char E", "D setProperty: name or value null"));
+
+    clearLog();
     SerializableMap request;
     SerializableMap response;
     EXPECT_EQ(0x4000000B, client->sendCommand(request, response));

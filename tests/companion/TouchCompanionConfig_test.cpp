@@ -203,17 +203,28 @@ TEST_F(TouchCompanionConfig, SuccessIsSilentButForSessions) {
 
 TEST(TouchCompanionConfigUnconnected, EachOperationSaysThatThereIsNoService) {
     const sp<TouchCompanionClient> client = new TouchCompanionClient;
-    clearLog();
     for (const Operation& operation : operations()) {
         SCOPED_TRACE(operation.what);
+        clearLog();
         EXPECT_EQ(0x4000000B, operation.call(*client));
+        if (operation.service == "saveSession") {
+            EXPECT_THAT(linesOf(kClientTag),
+                        ElementsAre("D saveSession E 5", "D saveSession X= 1073741835"));
+        } else if (operation.service == "restoreSession") {
+            EXPECT_THAT(linesOf(kClientTag),
+                        ElementsAre("D restoreSession E 7", "D restoreSession X= 1073741835"));
+        } else {
+            EXPECT_THAT(linesOf(kClientTag), IsEmpty());
+        }
     }
+    clearLog();
     EXPECT_EQ(0x4000000B, client->getPacketSize());
     size_t length = 1;
     EXPECT_EQ(0x4000000B, client->getConfigParams(&length, &length));
     EXPECT_EQ(1u, length);
-    EXPECT_EQ(0x4000000B, client->getConfigParams(nullptr, nullptr));
     EXPECT_THAT(linesOf(kClientTag), IsEmpty());
+    EXPECT_EQ(0x4000001B, client->getConfigParams(nullptr, nullptr));
+    EXPECT_THAT(linesOf(kClientTag), ElementsAre("E Error: len cannot be null!"));
 }
 
 TEST(TouchCompanionConfigUnconnected, AskingForNothingSucceeds) {

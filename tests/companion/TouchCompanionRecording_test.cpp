@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
+#include <cerrno>
 #include <cstdio>
 #include <cstring>
 #include <string>
@@ -198,6 +199,37 @@ TEST_F(TouchCompanionRecording, FailsWhenTheMemoryIsTooSmallForABlock) {
     EXPECT_THAT(mService->calls(), Not(Contains("startRecord")));
 }
 
+// The client writes its own address into the block.
+TEST_F(TouchCompanionRecording, RefusesABlockThatItCannotWriteTo) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(1);
+    forget();
+    mService->cblk = LocalMemory::readOnly(1000);
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk"));
+    EXPECT_THAT(clientLines(),
+                ElementsAre("E shared control block cannot be used: it is mapped read-only"));
+}
+
+TEST_F(TouchCompanionRecording, RefusesABlockThatTheConditionCannotWorkIn) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    client->setRecordOutput(1);
+    for (size_t offset : {1, 2, 4, 7}) {
+        forget();
+        const sp<LocalMemory> memory = LocalMemory::atOffset(offset, 1000);
+        mService->cblk = memory;
+        EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord()) << offset;
+        EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk"));
+        EXPECT_THAT(clientLines(),
+                    ElementsAre(withAddress("E shared control block cannot be used: %p is not "
+                                            "aligned to 8 bytes",
+                                            memory->bytes())));
+    }
+    mService->cblk = LocalMemory::atOffset(8, 1000);
+    EXPECT_EQ(0, client->startRecord());
+    EXPECT_EQ(0, client->stopRecord());
+}
+
 // What was set up before the failure stays: the thread runs until the recording is stopped.
 TEST_F(TouchCompanionRecording, PassesARefusedStartOnAndGoesOnDelivering) {
     const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
@@ -269,6 +301,190 @@ TEST_F(TouchCompanionRecording, EndsTheThreadBeforeTheServiceIsToldToStop) {
     });
     EXPECT_EQ(0, client->stopRecord());
     EXPECT_EQ(1u, mFrames.count());
+}
+
+// ---- a service that died ----
+
+// A wait in the block that does not end, as one whose words a dead writer has left locked.
+class StuckWait {
+  public:
+    explicit StuckWait(FakeWaits& waits) {
+        waits.onWait([this](int) {
+            std::unique_lock<std::mutex> lock(mLock);
+            mEntered = true;
+            mChanged.notify_all();
+            mChanged.wait(lock, [this] { return mReleased; });
+            mLeft = true;
+            mChanged.notify_all();
+        });
+    }
+
+    bool waitUntilEntered() {
+        std::unique_lock<std::mutex> lock(mLock);
+        return mChanged.wait_for(lock, kPatience, [this] { return mEntered; });
+    }
+
+    /// Returns when the thread is out of it.
+    bool release() {
+        std::unique_lock<std::mutex> lock(mLock);
+        mReleased = true;
+        mChanged.notify_all();
+        return mChanged.wait_for(lock, kPatience, [this] { return mLeft; });
+    }
+
+  private:
+    std::mutex mLock;
+    std::condition_variable mChanged;
+    bool mEntered = false;
+    bool mReleased = false;
+    bool mLeft = false;
+};
+
+constexpr char kLeftBehind[] =
+        "E the recording thread is left behind: a wait in the shared memory does not end";
+
+// The mapping stays as long as the thread is in there, and no longer.
+bool isLetGo(const sp<LocalMemory>& memory, int32_t references) {
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+    while (memory->getStrongCount() > references && std::chrono::steady_clock::now() < giveUp) {
+        usleep(1000);
+    }
+    return memory->getStrongCount() == references;
+}
+
+TEST_F(TouchCompanionRecording, StopsAlthoughTheThreadsWaitDoesNotEnd) {
+    StuckWait stuck(mWaits);
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    ASSERT_TRUE(stuck.waitUntilEntered());
+    const auto before = std::chrono::steady_clock::now();
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_LT(std::chrono::steady_clock::now() - before, kPatience / 2);
+    EXPECT_THAT(clientLines(), Contains(kLeftBehind));
+    EXPECT_THAT(mService->calls(), ElementsAre("stopRecord"));
+
+    // Of what it left behind the client knows nothing more: a frame finds no callback.
+    mService->cblk = nullptr;
+    EXPECT_LT(1, mRing.memory()->getStrongCount());
+    mRing.put();
+    ASSERT_TRUE(stuck.release());
+    EXPECT_TRUE(isLetGo(mRing.memory(), 1));
+    EXPECT_EQ(0u, mFrames.count());
+}
+
+TEST_F(TouchCompanionRecording, IsDestroyedAlthoughTheThreadsWaitDoesNotEnd) {
+    StuckWait stuck(mWaits);
+    sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    ASSERT_TRUE(stuck.waitUntilEntered());
+    client.clear();
+    EXPECT_THAT(clientLines(), Contains(kLeftBehind));
+    EXPECT_THAT(mService->calls(), ElementsAre("unregisterClient"));
+    mService->cblk = nullptr;
+    mRing.put();
+    ASSERT_TRUE(stuck.release());
+    EXPECT_TRUE(isLetGo(mRing.memory(), 1));
+    EXPECT_EQ(0u, mFrames.count());
+}
+
+// A callback is never overtaken, however long it takes.
+TEST_F(TouchCompanionRecording, WaitsForACallbackThatTakesItsTime) {
+    struct Slow {
+        std::atomic<bool> entered{false};
+        std::atomic<bool> returned{false};
+
+        static void callback(int, void*, unsigned long, void* context) {
+            Slow& slow = *static_cast<Slow*>(context);
+            slow.entered = true;
+            usleep(1200000);  // longer than a wait may be overdue
+            slow.returned = true;
+        }
+    };
+    Slow slow;
+    const sp<TouchCompanionClient> client = record(mRing, Slow::callback, &slow);
+    mRing.put();
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+    while (!slow.entered && std::chrono::steady_clock::now() < giveUp) {
+        usleep(1000);
+    }
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_TRUE(slow.returned);
+    EXPECT_THAT(clientLines(), Not(Contains(kLeftBehind)));
+}
+
+// The shared mutex may be held for ever by a service that died, or be none at all.
+TEST_F(TouchCompanionClientTest, DoesNotTouchTheSharedMutex) {
+    FrameRing ring(8, 64);
+    memset(&ring.cblk().mutex, 0xff, sizeof(ring.cblk().mutex));
+    Frames frames;
+    const sp<TouchCompanionClient> client = record(ring, Frames::callback, &frames);
+    ring.put();
+    EXPECT_TRUE(frames.waitFor(1));
+    EXPECT_EQ(0, client->stopRecord());
+    const std::vector<uint8_t> untouched(sizeof(ring.cblk().mutex), 0xff);
+    EXPECT_EQ(0, memcmp(untouched.data(), &ring.cblk().mutex, untouched.size()));
+}
+
+// ---- no spinning ----
+
+TEST_F(TouchCompanionRecording, MakesUpForAWaitThatFailsAtOnce) {
+    mWaits.setWaitResult(EINVAL);
+    const sp<TouchCompanionClient> client = record(mRing);
+    TouchCompanionClient::FrameBuffer buffer = {nullptr, kFrameSize, 0};
+    EXPECT_EQ(STATUS_TIMEOUT, client->acquireBuffer(&buffer));
+    ASSERT_EQ(63u, mWaits.sleeps().size());
+    for (useconds_t sleep : mWaits.sleeps()) {
+        EXPECT_LE(sleep, 16001u);
+    }
+    EXPECT_GE(mWaits.sleeps()[0], 1u);
+}
+
+// A signal may come late, for a frame that was seen already; more than a few without a frame are
+// none of a writer's.
+TEST_F(TouchCompanionRecording, MakesUpForSignalsWithoutFrames) {
+    mWaits.setWaitResult(0);
+    const sp<TouchCompanionClient> client = record(mRing);
+    TouchCompanionClient::FrameBuffer buffer = {nullptr, kFrameSize, 0};
+    EXPECT_EQ(STATUS_TIMEOUT, client->acquireBuffer(&buffer));
+    EXPECT_EQ(63u, mWaits.deadlines().size());
+    EXPECT_EQ(63u - 8u, mWaits.sleeps().size());
+}
+
+TEST_F(TouchCompanionRecording, IsWokenByEverySignalWithAFrame) {
+    mWaits.setWaitResult(0);
+    mWaits.onWait([&](int) { mRing.put(); });
+    const sp<TouchCompanionClient> client = record(mRing);
+    for (int i = 0; i < 20; ++i) {
+        TouchCompanionClient::FrameBuffer buffer = {nullptr, kBufferFrames * kFrameSize, 0};
+        EXPECT_EQ(0, client->acquireBuffer(&buffer));
+        client->releaseBuffer(&buffer);
+    }
+    EXPECT_THAT(mWaits.sleeps(), IsEmpty());
+}
+
+// Passes over a ring that breaks the rules pause, although there is nothing to wait for.
+TEST_F(TouchCompanionRecording, DoesNotSpinOnARingThatNeverMoves) {
+    struct Ring {
+        const char* name;
+        uint32_t bufferFrames;
+        uint32_t frameSize;
+        uint32_t write;
+    };
+    const Ring rings[] = {
+            {"frames of no size", kBufferFrames, 0, 1},
+            {"a ring of no frames", 0, kFrameSize, 1},
+            {"more frames than there is room for", kBufferFrames, kFrameSize, 0x80000000},
+    };
+    for (const Ring& bad : rings) {
+        FrameRing ring(kBufferFrames, kFrameSize);
+        ring.cblk().bufferFrames = bad.bufferFrames;
+        ring.cblk().frameSize = bad.frameSize;
+        ring.cblk().write = bad.write;
+        Frames frames;
+        const sp<TouchCompanionClient> client = record(ring, Frames::callback, &frames);
+        usleep(200000);
+        EXPECT_EQ(0, client->stopRecord());
+        EXPECT_GE(frames.count(), 1u) << bad.name;
+        EXPECT_LE(frames.count(), 200u / 16 + 50) << bad.name << ": paused between passes";
+    }
 }
 
 // ---- one pass of delivery ----
@@ -392,6 +608,25 @@ TEST_F(TouchCompanionDelivery, ReadsNoLengthOutsideTheMemory) {
         client->processData();
         ASSERT_EQ(before + 1, mFrames.count()) << bad.name;
         EXPECT_EQ(0u, mFrames[before].length) << bad.name;
+        EXPECT_EQ(memory->bytes() + 136, mFrames[before].data) << bad.name;
+    }
+}
+
+// The last slot of a ring that the service makes larger than its memory.
+TEST_F(TouchCompanionDelivery, DeliversNoFrameThatEndsOutsideTheMemory) {
+    for (uint32_t tooLong : {0u, 1u, 1000u}) {
+        mRing.setStart(7);
+        mRing.put();
+        // Frame 7 begins where it did, but the frames behind it would not fit.
+        mRing.cblk().frameSize = kFrameSize + tooLong;
+        mRing.cblk().data = mRing.cblk().frames() - 7 * tooLong;
+        const size_t before = mFrames.count();
+        mClient->processData();
+        ASSERT_EQ(before + 1, mFrames.count());
+        EXPECT_EQ(tooLong == 0 ? mRing.slot(7) : mRing.slot(0), mFrames[before].data) << tooLong;
+        EXPECT_EQ(tooLong == 0 ? kFrameSize : 0, mFrames[before].length) << tooLong;
+        mRing.cblk().frameSize = kFrameSize;
+        mRing.cblk().data = mRing.cblk().frames();
     }
 }
 
@@ -400,6 +635,7 @@ TEST_F(TouchCompanionDelivery, ReadsNoLengthBeforeTheMemory) {
     mRing.cblk().readWrap = 1;  // frame 6 would lie two slots before the first
     mClient->processData();
     ASSERT_EQ(1u, mFrames.count());
+    EXPECT_EQ(mRing.slot(0), mFrames[0].data);
     EXPECT_EQ(0u, mFrames[0].length);
 }
 
@@ -412,9 +648,10 @@ TEST_F(TouchCompanionDelivery, ReadsNoLengthWhereTheServicePoints) {
         mClient->processData();
     }
     ASSERT_EQ(3u, mFrames.count());
-    EXPECT_EQ(0u, mFrames[0].length);
-    EXPECT_EQ(0u, mFrames[1].length);
-    EXPECT_EQ(0u, mFrames[2].length);
+    for (size_t i = 0; i < mFrames.count(); ++i) {
+        EXPECT_EQ(mRing.slot(0), mFrames[i].data) << "a callback sees the memory alone";
+        EXPECT_EQ(0u, mFrames[i].length);
+    }
 }
 
 // ---- the frame rate ----
@@ -516,6 +753,32 @@ TEST_F(TouchCompanionRecording, GoesOnAfterAPassWithoutFrames) {
     EXPECT_EQ(0, client->stopRecord());
     EXPECT_THAT(clientLines(),
                 Contains("E processData: buffer is not acquired(error = 1073741845)"));
+}
+
+// The thread works on nothing of the client's.
+TEST_F(TouchCompanionRecording, MayBeLetGoInItsCallback) {
+    struct Owner {
+        sp<TouchCompanionClient> client;
+        std::atomic<bool> letGo{false};
+
+        static void callback(int, void*, unsigned long, void* context) {
+            Owner& owner = *static_cast<Owner*>(context);
+            owner.client.clear();
+            owner.letGo = true;
+        }
+    };
+    Owner owner;
+    owner.client = record(mRing, Owner::callback, &owner);
+    mRing.put();
+    const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+    while (!owner.letGo && std::chrono::steady_clock::now() < giveUp) {
+        usleep(1000);
+    }
+    ASSERT_TRUE(owner.letGo);
+    EXPECT_THAT(mService->calls(), ElementsAre("unregisterClient"));
+    mService->cblk = nullptr;
+    EXPECT_TRUE(isLetGo(mRing.memory(), 1)) << "the thread has ended";
+    EXPECT_EQ(1u, mRing.cblk().read) << "the frame was given back";
 }
 
 // Checks each frame's bytes and that none is missing, in the callback, while the service writes.

@@ -52,7 +52,7 @@ TEST(ManagerConnection, RefusesABinderOfAnotherInterface) {
 
     // The step alone, of which the touch manager client makes its init().
     clearLog();
-    EXPECT_EQ(STATUS_BAD_PARAMETER, connection.hold(binder));
+    EXPECT_EQ(nullptr, connection.hold(binder));
     EXPECT_THAT(linesOf("Tag"), ElementsAre("E wrong service interface?"));
 }
 

@@ -437,14 +437,27 @@ TEST_F(ProfileListProxy, StopsAtANameThatDoesNotEnd) {
 }
 
 TEST_F(ProfileListProxy, DoesNotBelieveALongList) {
-    EXPECT_EQ(STATUS_CORRUPT_DATA, get(INT32_MAX, {"alice", "bob"}, nothing));
-    EXPECT_THAT(mNames, ElementsAre("held", "alice", "bob"));
+    EXPECT_EQ(STATUS_CORRUPT_DATA, get(INT32_MAX, {"alice", "barbara"}, nothing));
+    EXPECT_THAT(mNames, ElementsAre("held", "alice", "barbara"));
     EXPECT_GE(16u, mNames.capacity());
 }
 
-TEST_F(ProfileListProxy, NoticesThatTheStatusWasReadAsAName) {
-    EXPECT_EQ(STATUS_CORRUPT_DATA, get(2, {"alice"}, numbers({0})));
-    EXPECT_THAT(mNames, ElementsAre("held", "alice", ""));
+// Four bytes at the end are the status, whatever they would spell.
+TEST_F(ProfileListProxy, TakesNoStatusForAName) {
+    for (int32_t status : {0, STATUS_NOT_FOUND, 0x00626f62 /* bob */}) {
+        mNames = {"held"};
+        clearLog();
+        EXPECT_EQ(STATUS_CORRUPT_DATA, get(2, {"alice"}, numbers({status}))) << status;
+        EXPECT_THAT(mNames, ElementsAre("held", "alice"));
+        EXPECT_THAT(
+                linesOf("IHandBiometricManagerService"),
+                ElementsAre("D Bp::getProfileList enter", "D Bp::getProfileList pName is alice"));
+    }
+}
+
+TEST_F(ProfileListProxy, MissesAStatusThatIsNotThere) {
+    EXPECT_EQ(STATUS_CORRUPT_DATA, get(2, {"alice", "barbara"}, nothing));
+    EXPECT_THAT(mNames, ElementsAre("held", "alice", "barbara"));
 }
 
 }  // namespace

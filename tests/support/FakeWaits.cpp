@@ -30,6 +30,11 @@ void FakeWaits::onSleep(std::function<void(int)> hook) {
     mSleepHook = std::move(hook);
 }
 
+void FakeWaits::setWaitResult(int result) {
+    std::lock_guard<std::mutex> lock(mLock);
+    mWaitResult = result;
+}
+
 std::vector<timespec> FakeWaits::deadlines() const {
     std::lock_guard<std::mutex> lock(mLock);
     return mDeadlines;
@@ -43,15 +48,17 @@ std::vector<useconds_t> FakeWaits::sleeps() const {
 int FakeWaits::condTimedWait(pthread_cond_t*, pthread_mutex_t*, const timespec* deadline) {
     FakeWaits& waits = *gWaits;
     int number;
+    int result;
     {
         std::lock_guard<std::mutex> lock(waits.mLock);
         waits.mDeadlines.push_back(*deadline);
         number = static_cast<int>(waits.mDeadlines.size());
+        result = waits.mWaitResult;
     }
     if (waits.mWaitHook) {
         waits.mWaitHook(number);
     }
-    return ETIMEDOUT;
+    return result;
 }
 
 int FakeWaits::sleepMicros(useconds_t micros) {

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <errno.h>
 #include <pthread.h>
 #include <time.h>
 #include <unistd.h>
@@ -26,6 +27,9 @@ class FakeWaits {
     /// Called in place of each wait on a condition with its number, counted from 1.
     void onWait(std::function<void(int number)> hook);
 
+    /// What each wait on a condition returns; ETIMEDOUT until set.
+    void setWaitResult(int result);
+
     /// Called in place of each sleep with its number, counted from 1.
     void onSleep(std::function<void(int number)> hook);
 
@@ -41,6 +45,7 @@ class FakeWaits {
     mutable std::mutex mLock;
     std::function<void(int number)> mWaitHook;
     std::function<void(int number)> mSleepHook;
+    int mWaitResult = ETIMEDOUT;
     std::vector<timespec> mDeadlines;
     std::vector<useconds_t> mSleeps;
 };

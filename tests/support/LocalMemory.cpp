@@ -10,15 +10,16 @@ namespace pemaro::test {
 
 class LocalMemory::Heap : public android::BnMemoryHeap {
   public:
-    explicit Heap(size_t size) : mBase(::operator new(size)), mSize(size) {
+    explicit Heap(size_t size, uint32_t flags = 0)
+            : mBase(::operator new(size)), mSize(size), mFlags(flags) {
         memset(mBase, 0, size);
     }
-    Heap() : mBase(MAP_FAILED), mSize(0) {}
+    Heap() : mBase(MAP_FAILED), mSize(0), mFlags(0) {}
 
     int getHeapID() const override { return -1; }
     void* getBase() const override { return mBase; }
     size_t getSize() const override { return mSize; }
-    uint32_t getFlags() const override { return 0; }
+    uint32_t getFlags() const override { return mFlags; }
     off_t getOffset() const override { return 0; }
 
   private:
@@ -30,11 +31,13 @@ class LocalMemory::Heap : public android::BnMemoryHeap {
 
     void* const mBase;
     const size_t mSize;
+    const uint32_t mFlags;
 };
 
-LocalMemory::LocalMemory(size_t size) : mHeap(new Heap(size)) {}
+LocalMemory::LocalMemory(size_t size) : LocalMemory(android::sp<Heap>(new Heap(size))) {}
 
-LocalMemory::LocalMemory(const android::sp<Heap>& heap) : mHeap(heap) {}
+LocalMemory::LocalMemory(const android::sp<Heap>& heap, size_t offset)
+        : mHeap(heap), mOffset(offset) {}
 
 LocalMemory::~LocalMemory() = default;
 
@@ -42,16 +45,24 @@ android::sp<LocalMemory> LocalMemory::unmapped() {
     return new LocalMemory(android::sp<Heap>(new Heap));
 }
 
+android::sp<LocalMemory> LocalMemory::readOnly(size_t size) {
+    return new LocalMemory(new Heap(size, android::IMemoryHeap::READ_ONLY));
+}
+
+android::sp<LocalMemory> LocalMemory::atOffset(size_t offset, size_t size) {
+    return new LocalMemory(new Heap(offset + size), offset);
+}
+
 uint8_t* LocalMemory::bytes() const {
-    return static_cast<uint8_t*>(mHeap->getBase());
+    return static_cast<uint8_t*>(mHeap->getBase()) + mOffset;
 }
 
 android::sp<android::IMemoryHeap> LocalMemory::getMemory(ssize_t* offset, size_t* size) const {
     if (offset != nullptr) {
-        *offset = 0;
+        *offset = static_cast<ssize_t>(mOffset);
     }
     if (size != nullptr) {
-        *size = mHeap->getSize();
+        *size = mHeap->getSize() - mOffset;
     }
     return mHeap;
 }

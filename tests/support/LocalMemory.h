@@ -19,6 +19,12 @@ class LocalMemory : public android::BnMemory {
     /// One that could not be mapped: its pointer() is null.
     static android::sp<LocalMemory> unmapped();
 
+    /// One whose heap says that it is mapped read-only.
+    static android::sp<LocalMemory> readOnly(size_t size);
+
+    /// One that begins `offset` bytes behind the start of its heap.
+    static android::sp<LocalMemory> atOffset(size_t offset, size_t size);
+
     uint8_t* bytes() const;
 
     android::sp<android::IMemoryHeap> getMemory(ssize_t* offset = nullptr,
@@ -26,10 +32,11 @@ class LocalMemory : public android::BnMemory {
 
   private:
     class Heap;
-    explicit LocalMemory(const android::sp<Heap>& heap);
+    explicit LocalMemory(const android::sp<Heap>& heap, size_t offset = 0);
     ~LocalMemory() override;
 
     const android::sp<Heap> mHeap;
+    const size_t mOffset;
 };
 
 /// A control block with its ring, and the service's side of it.
