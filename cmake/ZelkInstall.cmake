@@ -5,7 +5,7 @@ include(CMakePackageConfigHelpers)
 set(ZELK_PACKAGE_DIR ${CMAKE_INSTALL_LIBDIR}/cmake/zelkclient)
 
 install(TARGETS zelkclient EXPORT zelkclientTargets COMPONENT Library)
-install(TARGETS zelktestkit EXPORT zelkclientTargets COMPONENT Development)
+install(TARGETS zelktestkit zelktestkit_recorder EXPORT zelkclientTargets COMPONENT Development)
 if(ZELK_BUILD_TOOLS)
   install(TARGETS zelkctl zelk-touchstack COMPONENT Tools)
   # Where bash, zsh and man look for them.

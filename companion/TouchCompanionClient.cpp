@@ -4,7 +4,10 @@
 #include "pemaro/TouchCompanionClient.h"
 
 #include <binder/IPCThreadState.h>
+#include <errno.h>
 #include <log/log.h>
+#include <sys/uio.h>
+#include <unistd.h>
 
 #include <utility>
 
@@ -34,15 +37,20 @@ constexpr int kOutputMemory = 1;
 
 using Service = ITouchCompanionService;
 
+// False where `to` cannot be written to. The kernel says so where writing by ourselves would end the
+// process; the flags of the memory's heap do not, since the platform loses them on the way.
+bool writeThroughKernel(void* to, const void* from, size_t size) {
+    iovec source = {const_cast<void*>(from), size};
+    iovec target = {to, size};
+    return process_vm_writev(getpid(), &source, 1, &target, 1, 0) >= 0 || errno != EFAULT;
+}
+
 // Where the service's memory is mapped, if a control block can be worked with there; else null, with
-// the reason logged unless nothing was mapped or there is no room for one.
+// the reason logged unless nothing was mapped or there is no room for one. The block holds the
+// ring's address in this process then.
 TouchCompanionSharedCblk* usableBlock(const sp<android::IMemory>& memory) {
     void* const address = mappedAddress(memory);
     if (address == nullptr || memory->size() < sizeof(TouchCompanionSharedCblk)) {
-        return nullptr;
-    }
-    if ((memory->getMemory()->getFlags() & android::IMemoryHeap::READ_ONLY) != 0) {
-        ALOGE("shared control block cannot be used: it is mapped read-only");
         return nullptr;
     }
     if (reinterpret_cast<uintptr_t>(address) % alignof(TouchCompanionSharedCblk) != 0) {
@@ -50,7 +58,15 @@ TouchCompanionSharedCblk* usableBlock(const sp<android::IMemory>& memory) {
               alignof(TouchCompanionSharedCblk));
         return nullptr;
     }
-    return static_cast<TouchCompanionSharedCblk*>(address);
+    TouchCompanionSharedCblk* const cblk = static_cast<TouchCompanionSharedCblk*>(address);
+    uint8_t* const data = cblk->frames();
+    if (!writeThroughKernel(&cblk->data, &data, sizeof(data))) {
+        ALOGE("shared control block cannot be used: it is mapped read-only");
+        return nullptr;
+    }
+    // Where the kernel does not write for others at all.
+    __atomic_store_n(&cblk->data, data, __ATOMIC_RELAXED);
+    return cblk;
 }
 
 }  // namespace
@@ -170,9 +186,6 @@ int TouchCompanionClient::mapBlock(Service& service, MappedBlock& block) {
         return STATUS_ERROR_ACQUIRING_RESOURCE;
     }
     block.cblk = usableBlock(block.memory);
-    if (block.cblk != nullptr) {
-        block.cblk->data = block.cblk->frames();
-    }
     sp<android::IMemory> memory = block.memory;  // takes what is let go, outside the guard
     ClientGuard guard;
     mFrameCount = 0;

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 // Processes that die or refuse while others rely on them.
 
+#include "pemaro/Binder.h"
+
+#include <binder/IServiceManager.h>
 #include <gtest/gtest.h>
 #include <signal.h>
 #include <unistd.h>
@@ -169,6 +172,32 @@ INSTANTIATE_TEST_SUITE_P(
                 OrderedFault{"startRecord=die", "startRecord", STATUS_UNKNOWN_ERROR},
                 OrderedFault{"stopRecord=status:0x40000015", "stopRecord", STATUS_TIMEOUT},
                 OrderedFault{"stopRecord=die", "stopRecord", STATUS_UNKNOWN_ERROR}));
+
+// A stub's result crosses the driver only when it is negative, and the library's are not.
+TEST(PositiveResults, ArriveAsSuccessWithWhatTheReplyHolds) {
+    TouchStack touchStack({"--fault", "unregisterClient=status:0x4000000B"});
+    FrameCollector frames;
+    ASSERT_NE(nullptr, frames.connect());
+    const sp<ITouchCompanionService> service =
+            ITouchCompanionService::asInterface(android::defaultServiceManager()->checkService(
+                    android::String16("pemaro.TouchService")));
+    EXPECT_EQ(0, service->unregisterClient());
+
+    const size_t length = service->getConfigParams(nullptr, 0);
+    ASSERT_LT(1u, length);
+    std::vector<char> tooSmall(length - 1, 'x');
+    EXPECT_EQ(length, service->getConfigParams(tooSmall.data(), tooSmall.size()));
+    EXPECT_EQ(std::vector<char>(length - 1, 'x'), tooSmall);
+
+    // More than a service can allocate: nothing is answered, which reads as no configuration.
+    EXPECT_EQ(0u, service->getConfigParams(tooSmall.data(), size_t{0xffffffff}));
+
+    const sp<TouchCompanionClient> client = frames.makeClient();
+    ASSERT_EQ(0, client->init());
+    size_t capacity = tooSmall.size();
+    EXPECT_EQ(STATUS_UNKNOWN_ERROR, client->getConfigParams(tooSmall.data(), &capacity));
+    EXPECT_EQ(tooSmall.size(), capacity);
+}
 
 TEST(Faults, DeathIsTheOrderedOne) {
     TouchStack touchStack({"--fault", "open=die"});

@@ -9,6 +9,12 @@
 ///         tells LENGTH; its write index moves on without regard for the reader
 ///     garbage-service no-block              the same with a null binder for the block
 ///     garbage-service short-block           the same with a block that is too short for its header
+///     garbage-service read-only-block       the same with a block that is mapped read-only
+///     garbage-service misaligned-block      the same with a block at an odd address
+///     garbage-service ruined-block WHAT     the same with a good block that gets no frame, and that
+///         is ruined when the recording has started: "held-mutex" is as if the service were killed
+///         while it holds the mutex, "dead-signal" as if it were killed inside pthread_cond_signal,
+///         "clock" makes the condition count on another clock, "mutex" fills the mutex with ones
 
 #include "pemaro/Binder.h"
 
@@ -112,6 +118,51 @@ class BlockReply : public GarbageService {
     const sp<IMemory> mMemory;
 };
 
+// Where glibc keeps in a condition the lock that a writer can take along when it dies, and which
+// clock a wait goes by.
+constexpr size_t kConditionLock = 32;
+constexpr uint32_t kConditionLocked = 1;
+constexpr size_t kConditionFlags = 36;
+constexpr uint32_t kConditionMonotonic = 2;
+
+class RuinedBlock : public GarbageService {
+  public:
+    RuinedBlock(const sp<IMemory>& memory, const std::string& what)
+            : mMemory(memory), mWhat(what) {}
+
+  private:
+    void answer(uint32_t code, Parcel* reply) override {
+        if (code == kGetCblk) {
+            reply->writeStrongBinder(android::IInterface::asBinder(mMemory));
+            return;
+        }
+        reply->writeInt32(code == kGetPacketSize ? static_cast<int32_t>(kFrameBytes) : 0);
+        if (code == kStartRecord) {
+            ruin(static_cast<TouchCompanionSharedCblk*>(mMemory->pointer()));
+        }
+    }
+
+    void ruin(TouchCompanionSharedCblk* block) {
+        if (mWhat == "held-mutex") {
+            pthread_mutex_lock(&block->mutex);
+        } else if (mWhat == "dead-signal") {
+            setBits(&block->cond, kConditionLock, kConditionLocked);
+        } else if (mWhat == "clock") {
+            setBits(&block->cond, kConditionFlags, kConditionMonotonic);
+        } else {
+            memset(&block->mutex, 0xff, sizeof(block->mutex));
+        }
+    }
+
+    static void setBits(pthread_cond_t* condition, size_t offset, uint32_t bits) {
+        auto* word = reinterpret_cast<uint32_t*>(reinterpret_cast<char*>(condition) + offset);
+        __atomic_fetch_or(word, bits, __ATOMIC_SEQ_CST);
+    }
+
+    const sp<IMemory> mMemory;
+    const std::string mWhat;
+};
+
 sp<IMemory> makeBlock(uint32_t bufferFrames, uint32_t frameSize, uint32_t length) {
     const size_t size = kTouchCompanionRingOffset + kRingFrames * kFrameBytes;
     sp<MemoryHeapBase> heap = new MemoryHeapBase(size);
@@ -142,6 +193,18 @@ sp<BBinder> makeService(int argc, char** argv) {
     if (mode == "short-block") {
         sp<MemoryHeapBase> heap = new MemoryHeapBase(kShortBlock);
         return new BlockReply(new MemoryBase(heap, 0, kShortBlock));
+    }
+    if (mode == "read-only-block") {
+        return new BlockReply(
+                new MemoryBase(new MemoryHeapBase(size_t{kFrameBytes}, MemoryHeapBase::READ_ONLY),
+                               0, kFrameBytes));
+    }
+    if (mode == "misaligned-block") {
+        return new BlockReply(
+                new MemoryBase(new MemoryHeapBase(size_t{2 * kFrameBytes}), 4, kFrameBytes));
+    }
+    if (mode == "ruined-block" && argc == 3) {
+        return new RuinedBlock(makeBlock(kRingFrames, kFrameBytes, 0), argv[2]);
     }
     return nullptr;
 }

@@ -4,7 +4,11 @@
 #include <binder/IServiceManager.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <signal.h>
+#include <unistd.h>
 
+#include <algorithm>
+#include <chrono>
 #include <string>
 #include <vector>
 
@@ -30,6 +34,12 @@ class GarbageService {
     static sp<ITouchCompanionService> proxy() {
         return ITouchCompanionService::asInterface(
                 android::defaultServiceManager()->checkService(String16("pemaro.TouchService")));
+    }
+
+    /// Ends it without warning.
+    void kill() {
+        mProcess.signal(SIGKILL);
+        EXPECT_EQ(128 + SIGKILL, mProcess.wait());
     }
 
   private:
@@ -121,8 +131,8 @@ TEST(GarbageReplies, ArriveAsTheStatusThatTheyAre) {
     EXPECT_EQ(0x5A5A5A5A, service->getProperties(map));
 }
 
-TEST(Blocks, ThatAreNoneOrTooShortAreRefused) {
-    for (const char* mode : {"no-block", "short-block"}) {
+TEST(Blocks, ThatCannotBeWorkedInAreRefused) {
+    for (const char* mode : {"no-block", "short-block", "read-only-block", "misaligned-block"}) {
         GarbageService garbage({mode});
         FrameCollector frames;
         sp<TouchCompanionClient> client = frames.connect();
@@ -131,6 +141,46 @@ TEST(Blocks, ThatAreNoneOrTooShortAreRefused) {
         EXPECT_EQ(0u, frames.frames());
     }
 }
+
+// ---- services that die in the ring ----
+
+class RuinedBlocks : public ::testing::TestWithParam<const char*> {};
+
+// Far less than for ever, and enough for a machine in a machine.
+constexpr std::chrono::seconds kSoon{10};
+
+TEST_P(RuinedBlocks, HoldNoClientUp) {
+    GarbageService garbage({"ruined-block", GetParam()});
+    FrameCollector frames;
+    sp<TouchCompanionClient> client = frames.connect();
+    ASSERT_NE(nullptr, client);
+    ASSERT_EQ(0, client->startRecord());
+    usleep(200000);
+    garbage.kill();
+    const auto before = std::chrono::steady_clock::now();
+    EXPECT_EQ(STATUS_UNKNOWN_ERROR, client->stopRecord());
+    client.clear();
+    EXPECT_LT(std::chrono::steady_clock::now() - before, kSoon);
+    EXPECT_EQ(0u, frames.frames());
+}
+
+TEST_P(RuinedBlocks, LetARecordingBeInterrupted) {
+    GarbageService garbage({"ruined-block", GetParam()});
+    ChildProcess record({binary("zelkctl"), "record"});
+    usleep(500000);
+    EXPECT_TRUE(record.isRunning());
+    garbage.kill();
+    record.signal(SIGINT);
+    EXPECT_NE(ChildProcess::kTimedOut, record.wait(kSoon)) << record.errors();
+}
+
+INSTANTIATE_TEST_SUITE_P(All, RuinedBlocks,
+                         ::testing::Values("held-mutex", "dead-signal", "clock", "mutex"),
+                         [](const auto& info) {
+                             std::string name = info.param;
+                             name.erase(std::remove(name.begin(), name.end(), '-'), name.end());
+                             return name;
+                         });
 
 namespace {
 

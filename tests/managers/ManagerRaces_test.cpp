@@ -14,7 +14,7 @@
 #include "pemaro/HandBiometricManagerClient.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchManagerClient.h"
-#include "tests/support/FakeServiceManager.h"
+#include "pemaro/testkit/FakeServiceManager.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"

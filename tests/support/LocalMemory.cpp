@@ -10,28 +10,30 @@ namespace pemaro::test {
 
 class LocalMemory::Heap : public android::BnMemoryHeap {
   public:
-    explicit Heap(size_t size, uint32_t flags = 0)
-            : mBase(::operator new(size)), mSize(size), mFlags(flags) {
+    explicit Heap(size_t size) : mBase(::operator new(size)), mSize(size) {
         memset(mBase, 0, size);
     }
-    Heap() : mBase(MAP_FAILED), mSize(0), mFlags(0) {}
+    /// Takes a mapping.
+    Heap(void* base, size_t size) : mBase(base), mSize(size), mMapped(true) {}
 
     int getHeapID() const override { return -1; }
     void* getBase() const override { return mBase; }
     size_t getSize() const override { return mSize; }
-    uint32_t getFlags() const override { return mFlags; }
+    uint32_t getFlags() const override { return 0; }
     off_t getOffset() const override { return 0; }
 
   private:
     ~Heap() override {
-        if (mBase != MAP_FAILED) {
+        if (!mMapped) {
             ::operator delete(mBase);
+        } else if (mBase != MAP_FAILED) {
+            munmap(mBase, mSize);
         }
     }
 
     void* const mBase;
     const size_t mSize;
-    const uint32_t mFlags;
+    const bool mMapped = false;
 };
 
 LocalMemory::LocalMemory(size_t size) : LocalMemory(android::sp<Heap>(new Heap(size))) {}
@@ -42,11 +44,12 @@ LocalMemory::LocalMemory(const android::sp<Heap>& heap, size_t offset)
 LocalMemory::~LocalMemory() = default;
 
 android::sp<LocalMemory> LocalMemory::unmapped() {
-    return new LocalMemory(android::sp<Heap>(new Heap));
+    return new LocalMemory(android::sp<Heap>(new Heap(MAP_FAILED, 0)));
 }
 
 android::sp<LocalMemory> LocalMemory::readOnly(size_t size) {
-    return new LocalMemory(new Heap(size, android::IMemoryHeap::READ_ONLY));
+    void* base = mmap(nullptr, size, PROT_READ, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+    return new LocalMemory(new Heap(base, size));
 }
 
 android::sp<LocalMemory> LocalMemory::atOffset(size_t offset, size_t size) {

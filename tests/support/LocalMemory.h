@@ -19,7 +19,7 @@ class LocalMemory : public android::BnMemory {
     /// One that could not be mapped: its pointer() is null.
     static android::sp<LocalMemory> unmapped();
 
-    /// One whose heap says that it is mapped read-only.
+    /// One that is mapped read-only, which its heap does not tell, as the platform's does not.
     static android::sp<LocalMemory> readOnly(size_t size);
 
     /// One that begins `offset` bytes behind the start of its heap.
