@@ -122,29 +122,41 @@ std::string enclosed(const std::string& open, const std::string& core, const std
     return repeated(open, count) + core + repeated(close, count);
 }
 
+struct Maker {
+    const char* name;
+    std::string (*make)();
+};
+
+constexpr Maker kMakers[] = {
+        {"command", command},
+        {"flat", [] { return flat(ascending(1000), kLongKey); }},
+        {"random", [] { return flat(shuffled(1000), kLongKey); }},
+        {"short", [] { return flat(ascending(1000), kShortKey); }},
+        {"nested", [] { return nestedMaps(130); }},
+        {"mixed", [] { return gestures(280); }},
+        {"strings", [] { return strings(16, 4096); }},
+        {"array", [] { return numbers(10000); }},
+        {"flat1M", [] { return flat(ascending(29000), kLongKey); }},
+        {"random1M", [] { return flat(shuffled(29000), kLongKey); }},
+};
+
 }  // namespace
 
 const std::vector<Payload>& payloads() {
-    static const std::vector<Payload> all = {
-            {"command", command()},
-            {"flat", flat(ascending(1000), kLongKey)},
-            {"random", flat(shuffled(1000), kLongKey)},
-            {"short", flat(ascending(1000), kShortKey)},
-            {"nested", nestedMaps(130)},
-            {"mixed", gestures(280)},
-            {"strings", strings(16, 4096)},
-            {"array", numbers(10000)},
-            {"flat1M", flat(ascending(29000), kLongKey)},
-            {"random1M", flat(shuffled(29000), kLongKey)},
-    };
+    static const std::vector<Payload> all = [] {
+        std::vector<Payload> made;
+        for (const Maker& maker : kMakers) made.push_back({maker.name, maker.make()});
+        return made;
+    }();
     return all;
 }
 
-const Payload& payload(const std::string& name) {
-    for (const Payload& one : payloads()) {
-        if (name == one.name) return one;
+Payload payload(const std::string& name) {
+    for (const Maker& maker : kMakers) {
+        if (name == maker.name) return {maker.name, maker.make()};
     }
-    abort();
+    fprintf(stderr, "there is no payload '%s'\n", name.c_str());
+    exit(2);
 }
 
 const std::vector<Shape>& shapes() {

@@ -17,8 +17,8 @@ struct Payload {
 /// mebibyte of configuration.
 const std::vector<Payload>& payloads();
 
-/// The payload of that name.
-const Payload& payload(const std::string& name);
+/// The payload of that name, made anew; another name ends the program.
+Payload payload(const std::string& name);
 
 /// The text of one shape with `size` entries, elements or levels. The hostile shapes are those whose
 /// reading a simpler reader would repeat.

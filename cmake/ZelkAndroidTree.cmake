@@ -16,8 +16,9 @@ set(ZELK_BP_LIBRARIES
   "zelk_fuzz_support=static_libs:libzelk_fuzz_support"
   "zelk::testkit=static_libs:libzelktestkit"
   "zelktestkit=static_libs:libzelktestkit")
-# Tests that start a service manager, the programs or the completions of a desk.
-set(ZELK_BP_DESK_ONLY tools_tests)
+# Tests that start a service manager, the programs or the completions of a desk; what counts costs there.
+set(ZELK_BP_DESK_ONLY tools_tests zelk_values_plain values_plain_test values_plain_comparison_test
+  values_allocations_test)
 
 set_property(GLOBAL PROPERTY ZELK_BP "")
 

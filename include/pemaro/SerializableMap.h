@@ -25,6 +25,10 @@ namespace pemaro {
 /// there) and `replaceValueFor`, and reached with `indexOfKey`, `size`, `editValueFor` (fatal for
 /// an absent key) and `valueFor`, which yields the null item, a null value, for an absent key.
 ///
+/// A large map is best built with `setCapacity` first and then `add` in ascending order of the keys:
+/// the entries lie sorted in one block, which `add` moves up behind a key that comes in between, so
+/// that many keys in any other order take quadratic time. Reading a text and `+=` need no such care.
+///
 /// Copies of a map share nothing. A copy made of the base class alone is the platform's: it shares
 /// its entries with the map until either is edited.
 ///
@@ -49,11 +53,13 @@ class ZELK_API SerializableMap
     /// was, when there is no such position.
     int valueAt(unsigned long index, SerializableValue& value);
 
-    /// Whether an entry has exactly this key.
+    /// Whether an entry has exactly this key. Allocates nothing, as getType(); the keyed vector's own
+    /// `indexOfKey` and `valueFor` make a pair of the key and a value to look for.
     bool contains(const std::string& key);
     bool contains(const char* key);
 
-    /// Merges in copies of `other`'s entries; where both have a key, `other`'s value wins.
+    /// Merges in copies of `other`'s entries, in time linear in both; where both have a key, `other`'s
+    /// value wins.
     SerializableMap& operator+=(const SerializableMap& other);
 
     /// A new map: this one's entries with `other`'s merged in as by `+=`.
@@ -68,7 +74,8 @@ class ZELK_API SerializableMap
     /// Replaces the entries, all of them, by what `text` holds, up to its first NUL if it has one.
     /// Returns 0, or STATUS_INVALID_FORMAT after logging the reason, and then the map is as it was.
     /// A scalar without any text, as in `{"a": ,"b":1}`, is fatal. Takes time and memory linear in
-    /// the length of the text and a fixed amount of stack.
+    /// the length of the text and a fixed amount of stack; keys that do not come in ascending order
+    /// are sorted besides, which may compare each with the logarithm of their number of others.
     int unserialize(const std::string& text);
 
   private:
