@@ -60,7 +60,11 @@ int FakeTouchCompanionService::note(const std::string& operation, const std::str
 }
 
 int FakeTouchCompanionService::registerClient(const android::sp<ITouchCompanionClient>& newClient) {
-    client = newClient;
+    android::sp<ITouchCompanionClient> previous = newClient;  // let go outside the lock
+    {
+        std::lock_guard<std::mutex> lock(mLock);
+        std::swap(client, previous);
+    }
     return called("registerClient");
 }
 
