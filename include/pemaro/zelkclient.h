@@ -34,6 +34,7 @@
 #include "pemaro/ITouchManagerClient.h"
 #include "pemaro/ITouchManagerService.h"
 #include "pemaro/ManagerFactories.h"
+#include "pemaro/RingWriter.h"
 #include "pemaro/SerializableBlob.h"
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"

@@ -62,10 +62,11 @@ int ClientRecord::prepare() {
     mRing.reset();
     mPrepared = false;
     if (mOutput == kOutputMemory) {
-        mRing = RingWriter::create(mOptions.frameBytes, mOptions.ringFrames);
-        if (mRing == nullptr) {
+        auto writer = RingWriter::create(mOptions.frameBytes, mOptions.ringFrames);
+        if (writer == nullptr) {
             return STATUS_ERROR_ALLOCATING_MEMORY;
         }
+        mRing = std::make_shared<RingSink>(std::move(writer));
     }
     mPrepared = true;
     return STATUS_NO_ERROR;

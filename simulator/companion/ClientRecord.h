@@ -13,7 +13,7 @@
 #include <vector>
 
 #include "simulator/companion/Recording.h"
-#include "simulator/companion/RingWriter.h"
+#include "simulator/companion/RingSink.h"
 #include "simulator/companion/SimulatorOptions.h"
 
 namespace pemaro::simulator {
@@ -59,7 +59,7 @@ class ClientRecord {
     bool mPrepared = false;
     int mOutput = -1;
     std::string mFile;
-    std::shared_ptr<RingWriter> mRing;
+    std::shared_ptr<RingSink> mRing;
     std::unique_ptr<Recording> mRecording;
 };
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "simulator/companion/RingWriter.h"
+#include "pemaro/RingWriter.h"
 
 #include <gtest/gtest.h>
 
@@ -7,7 +7,7 @@
 #include <memory>
 #include <string>
 
-namespace pemaro::simulator {
+namespace pemaro::test {
 
 namespace {
 
@@ -38,7 +38,7 @@ bool put(RingWriter& writer, const std::string& text) {
 }  // namespace
 
 TEST(RingWriter, MakesABlockThatTellsItsGeometry) {
-    const std::shared_ptr<RingWriter> writer = RingWriter::create(100, 5);
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(100, 5);
     ASSERT_NE(nullptr, writer);
     Reader reader(*writer);
     EXPECT_EQ(5u, reader.block->bufferFrames);
@@ -50,7 +50,7 @@ TEST(RingWriter, MakesABlockThatTellsItsGeometry) {
 }
 
 TEST(RingWriter, TakesNoMoreFramesThanTheRingHolds) {
-    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 3);
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 3);
     Reader reader(*writer);
     EXPECT_TRUE(put(*writer, "a"));
     EXPECT_TRUE(put(*writer, "b"));
@@ -66,7 +66,7 @@ TEST(RingWriter, TakesNoMoreFramesThanTheRingHolds) {
 }
 
 TEST(RingWriter, KeepsTheOrderOverManyRounds) {
-    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 7);
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 7);
     Reader reader(*writer);
     for (int i = 0; i < 1000; i += 5) {
         for (int j = i; j < i + 5; ++j) {
@@ -80,13 +80,49 @@ TEST(RingWriter, KeepsTheOrderOverManyRounds) {
 }
 
 TEST(RingWriter, RefusesAFrameThatIsLongerThanASlot) {
-    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 2);
     EXPECT_TRUE(put(*writer, std::string(15, 'x')));
     EXPECT_FALSE(put(*writer, std::string(16, 'x')));
 }
 
+TEST(RingWriter, LetsAFrameBeFilledInItsSlot) {
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    Reader reader(*writer);
+    for (const char* text : {"a", "b"}) {
+        uint8_t* const slot = writer->next();
+        ASSERT_NE(nullptr, slot);
+        EXPECT_EQ(slot, writer->next());
+        memcpy(slot, text, 2);
+        writer->publish();
+    }
+    EXPECT_EQ(nullptr, writer->next());
+    EXPECT_EQ("a", reader.take());
+    EXPECT_EQ(reader.block->frames(), writer->next());
+    EXPECT_EQ("b", reader.take());
+}
+
+TEST(RingWriter, TakesNothingIntoARingWithoutFrames) {
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 0);
+    ASSERT_NE(nullptr, writer);
+    EXPECT_EQ(nullptr, writer->next());
+    EXPECT_FALSE(put(*writer, "a"));
+}
+
+TEST(RingWriter, IsNotMadeWithoutTheMemory) {
+    EXPECT_EQ(nullptr, RingWriter::create(0xFFFFFFFF, 0xFFFFFFFF));
+}
+
+TEST(RingWriter, OutlivedByItsMemory) {
+    std::unique_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    const android::sp<android::IMemory> memory = writer->memory();
+    put(*writer, "a");
+    writer.reset();
+    const auto* const block = static_cast<const TouchCompanionSharedCblk*>(memory->pointer());
+    EXPECT_EQ(1u, block->write);
+}
+
 TEST(RingWriter, BelievesNothingThatAClientWritesIntoTheBlock) {
-    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 2);
     Reader reader(*writer);
     reader.block->bufferFrames = 0xFFFFFFFF;
     reader.block->frameSize = 0xFFFFFFFF;
@@ -107,10 +143,10 @@ TEST(RingWriter, BelievesNothingThatAClientWritesIntoTheBlock) {
 }
 
 TEST(RingWriter, WritesOnWhenTheReaderDiedWithTheMutex) {
-    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 2);
     Reader reader(*writer);
     ASSERT_EQ(0, pthread_mutex_lock(&reader.block->mutex));
     EXPECT_TRUE(put(*writer, "a"));
 }
 
-}  // namespace pemaro::simulator
+}  // namespace pemaro::test
