@@ -5,8 +5,12 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <vector>
 
+#include "pemaro/GestureManagerClient.h"
+#include "pemaro/Status.h"
 #include "tests/driver/DriverSetting.h"
+#include "tests/support/RecordCollector.h"
 
 using testing::MatchesRegex;
 
@@ -28,6 +32,53 @@ TEST(Examples, ClientLinked) {
     EXPECT_THAT(result.output, MatchesRegex("packet size 4096, configuration of [0-9]+ bytes\n"
                                             "status: filter=3 events=0 authenticated=no\n"
                                             "recorded [1-9][0-9]* frames, [1-9][0-9]* bytes\n"));
+}
+
+// A program of the tutorial for service authors, until it is registered.
+class Service {
+  public:
+    Service(const std::string& program, const std::vector<std::string>& probe)
+            : mProcess({binary(program)}) {
+        while (mProcess.isRunning() && run(probe).status != 0) {
+        }
+        EXPECT_TRUE(mProcess.isRunning()) << mProcess.errors();
+    }
+
+  private:
+    ChildProcess mProcess;
+};
+
+TEST(ExampleServices, RecordIntoTheRing) {
+    Service service("companion_service", {binary("zelkctl"), "ping"});
+    const RunResult linked = run({binary("client_linked")});
+    EXPECT_EQ(0, linked.status) << linked.errors;
+    EXPECT_THAT(linked.output, MatchesRegex("packet size 64, configuration of 7 bytes\n"
+                                            "status: ready\n"
+                                            "recorded [1-9][0-9]* frames, [1-9][0-9]* bytes\n"));
+    // Once more: the first recording has left nothing behind.
+    EXPECT_EQ(linked.status, run({binary("client_linked")}).status);
+    const RunResult refused = run({binary("zelkctl"), "session", "save"});
+    EXPECT_EQ(1, refused.status);
+    EXPECT_THAT(refused.errors, testing::HasSubstr(errStr(STATUS_UNSUPPORTED)));
+}
+
+TEST(ExampleServices, ReportGestures) {
+    Service service("gesture_service", {binary("zelkctl"), "gesture", "limits"});
+    ASSERT_EQ(0, run({binary("zelkctl"), "gesture", "detect", "start"}).status);
+    RecordCollector events;
+    const android::sp<GestureManagerClient> client =
+            new GestureManagerClient(RecordCollector::onEvent<IGestureManagerClient::GestureData>,
+                                     RecordCollector::onDeath, &events);
+    ASSERT_EQ(0, client->init());
+    EXPECT_TRUE(events.await(3));
+    IGestureManagerClient::GestureData sample = {};
+    int gesture = 0;
+    EXPECT_EQ(0, client->addGesture(1, &sample, gesture));
+    EXPECT_EQ(1, gesture);
+    EXPECT_EQ(0, client->deleteGesture(gesture));
+    EXPECT_EQ(STATUS_BAD_PARAMETER, client->deleteGesture(gesture));
+    EXPECT_EQ(STATUS_UNSUPPORTED, client->enableGesture(gesture));
+    EXPECT_EQ(0, client->deinit());
 }
 
 TEST(Examples, FailWhenTheServiceRefuses) {
