@@ -30,8 +30,9 @@
 #define RELEASES_ONE_LESS 7   /* the reader releases one frame less than it took */
 #define WAITS_FOR_EVER 8      /* the reader waits for the signal without a deadline */
 #define LOCKS_SHARED_MUTEX 9  /* the reader's wait ends in a lock of the shared mutex, without a deadline */
-#define NEEDS_INNER_LOCK 10   /* the reader's wait needs the lock that a signal holds in the condition */
+#define JOINS_FOR_EVER 10     /* the caller waits for the thread without an end */
 #define UNMAPS_TOO_EARLY 11   /* the caller unmaps the block although the thread did not end */
+#define CALLS_AFTERWARDS 12   /* a thread that was left behind goes on delivering */
 
 #define MOST_FRAMES 4
 #define MOST_WAITS 3
@@ -45,27 +46,28 @@ byte read, write, readWrap;
 byte head[MOST_FRAMES], tail[MOST_FRAMES];
 bool signalled;                   /* the condition: a signal that nobody has taken */
 bool mutexHeld;                   /* the shared mutex, held by the writer */
-bool innerHeld;                   /* the condition's own lock, held by the writer in its signal */
+bool innerHeld;                   /* the C library's lock in the condition, held by the writer in its signal */
 
 bool dead;                        /* the writer */
 bool stopAsked, stopped;          /* stopRecord(): entered, returned */
 bool exitPending, threadEnded;    /* the recording thread: asked to end, ended */
+bool waiting, leftBehind;         /* it is in a wait; its caller has given it up there */
 bool mapped = true;
 byte delivered;                   /* the number that the next frame has to have */
 
 /* ---- the service ---- */
 
 proctype writer() {
-    byte next, slot, waiting;
+    byte next, slot, held;
     bool room, takesIt;
     {
         do
         :: d_step {
-               waiting = MINUS(next, read);
+               held = MINUS(next, read);
                room = (MINUS(write, read) < frames);
-               takesIt = (waiting < frames + (DEFECT == WRITES_INTO_FULL) - (DEFECT == REFUSES_EARLY));
+               takesIt = (held < frames + (DEFECT == WRITES_INTO_FULL) - (DEFECT == REFUSES_EARLY));
                assert(takesIt || !room);   /* no frame is refused while there is room */
-               waiting = 0;
+               held = 0;
                room = false
            }
            if
@@ -99,7 +101,8 @@ proctype killer() {
 
 /* ---- the client ---- */
 
-/* One wait. It ends with the signal or at its deadline, whatever the shared words hold. */
+/* One wait. It ends with the signal or at its deadline, whatever the shared words hold, but for one case: the C
+ * library takes a lock of its own in the condition, and a writer that dies in its signal takes that along. */
 inline waitForWriter() {
     assert(mapped);
     if
@@ -108,9 +111,9 @@ inline waitForWriter() {
     fi;
     if
     :: DEFECT == LOCKS_SHARED_MUTEX -> !mutexHeld
-    :: DEFECT == NEEDS_INNER_LOCK -> !innerHeld
     :: else
-    fi
+    fi;
+    !innerHeld -> waiting = false
 }
 
 /* acquireBuffer(): yields taken frames from slot on, or timedOut. */
@@ -120,14 +123,16 @@ inline acquireBuffer() {
     :: seen != read
     :: else ->
         do
-        :: seen = write;
+        :: d_step { seen = write; waiting = true };
            atomic {
                waitForWriter();
                waits++;
                if
-               :: waits == MOST_WAITS -> timedOut = true; break
-               :: waits != MOST_WAITS && seen != read -> break
-               :: else
+               :: waits == MOST_WAITS || (leftBehind && DEFECT != CALLS_AFTERWARDS) -> timedOut = true; break
+               :: else -> if
+                   :: seen != read -> break
+                   :: else
+                   fi
                fi
            }
         od
@@ -184,6 +189,7 @@ proctype recordingThread() {
             :: i < taken ->
                 d_step {
                     assert(mapped && slot + i < frames);
+                    assert(!leftBehind);
                     first = head[slot + i]
                 };
                 d_step {
@@ -207,8 +213,8 @@ proctype recordingThread() {
     threadEnded = true
 }
 
-/* stopRecord(), at any time or never. A thread that does not end in time is left behind with all that it
- * needs. */
+/* stopRecord(), at any time or never. A thread whose wait is overdue is left behind with all that it needs, and
+ * calls nobody any more. */
 proctype caller() {
     if
     :: true
@@ -217,7 +223,7 @@ proctype caller() {
        if
        :: threadEnded -> mapped = false
        :: DEFECT == UNMAPS_TOO_EARLY -> mapped = false
-       :: true
+       :: atomic { DEFECT != JOINS_FOR_EVER && waiting -> leftBehind = true }
        fi;
        stopped = true
     fi
@@ -233,11 +239,13 @@ init {
     }
 }
 
-/* Whatever became of the writer: stopRecord() returns, and the thread ends by itself. */
-ltl ends { [] (stopAsked -> <> (stopped && threadEnded)) }
+#define inSignal (dead && innerHeld)   /* the writer died there */
 
-/* What a writer published before it died is delivered. */
-ltl survives { [] (dead -> <> (delivered == write || stopAsked)) }
+/* Whatever became of the writer: stopRecord() returns, and the thread ends by itself unless its wait cannot. */
+ltl ends { [] (stopAsked -> (<> stopped && <> (threadEnded || inSignal))) }
+
+/* What a writer published before it died is delivered, unless it died in its signal. */
+ltl survives { [] (dead -> <> (delivered == write || stopAsked || inSignal)) }
 
 /* A frame in the ring does not wait without end; number 0 stands for all. */
-ltl arrives { [] ((delivered == 0 && write != 0) -> <> (delivered != 0 || stopAsked)) }
+ltl arrives { [] ((delivered == 0 && write != 0) -> <> (delivered != 0 || stopAsked || inSignal)) }
