@@ -64,13 +64,21 @@ struct Mapping {
     size_t size;
 };
 
+// What is delivered lies in the ring with its whole header, or is the ring's first byte with the length 0. The
+// frame's own length is only as good as the frame.
 void onFrame(int, void* frame, unsigned long length, void* context) {
     const auto& mapping = *static_cast<const Mapping*>(context);
-    const auto position =
-            reinterpret_cast<uintptr_t>(frame) - reinterpret_cast<uintptr_t>(mapping.block);
-    if (position < mapping.size) {
-        fuzz::touch(frame, std::min<size_t>(length, mapping.size - position));
+    const uint8_t* const ring = mapping.block + kTouchCompanionRingOffset;
+    const auto* const bytes = static_cast<const uint8_t*>(frame);
+    if (bytes == ring && length == 0) {
+        return;
     }
+    constexpr size_t kHeader = 12;
+    fuzz::expect(bytes >= ring && bytes <= mapping.block + mapping.size &&
+                         static_cast<size_t>(mapping.block + mapping.size - bytes) >= kHeader,
+                 "a frame outside the ring was delivered");
+    const auto left = static_cast<size_t>(mapping.block + mapping.size - bytes);
+    fuzz::touch(bytes, std::min<size_t>(length, left));
 }
 
 void run(FuzzedDataProvider& input) {
