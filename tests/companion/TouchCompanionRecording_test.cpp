@@ -800,7 +800,7 @@ struct StreamCheck {
 
 TEST_F(TouchCompanionRecording, DeliversEveryFrameOfAFastWriter) {
     constexpr uint32_t kFrames = 5000;
-    mWaits.onWait([](int) { std::this_thread::yield(); });
+    mWaits.onWait([](int) { standAside(); });
     StreamCheck check{mRing};
     const sp<TouchCompanionClient> client = record(mRing, StreamCheck::callback, &check);
     const auto giveUp = std::chrono::steady_clock::now() + kPatience;
@@ -808,7 +808,7 @@ TEST_F(TouchCompanionRecording, DeliversEveryFrameOfAFastWriter) {
         if (written < kFrames && mRing.put()) {
             ++written;
         } else {
-            std::this_thread::yield();
+            standAside();
         }
     }
     EXPECT_EQ(0, client->stopRecord());

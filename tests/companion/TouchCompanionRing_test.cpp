@@ -337,7 +337,7 @@ void streamThrough(TouchCompanionClient& client, FrameRing& ring, uint32_t frame
             if (ring.put()) {
                 ++written;
             } else {
-                std::this_thread::yield();
+                standAside();
             }
         }
     });
@@ -363,7 +363,7 @@ void streamThrough(TouchCompanionClient& client, FrameRing& ring, uint32_t frame
 
 TEST_F(TouchCompanionRing, LosesNoFrameOfAFastWriter) {
     // Without real waits the reader meets an empty ring as often as it can.
-    mWaits.onWait([](int) { std::this_thread::yield(); });
+    mWaits.onWait([](int) { standAside(); });
     mRing.setStart(0xfffffff0);  // through the wrap of the indices
     streamThrough(*mClient, mRing, 20000);
 }

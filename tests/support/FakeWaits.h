@@ -14,6 +14,13 @@
 
 namespace pemaro::test {
 
+/// Leaves the processor to another thread of the test, where other programs compete for it as well: a
+/// thread that merely yields waits for all of these each time. It orders nothing that a race detector
+/// could take for the order of the two threads.
+inline void standAside() {
+    usleep(1);
+}
+
 /// While one lives the library's waits return at once: a wait on a condition as if its time were
 /// over, a sleep as if it had been slept. What they were asked for is kept.
 /// Only one may live at a time.
