@@ -1,0 +1,175 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "frames/RecordingFile.h"
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <fstream>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "frames/FrameGenerator.h"
+
+namespace pemaro::frames {
+
+namespace {
+
+constexpr size_t kLength = 128;  // of a frame of 4 columns and 9 rows, with two fingers
+
+using Kind = RecordingFile::Kind;
+
+struct Expected {
+    Kind kind;
+    uint64_t offset;
+    size_t length;
+    const char* problem;
+};
+
+class RecordingFileTest : public ::testing::Test {
+  protected:
+    ~RecordingFileTest() override { unlink(path.c_str()); }
+
+    std::string frame(uint32_t sequence) {
+        const std::vector<uint8_t>& bytes = generator.draw(sequence, 0, kFilterDefault);
+        EXPECT_EQ(kLength, bytes.size());
+        return {bytes.begin(), bytes.end()};
+    }
+
+    std::string framesTo(uint32_t count) {
+        std::string bytes;
+        for (uint32_t i = 0; i < count; ++i) {
+            bytes += frame(i);
+        }
+        return bytes;
+    }
+
+    std::unique_ptr<RecordingFile> write(const std::string& bytes) {
+        std::ofstream(path, std::ios::binary) << bytes;
+        return RecordingFile::open(path, &problem);
+    }
+
+    void expectParts(const std::string& bytes, const std::vector<Expected>& expected) {
+        const auto file = write(bytes);
+        ASSERT_NE(nullptr, file) << problem;
+        ASSERT_EQ(expected.size(), file->parts().size());
+        for (size_t i = 0; i < expected.size(); ++i) {
+            const RecordingFile::Part& part = file->parts()[i];
+            EXPECT_EQ(expected[i].kind, part.kind) << i;
+            EXPECT_EQ(expected[i].offset, part.offset) << i;
+            EXPECT_EQ(expected[i].length, part.length) << i;
+            EXPECT_STREQ(expected[i].problem, part.problem) << i;
+        }
+    }
+
+    const std::string path = testing::TempDir() + "RecordingFile_test." + std::to_string(getpid());
+    std::string problem;
+    FrameGenerator generator{128, 2};
+};
+
+}  // namespace
+
+TEST_F(RecordingFileTest, HasTheFramesThatWereWritten) {
+    const std::string bytes = framesTo(5);
+    const auto file = write(bytes);
+    ASSERT_NE(nullptr, file) << problem;
+    EXPECT_EQ(path, file->path());
+    EXPECT_EQ(bytes.size(), file->size());
+    ASSERT_EQ(5u, file->parts().size());
+    for (uint32_t i = 0; i < 5; ++i) {
+        const RecordingFile::Part& part = file->parts()[i];
+        EXPECT_EQ(Kind::kFrame, part.kind);
+        EXPECT_EQ(i, part.header.sequence);
+        EXPECT_EQ(frame(i), std::string(file->bytes(part), file->bytes(part) + part.length));
+    }
+}
+
+TEST_F(RecordingFileTest, WithoutFramesIsEmpty) {
+    expectParts("", {});
+}
+
+TEST_F(RecordingFileTest, NamesAForeignFile) {
+    for (const char* bytes : {"x",
+                              "\x7f"
+                              "ELF and so on",
+                              "a long text that is no recording at all"}) {
+        EXPECT_EQ(nullptr, write(bytes));
+        EXPECT_EQ(path + " is no recording of touch frames: it does not begin with one", problem);
+    }
+}
+
+TEST_F(RecordingFileTest, TellsWhyItCannotBeRead) {
+    EXPECT_EQ(nullptr, RecordingFile::open("/no/such/file", &problem));
+    EXPECT_EQ("cannot read /no/such/file: No such file or directory", problem);
+    EXPECT_EQ(nullptr, RecordingFile::open("/", &problem));
+    EXPECT_EQ("cannot read /: Is a directory", problem);
+}
+
+TEST_F(RecordingFileTest, EndsWithinAFrameWhereverItIsCut) {
+    const std::string bytes = framesTo(2);
+    for (const size_t left :
+         {size_t{1}, size_t{3}, size_t{12}, size_t{39}, size_t{40}, kLength - 1}) {
+        expectParts(bytes.substr(0, kLength + left),
+                    {{Kind::kFrame, 0, kLength, nullptr},
+                     {Kind::kTruncated, kLength, left, "the file ends within this frame"}});
+    }
+}
+
+TEST_F(RecordingFileTest, KeepsToTheLengthOfAFrameWithAWrongChecksum) {
+    std::string bytes = framesTo(4);
+    bytes[kLength + 60] ^= 1;
+    bytes[2 * kLength + 60] ^= 1;
+    expectParts(bytes, {{Kind::kFrame, 0, kLength, nullptr},
+                        {Kind::kCorrupt, kLength, kLength, "wrong checksum"},
+                        {Kind::kCorrupt, 2 * kLength, kLength, "wrong checksum"},
+                        {Kind::kFrame, 3 * kLength, kLength, nullptr}});
+}
+
+TEST_F(RecordingFileTest, FindsTheNextFrameBehindDamage) {
+    const std::string bytes = framesTo(3);
+    const struct {
+        size_t at;
+        char value;
+        const char* problem;
+    } rows[] = {
+            {0, 'z', "no frame begins here"},                    // the magic
+            {4, 9, "no frame begins here"},                      // the version
+            {8, 77, "a length that leads to no other frame"},    // a shorter length
+            {8, 0, "a length that leads to no other frame"},     // none
+            {11, 127, "a length that leads to no other frame"},  // far beyond the end
+    };
+    for (const auto& row : rows) {
+        std::string damaged = bytes;
+        damaged[kLength + row.at] = row.value;
+        expectParts(damaged, {{Kind::kFrame, 0, kLength, nullptr},
+                              {Kind::kCorrupt, kLength, kLength, row.problem},
+                              {Kind::kFrame, 2 * kLength, kLength, nullptr}});
+    }
+}
+
+TEST_F(RecordingFileTest, TellsOfBytesBehindTheLastFrame) {
+    expectParts(frame(0) + std::string(300, '\0'),
+                {{Kind::kFrame, 0, kLength, nullptr},
+                 {Kind::kCorrupt, kLength, 300, "no frame begins here"}});
+}
+
+TEST_F(RecordingFileTest, DoesNotTakeAMagicWithinAFrameForOne) {
+    std::string bytes = frame(0) + frame(1) + frame(2);
+    bytes.replace(kLength + 50, 4, "ZTFR");
+    bytes[kLength] = 'z';
+    expectParts(bytes, {{Kind::kFrame, 0, kLength, nullptr},
+                        {Kind::kCorrupt, kLength, kLength, "no frame begins here"},
+                        {Kind::kFrame, 2 * kLength, kLength, nullptr}});
+}
+
+TEST_F(RecordingFileTest, CanBeReadFromAPipe) {
+    ASSERT_EQ(0, mkfifo(path.c_str(), 0600));
+    std::thread writer([this] { std::ofstream(path, std::ios::binary) << framesTo(3); });
+    const auto file = RecordingFile::open(path, &problem);
+    writer.join();
+    ASSERT_NE(nullptr, file) << problem;
+    EXPECT_EQ(3u, file->parts().size());
+}
+
+}  // namespace pemaro::frames
