@@ -6,12 +6,22 @@
 
 #include "pemaro/Status.h"
 #include "simulator/companion/FileWriter.h"
+#include "simulator/companion/GeneratedFrames.h"
+#include "simulator/companion/ReplayedFrames.h"
 
 namespace pemaro::simulator {
 namespace {
 
 constexpr int kOutputFile = 0;
 constexpr int kOutputMemory = 1;
+
+std::unique_ptr<FrameSource> makeSource(const SimulatorOptions& options) {
+    if (options.replay != nullptr) {
+        return std::make_unique<ReplayedFrames>(options.replay, options.speed, options.loop);
+    }
+    return std::make_unique<GeneratedFrames>(
+            frames::FrameGenerator(options.frameBytes, options.fingers), options.rate);
+}
 
 }  // namespace
 
@@ -91,9 +101,7 @@ int ClientRecord::start() {
             return STATUS_ERROR_OPENING_FILE;
         }
     }
-    mRecording = std::make_unique<Recording>(
-            sink, frames::FrameGenerator(mOptions.frameBytes, mOptions.fingers), mOptions.rate,
-            mFilter);
+    mRecording = std::make_unique<Recording>(sink, makeSource(mOptions), mFilter);
     return STATUS_NO_ERROR;
 }
 

@@ -22,23 +22,21 @@ constexpr auto kMaxLag = std::chrono::seconds(1);
 }  // namespace
 
 struct Recording::Worker {
-    Worker(std::shared_ptr<FrameSink> frameSink, const frames::FrameGenerator& frames,
-           double framesPerSec, std::shared_ptr<const std::atomic<uint32_t>> recordFilter)
+    Worker(std::shared_ptr<FrameSink> frameSink, std::unique_ptr<FrameSource> frameSource,
+           std::shared_ptr<const std::atomic<uint32_t>> recordFilter)
             : sink(std::move(frameSink)),
-              generator(frames),
-              rate(framesPerSec),
+              source(std::move(frameSource)),
               filter(std::move(recordFilter)) {}
 
     void run();
     void runPaced();
     void runUnpaced();
-    const std::vector<uint8_t>& drawNext();
-    bool put(const std::vector<uint8_t>& frame) { return sink->put(frame.data(), frame.size()); }
+    FrameSource::Frame takeNext();
+    bool put(const FrameSource::Frame& frame) { return sink->put(frame.bytes, frame.length); }
     bool sleepUntil(Clock::time_point when);
 
     const std::shared_ptr<FrameSink> sink;
-    frames::FrameGenerator generator;
-    const double rate;
+    const std::unique_ptr<FrameSource> source;
     const std::shared_ptr<const std::atomic<uint32_t>> filter;
     std::atomic<uint64_t> produced{0};
     std::atomic<uint64_t> dropped{0};
@@ -50,7 +48,7 @@ struct Recording::Worker {
 };
 
 void Recording::Worker::run() {
-    if (rate > 0) {
+    if (source->isPaced()) {
         runPaced();
     } else {
         runUnpaced();
@@ -61,23 +59,23 @@ void Recording::Worker::run() {
 }
 
 void Recording::Worker::runPaced() {
-    const auto period =
-            std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(1.0 / rate));
-    Clock::time_point next = Clock::now();
-    while (sleepUntil(next)) {
-        if (!put(drawNext())) {
-            dropped += 1;
+    Clock::time_point start = Clock::now();
+    while (const auto due = source->due()) {
+        if (Clock::now() - (start + *due) > kMaxLag) {
+            start = Clock::now() - *due;
         }
-        next += period;
-        if (Clock::now() - next > kMaxLag) {
-            next = Clock::now();
+        if (!sleepUntil(start + *due)) {
+            return;
+        }
+        if (!put(takeNext())) {
+            dropped += 1;
         }
     }
 }
 
 void Recording::Worker::runUnpaced() {
-    while (sleepUntil(Clock::time_point())) {
-        const std::vector<uint8_t>& frame = drawNext();
+    while (source->due() && sleepUntil(Clock::time_point())) {
+        const FrameSource::Frame frame = takeNext();
         while (!put(frame)) {
             if (!sleepUntil(Clock::now() + kRoomPoll)) {
                 produced -= 1;
@@ -87,9 +85,9 @@ void Recording::Worker::runUnpaced() {
     }
 }
 
-const std::vector<uint8_t>& Recording::Worker::drawNext() {
+FrameSource::Frame Recording::Worker::takeNext() {
     const auto sequence = static_cast<uint32_t>(produced.fetch_add(1));
-    return generator.draw(sequence, monotonicTimeNs(), filter->load(std::memory_order_relaxed));
+    return source->next(sequence, monotonicTimeNs(), filter->load(std::memory_order_relaxed));
 }
 
 /// False when the recording is to end.
@@ -98,9 +96,9 @@ bool Recording::Worker::sleepUntil(Clock::time_point when) {
     return !changed.wait_until(guard, when, [this] { return stopping; });
 }
 
-Recording::Recording(std::shared_ptr<FrameSink> sink, const frames::FrameGenerator& generator,
-                     double rate, std::shared_ptr<const std::atomic<uint32_t>> filter)
-        : mWorker(std::make_shared<Worker>(std::move(sink), generator, rate, std::move(filter))),
+Recording::Recording(std::shared_ptr<FrameSink> sink, std::unique_ptr<FrameSource> source,
+                     std::shared_ptr<const std::atomic<uint32_t>> filter)
+        : mWorker(std::make_shared<Worker>(std::move(sink), std::move(source), std::move(filter))),
           mThread([worker = mWorker] { worker->run(); }) {}
 
 Recording::~Recording() {

@@ -6,22 +6,23 @@
 #include <memory>
 #include <thread>
 
-#include "frames/FrameGenerator.h"
 #include "simulator/companion/FrameSink.h"
+#include "simulator/companion/FrameSource.h"
 
 namespace pemaro::simulator {
 
-/// A running recording: a thread that draws frames at a fixed rate and puts them into a sink.
+/// A running recording: a thread that takes frames from a source when they are due and puts them into a
+/// sink.
 class Recording {
   public:
     struct Counts {
-        uint64_t produced = 0;  ///< frames drawn, each with a sequence number of its own
+        uint64_t produced = 0;  ///< frames of the source
         uint64_t dropped = 0;   ///< those of them that the sink had no room for
     };
 
-    /// Starts the thread. `rate` is in frames a second; 0 draws a frame whenever the sink has room,
-    /// so that none is ever dropped. `filter` may change while the recording runs.
-    Recording(std::shared_ptr<FrameSink> sink, const frames::FrameGenerator& generator, double rate,
+    /// Starts the thread. A frame that is due and finds no room is dropped; one of a source without a
+    /// pace waits for room. `filter` may change while the recording runs.
+    Recording(std::shared_ptr<FrameSink> sink, std::unique_ptr<FrameSource> source,
               std::shared_ptr<const std::atomic<uint32_t>> filter);
 
     /// Stops the recording.

@@ -3,11 +3,14 @@
 
 #include <cstdint>
 #include <functional>
+#include <memory>
 #include <string>
 
 #include "frames/Frame.h"
 
 namespace pemaro::simulator {
+
+class Replay;
 
 /// What kind of touch stack is simulated.
 struct SimulatorOptions {
@@ -17,11 +20,17 @@ struct SimulatorOptions {
     static constexpr uint64_t kMaxRingBytes = uint64_t{256} << 20;
     static constexpr uint32_t kMaxFingers = 10;
     static constexpr double kMaxRate = 100000;
+    static constexpr double kMaxSpeed = 1000;
 
     double rate = 240;           ///< frames a second; 0: as fast as the client takes them
     uint32_t frameBytes = 4096;  ///< the packet size, and a slot of the ring
     uint32_t ringFrames = 64;    ///< slots of the ring
     uint32_t fingers = 3;
+    /// Played instead of drawing frames, if set; no frame of it is longer than frameBytes. Then `rate`,
+    /// `fingers` and the record filter mean nothing.
+    std::shared_ptr<const Replay> replay;
+    double speed = 1;               ///< of the replay; 0: as fast as the client takes them
+    bool loop = false;              ///< whether the replay begins anew behind its end
     std::string configPath;         ///< the configuration's own place; empty: it has none
     std::string authText = "zelk";  ///< what setAuth() accepts
 

@@ -72,4 +72,7 @@ void sealGestureRecord(GestureRecord* record);
 /// Copies a record, of whatever alignment, after a look at it; null for one that is not intact.
 std::shared_ptr<const GestureRecord> readGestureRecord(const void* record);
 
+/// What a gesture is called that the panel knows by itself, like "swipe right"; empty for another.
+const char* gestureName(int gesture);
+
 }  // namespace pemaro::simulator

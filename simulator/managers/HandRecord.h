@@ -82,4 +82,7 @@ void sealHandRecord(HandRecord* record);
 /// Copies a record, of whatever alignment, after a look at it; null for one that is not intact.
 std::shared_ptr<const HandRecord> readHandRecord(const void* record);
 
+/// What an event is called, like "enrollment progress"; empty for one that there is not.
+const char* handEventName(HandEvent event);
+
 }  // namespace pemaro::simulator

@@ -15,6 +15,7 @@
 
 #include "frames/Frame.h"
 #include "pemaro/Status.h"
+#include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FrameCollector.h"
 
@@ -115,6 +116,31 @@ TEST(Recording, EndsWithTheClientThatForgotToStopIt) {
     const uint64_t before = frames.frames();
     std::this_thread::sleep_for(std::chrono::milliseconds(100));
     EXPECT_EQ(before, frames.frames());
+}
+
+TEST(Recording, CanBePlayedAgainBitForBit) {
+    Files files;
+    {
+        TouchStack touchStack({"--rate", "500", "--frame-bytes", "1000", "--ring-frames", "512"});
+        ASSERT_EQ(0, zelkctl({"record", "--frames", "100", "--output", files.path("once")}).status);
+    }
+    const struct {
+        Words options;
+        size_t times;
+    } rows[] = {{{}, 1}, {{"--speed", "0"}, 1}, {{"--speed", "10", "--loop"}, 3}};
+    for (const auto& row : rows) {
+        Words options = {"--replay", files.path("once"), "--ring-frames", "512"};
+        options.insert(options.end(), row.options.begin(), row.options.end());
+        TouchStack touchStack(options);
+        const RunResult again = zelkctl({"record", "--frames", std::to_string(100 * row.times),
+                                         "--output", files.path("again")});
+        EXPECT_EQ(0, again.status) << again.errors;
+        std::string expected;
+        for (size_t i = 0; i < row.times; ++i) {
+            expected += files.read("once");
+        }
+        EXPECT_TRUE(expected == files.read("again")) << again.output;
+    }
 }
 
 TEST(Recording, GoesToAFileOfTheServices) {

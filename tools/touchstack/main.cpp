@@ -8,17 +8,21 @@
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
+#include <chrono>
 #include <cstdio>
 #include <set>
 #include <string>
 #include <vector>
 
 #include "simulator/TouchStack.h"
+#include "simulator/companion/ReplayedFrames.h"
 #include "tools/common/BinderDriver.h"
 #include "tools/common/CommandLine.h"
 
 using pemaro::simulator::Fault;
 using pemaro::simulator::ManagerOptions;
+using pemaro::simulator::Replay;
 using pemaro::simulator::ServiceKind;
 using pemaro::simulator::SimulatorOptions;
 using pemaro::simulator::TouchStack;
@@ -29,6 +33,8 @@ namespace {
 
 struct CommandLine {
     TouchStack::Options options;
+    std::string replayPath;
+    bool hasFrameBytes = false;
     std::vector<Fault> faults;
     bool showLog = false;
 };
@@ -72,6 +78,20 @@ void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
                    "Serve only these: companion, touch, gesture, hand, separated by commas")
             ->delimiter(',')
             ->allow_extra_args(false);
+}
+
+void addReplayOptions(CLI::App& app, CommandLine& line) {
+    SimulatorOptions& options = line.options.companion;
+    CLI::Option* replay = app.add_option("--replay", line.replayPath,
+                                         "A recording to play, bit for bit and at its own pace, "
+                                         "instead of drawing frames");
+    replay->excludes("--rate")->excludes("--fingers");
+    app.add_option("--speed", options.speed,
+                   "How fast to play it: 2 is twice as fast, 0 as fast as the client takes it")
+            ->needs(replay)
+            ->check(CLI::Range(0.0, SimulatorOptions::kMaxSpeed))
+            ->capture_default_str();
+    app.add_flag("--loop", options.loop, "Play it again and again")->needs(replay);
 }
 
 void addManagerOptions(CLI::App& app, ManagerOptions& options) {
@@ -123,10 +143,57 @@ void checkRing(const SimulatorOptions& options) {
     }
 }
 
-void describeFrames(const SimulatorOptions& options) {
-    const std::string rate = options.rate > 0 ? fmt::format("{:g} frames/s", options.rate)
-                                              : std::string("as fast as they are taken");
+/// What is wrong with the recording to be played; empty when it is ready, or when there is none.
+std::string openReplay(CommandLine& line) {
+    SimulatorOptions& options = line.options.companion;
+    if (line.replayPath.empty()) {
+        return "";
+    }
+    std::string problem;
+    options.replay = Replay::open(line.replayPath, &problem);
+    if (options.replay == nullptr) {
+        return problem;
+    }
+    const size_t longest = options.replay->longestFrame();
+    if (!line.hasFrameBytes) {
+        options.frameBytes = static_cast<uint32_t>(longest);
+    }
+    if (longest > std::min(options.frameBytes, SimulatorOptions::kMaxFrameBytes)) {
+        return fmt::format("{} has a frame of {} bytes, too long for packets of {}",
+                           line.replayPath, longest,
+                           std::min(options.frameBytes, SimulatorOptions::kMaxFrameBytes));
+    }
+    return "";
+}
+
+const char* kUnpaced = "as fast as they are taken";
+
+void describeReplay(const CommandLine& line) {
+    const SimulatorOptions& options = line.options.companion;
+    const double seconds = std::chrono::duration<double>(options.replay->duration()).count();
+    fmt::print("replay      {}, {} frames of {:.3f} s, {}{}\n", line.replayPath,
+               options.replay->frames(), seconds,
+               options.speed > 0 ? fmt::format("speed {:g}", options.speed) : kUnpaced,
+               options.loop ? ", again and again" : "");
+    if (options.replay->leftOut() != 0) {
+        fmt::print("left out    {} bytes that are no frame\n", options.replay->leftOut());
+    }
+    fmt::print("frames      {} bytes\n", options.frameBytes);
+}
+
+void describeDrawing(const SimulatorOptions& options) {
+    const std::string rate =
+            options.rate > 0 ? fmt::format("{:g} frames/s", options.rate) : std::string(kUnpaced);
     fmt::print("frames      {} bytes, {}, {} fingers\n", options.frameBytes, rate, options.fingers);
+}
+
+void describeFrames(const CommandLine& line) {
+    const SimulatorOptions& options = line.options.companion;
+    if (options.replay != nullptr) {
+        describeReplay(line);
+    } else {
+        describeDrawing(options);
+    }
     fmt::print("ring        {} frames, {} bytes\n", options.ringFrames,
                pemaro::kTouchCompanionRingOffset + size_t{options.frameBytes} * options.ringFrames);
     if (!options.configPath.empty()) {
@@ -140,7 +207,7 @@ void describe(const CommandLine& line) {
         fmt::print("serving     {}\n", pemaro::simulator::registeredName(service));
     }
     if (options.services.count(ServiceKind::kCompanion) != 0) {
-        describeFrames(options.companion);
+        describeFrames(line);
     }
     fmt::print("events      {:g} gestures/s, {:g} hand steps/s\n", options.managers.gestureRate,
                options.managers.handRate);
@@ -203,6 +270,7 @@ int main(int argc, char** argv) {
     CommandLine line;
     Texts texts;
     addOptions(app, line, texts);
+    addReplayOptions(app, line);
     addManagerOptions(app, line.options.managers);
     const auto done = pemaro::tools::parseCommandLine(app, argc, argv, [&] {
         readServices(texts.services, line.options.services);
@@ -211,6 +279,11 @@ int main(int argc, char** argv) {
     });
     if (done) {
         return *done;
+    }
+    line.hasFrameBytes = app.count("--frame-bytes") != 0;
+    const std::string problem = openReplay(line);
+    if (!problem.empty()) {
+        return fail(problem);
     }
     pemaro::tools::showPlatformLog(line.showLog);
     pemaro::tools::leave(serve(line));

@@ -11,6 +11,8 @@
 #include <thread>
 #include <vector>
 
+#include "simulator/companion/GeneratedFrames.h"
+
 namespace pemaro::simulator {
 
 namespace {
@@ -58,11 +60,15 @@ class NotingSink : public FrameSink {
     std::vector<frames::FrameHeader> mFrames;
 };
 
+std::unique_ptr<FrameSource> drawnFrames(double rate) {
+    return std::make_unique<GeneratedFrames>(frames::FrameGenerator(200, 1), rate);
+}
+
 struct RunningRecording {
     explicit RunningRecording(double rate, int room = 1000000)
             : sink(std::make_shared<NotingSink>(room)),
               filter(std::make_shared<std::atomic<uint32_t>>(frames::kFilterDefault)),
-              recording(sink, frames::FrameGenerator(200, 1), rate, filter) {}
+              recording(sink, drawnFrames(rate), filter) {}
 
     const std::shared_ptr<NotingSink> sink;
     const std::shared_ptr<std::atomic<uint32_t>> filter;
@@ -157,8 +163,7 @@ TEST(Recording, AbandonsAThreadThatIsStuck) {
     };
     const auto sink = std::make_shared<StuckSink>();
     {
-        Recording recording(sink, frames::FrameGenerator(200, 1), 100,
-                            std::make_shared<std::atomic<uint32_t>>(0));
+        Recording recording(sink, drawnFrames(100), std::make_shared<std::atomic<uint32_t>>(0));
         sink->awaitReached();
     }
     sink->release();

@@ -1,0 +1,76 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "simulator/companion/ReplayedFrames.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace pemaro::simulator {
+namespace {
+
+using frames::RecordingFile;
+using std::chrono::nanoseconds;
+
+/// Between rounds of a recording whose frames have no distance in time.
+constexpr nanoseconds kShortestPause = std::chrono::milliseconds(1);
+
+}  // namespace
+
+std::shared_ptr<const Replay> Replay::open(const std::string& path, std::string* problem) {
+    auto file = RecordingFile::open(path, problem);
+    if (file == nullptr) {
+        return nullptr;
+    }
+    std::shared_ptr<Replay> replay(new Replay(std::move(file)));
+    if (replay->mFrames.empty()) {
+        *problem = path + " has no frame that could be played";
+        return nullptr;
+    }
+    return replay;
+}
+
+Replay::Replay(std::unique_ptr<const RecordingFile> file) : mFile(std::move(file)) {
+    nanoseconds due{0};
+    const RecordingFile::Part* before = nullptr;
+    for (const RecordingFile::Part& part : mFile->parts()) {
+        if (part.kind == RecordingFile::Kind::kTruncated || part.header.length != part.length) {
+            mLeftOut += part.length;
+            continue;
+        }
+        // The times of a corrupt frame are not believed; one that goes back is another recording's.
+        if (part.kind == RecordingFile::Kind::kFrame) {
+            if (before != nullptr) {
+                const auto step = static_cast<int64_t>(part.header.timeNs - before->header.timeNs);
+                due += nanoseconds(std::max<int64_t>(step, 0));
+            }
+            before = &part;
+        }
+        mFrames.push_back({mFile->bytes(part), part.length, due});
+        mLongest = std::max(mLongest, part.length);
+    }
+}
+
+ReplayedFrames::ReplayedFrames(std::shared_ptr<const Replay> replay, double speed, bool loop)
+        : mReplay(std::move(replay)), mSpeed(speed), mLoop(loop) {}
+
+std::optional<nanoseconds> ReplayedFrames::due() const {
+    if (mNext == mReplay->frames()) {
+        return std::nullopt;
+    }
+    const nanoseconds due = mRoundStart + mReplay->mFrames[mNext].due;
+    return isPaced() ? nanoseconds(static_cast<int64_t>(static_cast<double>(due.count()) / mSpeed))
+                     : due;
+}
+
+FrameSource::Frame ReplayedFrames::next(uint32_t, uint64_t, uint32_t) {
+    const Replay::Entry& entry = mReplay->mFrames[mNext];
+    mNext += 1;
+    if (mNext == mReplay->frames() && mLoop) {
+        const nanoseconds whole = mReplay->duration();
+        const auto intervals = std::max<int64_t>(static_cast<int64_t>(mReplay->frames()) - 1, 1);
+        mRoundStart += whole + std::max(whole / intervals, kShortestPause);
+        mNext = 0;
+    }
+    return {entry.bytes, entry.length};
+}
+
+}  // namespace pemaro::simulator
