@@ -7,6 +7,7 @@ set(ZELK_BP_LIBRARIES
   "android::binder=" "android::utils=" "android::log=" "android::ui=" "Threads::Threads=" "zelk::options="
   "GTest::gtest=" "GTest::gtest_main=" "dl="
   "android::base=shared_libs:libbase"
+  "PNG::PNG=shared_libs:libpng"
   "ZLIB::ZLIB=shared_libs:libz"
   "fmt::fmt=static_libs:libfmtlib"
   "CLI11::CLI11=header_libs:libcli11_headers"
@@ -17,8 +18,8 @@ set(ZELK_BP_LIBRARIES
   "zelk::testkit=static_libs:libzelktestkit"
   "zelktestkit=static_libs:libzelktestkit")
 # Tests that start a service manager, the programs or the completions of a desk; what counts costs there.
-set(ZELK_BP_DESK_ONLY tools_tests zelk_values_plain values_plain_test values_plain_comparison_test
-  values_allocations_test)
+set(ZELK_BP_DESK_ONLY report_page_test tools_tests zelk_values_plain values_plain_test
+  values_plain_comparison_test values_allocations_test)
 
 set_property(GLOBAL PROPERTY ZELK_BP "")
 

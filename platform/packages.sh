@@ -8,11 +8,14 @@ PACKAGES_PLATFORM=(android-libutils-dev android-libcutils-dev android-liblog-dev
 PACKAGES_BUILD=(g++ cmake ninja-build)
 # The address sanitizer is clang's, with its runtime and symbolizer. The exported interface is compared by
 # libabigail, and compiled with the device's C++ library as well; zsh runs its completion; spin verifies the
-# model of the shared ring. The benchmarks compare with nlohmann's reader; valgrind counts instructions.
+# model of the shared ring, and tmux is a terminal to draw on. The benchmarks compare with nlohmann's reader;
+# valgrind counts instructions.
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev valgrind clang
-    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin zsh)
+    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin tmux zsh)
+# The browser that shows what zelkctl makes for browsers; large, and for the tests without the driver alone.
+PACKAGES_BROWSER=(chromium)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
-PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev mandoc)
+PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev libpng-dev mandoc)
 # What makes Debian packages, looks at them and finds them used; the tests do so as well.
 PACKAGES_PACKAGING=(dpkg-dev debhelper lintian pkg-config)
 # What the Android tree is given is formatted and compiled by these: bpfmt, the policy's compilers, and the

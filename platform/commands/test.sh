@@ -88,7 +88,7 @@ report_stages() {
 }
 
 stage_native() {
-    need_packages "${PACKAGES_PACKAGING[@]}" "${PACKAGES_ANDROID[@]}"
+    need_packages "${PACKAGES_PACKAGING[@]}" "${PACKAGES_ANDROID[@]}" "${PACKAGES_BROWSER[@]}"
     run_ctest release native "$1"
 }
 

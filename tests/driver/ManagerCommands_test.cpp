@@ -116,7 +116,7 @@ TEST(ManagerCommands, OfTheHandBiometricManager) {
     EXPECT_EQ(7 * kHandBytes, files.read("events").size());
     for (const std::string& line : splitLines(enrolled.output)) {
         EXPECT_THAT(line, MatchesRegex("\\{\"time\":[0-9]+\\.[0-9]{3},\"size\":10016,"
-                                       "\"digest\":\"[0-9a-f]{8}\"\\}"));
+                                       "\"digest\":\"[0-9a-f]{8}\",\"kind\":\"hand\",.*\\}"));
     }
     expectRows({
             {{"hand", "profiles"}, 0, "hand 1\n1 of 5 profiles\n"},
@@ -146,6 +146,60 @@ TEST(ManagerCommands, OfTheHandBiometricManager) {
 
 // ---- watching ----
 
+TEST(ManagerCommands, TellGesturesInWords) {
+    TouchStack stack({"--gesture-rate", "40"});
+    for (const char* feature : {"1", "2", "3", "4"}) {
+        ASSERT_EQ(0, zelkctl({"touch", "enable", feature}).status);
+    }
+    ASSERT_EQ(0, zelkctl({"touch", "region", "0", "0", "1080", "2340"}).status);
+    const struct {
+        Words filter;
+        const char* line;
+    } rows[] = {
+            {{"--gesture", "circle"}, "circle \\(gesture 5, feature 2\\)"},
+            {{"--gesture", "8"}, "square \\(gesture 8, feature 4\\)"},
+            {{"--feature", "3"}, "[VZ] \\(gesture [67], feature 3\\)"},
+    };
+    for (const auto& row : rows) {
+        Words command = {"touch", "watch", "--count", "3"};
+        command.insert(command.end(), row.filter.begin(), row.filter.end());
+        const RunResult watch = zelkctl(command);
+        EXPECT_EQ(0, watch.status);
+        const std::vector<std::string> lines = splitLines(watch.output);
+        EXPECT_EQ(3u, lines.size());
+        for (const std::string& line : lines) {
+            EXPECT_THAT(line,
+                        MatchesRegex("[0-9:]{8}\\.[0-9]{3}  #[0-9]+  " + std::string(row.line) +
+                                     "  [0-9]+, [0-9]+ to [0-9]+, [0-9]+ in [0-9]+ ms  "
+                                     "inside the region"));
+        }
+    }
+    const RunResult drawn = zelkctl({"touch", "watch", "-n", "1", "--draw"});
+    EXPECT_EQ(0, drawn.status);
+    EXPECT_EQ(23u, splitLines(drawn.output).size()) << drawn.output;
+}
+
+TEST(ManagerCommands, TellHandEventsInWords) {
+    TouchStack stack({"--hand-rate", "50"});
+    const RunResult enrolled = zelkctl({"hand", "enroll", "-n", "7"});
+    EXPECT_EQ(0, enrolled.status);
+    const char* words[] = {"enrollment started",        "enrollment progress, 20 %",
+                           "enrollment progress, 40 %", "enrollment progress, 60 %",
+                           "enrollment progress, 80 %", "enrollment progress, 100 %",
+                           "enrollment done as hand 1"};
+    const std::vector<std::string> lines = splitLines(enrolled.output);
+    ASSERT_EQ(std::size(words), lines.size());
+    for (size_t i = 0; i < lines.size(); ++i) {
+        EXPECT_THAT(lines[i],
+                    MatchesRegex("[0-9:]{8}\\.[0-9]{3}  #[0-9]+  " + std::string(words[i])));
+    }
+    const RunResult matched = zelkctl({"hand", "match", "-n", "1", "--event", "matched"});
+    EXPECT_EQ(0, matched.status);
+    EXPECT_THAT(matched.output, MatchesRegex("[0-9:]{8}\\.[0-9]{3}  #[0-9]+  matched hand 1, score "
+                                             "[0-9]+ at security level 1\n"));
+    ASSERT_EQ(0, zelkctl({"hand", "match", "--stop"}).status);
+}
+
 namespace {
 
 struct WatchRow {
@@ -162,7 +216,7 @@ TEST_P(ManagerWatch, GoesOnWithTheRestartedServiceUntilInterrupted) {
     auto stack = std::make_unique<TouchStack>(stackOptions(row.manager));
     ASSERT_EQ(0, zelkctl(row.letEventsFlow).status);
     ChildProcess watch({binary("zelkctl"), row.manager, "watch"});
-    ASSERT_TRUE(watch.awaitOutput(" bytes  "));
+    ASSERT_TRUE(watch.awaitOutput("  #"));
     stack->kill();
     ASSERT_TRUE(watch.awaitOutput("  the service died\n"));
 
@@ -178,7 +232,7 @@ TEST_P(ManagerWatch, GoesOnWithTheRestartedServiceUntilInterrupted) {
     const std::string left = std::string(row.manager) + ": a subscriber unsubscribed, 0 now";
     EXPECT_TRUE(stack->awaitLine(left));
     EXPECT_THAT(splitLines(watch.output()).back(),
-                MatchesRegex("[0-9:]{8}\\.[0-9]{3}  (72144|10016) bytes  [0-9a-f]{8}"));
+                MatchesRegex("[0-9:]{8}\\.[0-9]{3}  #[0-9]+  .*"));
 }
 
 TEST_P(ManagerWatch, EndsByItselfAfterSecondsWithoutEvents) {

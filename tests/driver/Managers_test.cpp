@@ -120,7 +120,7 @@ TYPED_TEST(Managers, EventsReachClientsInSeveralProcesses) {
     ASSERT_TRUE(stack.awaitLine(this->counted("subscribed", 2)));
     ASSERT_EQ(0, TypeParam::letEventsFlow(*client));
     EXPECT_TRUE(events.await(10));
-    EXPECT_TRUE(other->awaitOutput(" bytes  "));
+    EXPECT_TRUE(other->awaitOutput("  #"));
     client->deinit();
     for (const std::string& record : events.records()) {
         EXPECT_TRUE(TypeParam::isIntact(record));
@@ -153,7 +153,7 @@ TYPED_TEST(Managers, TheServiceForgetsAKilledClientAndGoesOn) {
     ASSERT_EQ(0, client->init());
     ASSERT_EQ(0, TypeParam::letEventsFlow(*client));
     const auto other = this->watcher();
-    ASSERT_TRUE(other->awaitOutput(" bytes  "));
+    ASSERT_TRUE(other->awaitOutput("  #"));
     other->signal(SIGKILL);
     EXPECT_TRUE(stack.awaitLine(this->counted("died", 1)));
     EXPECT_TRUE(events.await(events.count() + 5));
@@ -219,7 +219,7 @@ TYPED_TEST(Managers, OneThatStandsStillHoldsUpNobody) {
     ASSERT_EQ(0, client->init());
     ASSERT_EQ(0, TypeParam::letEventsFlow(*client));
     const auto other = this->watcher();
-    ASSERT_TRUE(other->awaitOutput(" bytes  "));
+    ASSERT_TRUE(other->awaitOutput("  #"));
     other->signal(SIGSTOP);
     EXPECT_TRUE(events.await(events.count() + 100)) << "more than the other's queue holds";
     other->signal(SIGKILL);

@@ -74,6 +74,9 @@ INSTANTIATE_TEST_SUITE_P(
 INSTANTIATE_TEST_SUITE_P(
         CompanionCommands, Usage,
         ::testing::Values(
+                Misuse{"zelkctl check finger",
+                       "zelkctl: SERVICE: finger not in {companion,touch,gesture,hand}"},
+                Misuse{"zelkctl check --json --tap", "zelkctl: --json excludes --tap"},
                 Misuse{"zelkctl command", "zelkctl: TEXT is required"},
                 Misuse{"zelkctl command calibrate 3",
                        "zelkctl: The following argument was not expected: 3"},
@@ -108,6 +111,15 @@ INSTANTIATE_TEST_SUITE_P(
                 Misuse{"zelkctl touch enable x", "zelkctl: Could not convert: NUMBER = x"},
                 Misuse{"zelkctl touch region 1 2 3", "zelkctl: BOTTOM is required"},
                 Misuse{"zelkctl touch region 1 2 3 4 --on --off", "zelkctl: --on excludes --off"},
+                Misuse{"zelkctl touch watch --gesture spiral",
+                       "zelkctl: --gesture: there is no gesture 'spiral'; there are swipe-right, "
+                       "swipe-left, swipe-up, swipe-down, circle, v, z, square, and the user's by "
+                       "their numbers"},
+                Misuse{"zelkctl hand watch --event 14",
+                       "zelkctl: --event: there is no event '14'; there are enrollment-started, "
+                       "enrollment-progress, enrollment-done, enrollment-stopped, scan-started, "
+                       "scan-done, matching-started, hand-detected, matched, not-matched, "
+                       "matching-stopped, cancelled, wake-up"},
                 Misuse{"zelkctl touch watch --count 0",
                        "zelkctl: --count: Value 0 not in range 1 to 1000000000000"},
                 Misuse{"zelkctl gesture wakeup", "zelkctl: on|off is required"},

@@ -6,11 +6,17 @@
 # words to choose from.
 _zelkctl_words() {
     case $1 in
-    '') echo '--help --version --log ping record record-file command filter property event inspect packet-size auth
-        config session touch gesture hand' ;;
+    '') echo '--help --version --log ping check record record-file frames command filter property event inspect
+        packet-size auth config session touch gesture hand' ;;
     ping | filter | event | auth | 'session restore') echo '--help' ;;
+    check) echo '--help --invasive --json --tap|companion touch gesture hand' ;;
     record) echo '--help --frames --seconds --output' ;;
     record-file) echo '--help --seconds|file' ;;
+    frames) echo '--help watch stat export report' ;;
+    'frames report') echo '--help --output --every|file' ;;
+    'frames watch') echo '--help --seconds --json' ;;
+    'frames stat') echo '--help --json|file' ;;
+    'frames export') echo '--help --format --output --first --last --every --scale|file' ;;
     command | inspect | packet-size | 'session save') echo '--help --json' ;;
 
     property) echo '--help set' ;;
@@ -32,8 +38,10 @@ _zelkctl_words() {
     'gesture limits' | 'hand profiles') echo '--help --json' ;;
 
     hand) echo '--help enroll scan match cancel security profiles name rename delete wakeup watch' ;;
-    'hand enroll' | 'hand match') echo '--help --count --seconds --output --json --stop' ;;
-    'hand scan' | *' watch') echo '--help --count --seconds --output --json' ;;
+    'touch watch') echo '--help --count --seconds --output --json --gesture --draw --feature' ;;
+    'gesture watch') echo '--help --count --seconds --output --json --gesture --draw' ;;
+    'hand enroll' | 'hand match') echo '--help --count --seconds --output --json --event --stop' ;;
+    'hand scan' | 'hand watch') echo '--help --count --seconds --output --json --event' ;;
     *) echo '--help' ;;
     esac
 }
@@ -44,7 +52,7 @@ _zelkctl() {
     for ((i = 1; i < COMP_CWORD; i++)); do
         word=${COMP_WORDS[i]}
         case $word in
-        --output | -o | --frames | --seconds | --count | --first | --last | -n | -s)
+        --output | -o | --format | -f | --every | --scale | --gesture | --feature | --event | --frames | --seconds | --count | --first | --last | -n | -s)
             if ((++i < COMP_CWORD)); then
                 continue
             fi
@@ -58,7 +66,7 @@ _zelkctl() {
         *)
             case $command in
             '') command=$word ;;
-            property | session | config | touch | gesture | hand) command+=" $word" ;;
+            property | session | frames | config | touch | gesture | hand) command+=" $word" ;;
             esac
             ;;
         esac

@@ -7,7 +7,9 @@
 #include <CLI/CLI.hpp>
 
 #include "tools/common/CommandLine.h"
+#include "tools/zelkctl/commands/CheckCommand.h"
 #include "tools/zelkctl/commands/Commands.h"
+#include "tools/zelkctl/commands/frames/FramesCommands.h"
 
 int main(int argc, char** argv) {
     CLI::App app("Talks to the touch service through libzelkclient.", "zelkctl");
@@ -17,8 +19,10 @@ int main(int argc, char** argv) {
 
     pemaro::zelkctl::Action action;
     pemaro::zelkctl::addPingCommand(app, action);
+    pemaro::zelkctl::addCheckCommand(app, action);
     pemaro::zelkctl::addRecordCommand(app, action);
     pemaro::zelkctl::addRecordFileCommand(app, action);
+    pemaro::zelkctl::addFramesCommands(app, action);
     pemaro::zelkctl::addCommandCommand(app, action);
     pemaro::zelkctl::addFilterCommand(app, action);
     pemaro::zelkctl::addPropertySetCommand(app, action);

@@ -31,8 +31,9 @@ int watchManager(const WatchOptions& options, int (Manager::Client::*begin)() = 
 }
 
 template <typename Manager>
-void addManagerWatchCommand(CLI::App& manager, Action& action, const char* help) {
-    addWatchCommand(manager, action, "watch", help,
+void addManagerWatchCommand(CLI::App& manager, Action& action, const char* help,
+                            const std::function<void(CLI::App&, WatchOptions&)>& addMore) {
+    addWatchCommand(manager, action, "watch", help, addMore,
                     [](const WatchOptions& options) { return watchManager<Manager>(options); });
 }
 

@@ -10,6 +10,7 @@
 #include "tools/zelkctl/commands/Lasting.h"
 #include "tools/zelkctl/services/Connection.h"
 #include "tools/zelkctl/services/FrameReceiver.h"
+#include "tools/zelkctl/services/FrameStream.h"
 #include "tools/zelkctl/terminal/LiveLine.h"
 #include "tools/zelkctl/terminal/Report.h"
 #include "tools/zelkctl/terminal/StopSignal.h"
@@ -21,7 +22,6 @@ using Clock = std::chrono::steady_clock;
 using Seconds = std::chrono::duration<double>;
 using std::chrono::milliseconds;
 
-constexpr int kOutputMemory = 1;
 constexpr uint64_t kMaxFrames = 1000000000000;
 constexpr milliseconds kRedrawPeriod(200);
 constexpr milliseconds kLinePeriod(1000);
@@ -31,12 +31,6 @@ struct RecordOptions {
     double seconds = 0;
     std::string output;
 };
-
-std::string describeLosses(const FrameStats& stats) {
-    return stats.sequenced || stats.frames == 0
-                   ? fmt::format("{} lost in {} gaps", stats.lost, stats.gaps)
-                   : std::string("no sequence numbers");
-}
 
 /// Shows the progress of a recording now and then.
 class Progress {
@@ -124,26 +118,14 @@ int record(const RecordOptions& options) {
     if (facade == nullptr) {
         return tools::kExitFailure;
     }
-    const int packetSize = facade->getPacketSize();
-    if (packetSize >= STATUS_UNKNOWN_ERROR) {
-        return failStatus("getPacketSize", packetSize);
+    if (preparePackets(*facade, receiver) != tools::kExitSuccess) {
+        return tools::kExitFailure;
     }
-    if (packetSize <= 0) {
-        return fail(fmt::format("the service tells a packet size of {} bytes", packetSize));
-    }
-    receiver.setPacketSize(static_cast<uint32_t>(packetSize));
     if (!options.output.empty() && !file.open(options.output)) {
         return fail(file.problem());
     }
-    int status = facade->setRecordOutput(kOutputMemory);
-    if (status != STATUS_NO_ERROR) {
-        return failStatus("setRecordOutput", status);
-    }
-    status = facade->startRecord();
-    if (status != STATUS_NO_ERROR) {
-        // The recording thread may be at work already.
-        facade->stopRecord();
-        return failStatus("startRecord", status);
+    if (startStream(*facade) != tools::kExitSuccess) {
+        return tools::kExitFailure;
     }
     const double seconds = watch(options, *connection, stopSignal, receiver);
     return finish(*facade, *connection, file, receiver, seconds);

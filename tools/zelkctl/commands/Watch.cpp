@@ -20,6 +20,10 @@ using std::chrono::milliseconds;
 
 constexpr uint64_t kMaxEvents = 1000000000000;
 
+std::string noSuch(const char* what, const std::string& text, const std::string& words) {
+    return fmt::format("there is no {} '{}'; there are {}", what, text, words);
+}
+
 /// The watching of one client, from its first connection to its end.
 class Watcher {
   public:
@@ -104,11 +108,43 @@ void addWatchOptions(CLI::App& command, WatchOptions& options) {
     command.add_flag("--json", options.json, "Print each event as a line of JSON");
 }
 
+void addGestureOptions(CLI::App& command, WatchOptions& options) {
+    command.add_option_function<std::string>(
+            "--gesture",
+            [&options](const std::string& text) {
+                options.filter.gesture = gestureOf(text);
+                if (!options.filter.gesture) {
+                    throw CLI::ValidationError("--gesture",
+                                               noSuch("gesture", text, gestureWords()));
+                }
+            },
+            "Only this gesture, a number or a name like swipe-right");
+    command.add_flag("--draw", options.draw, "Draw the strokes, or with --json list their points");
+}
+
+void addFeatureOption(CLI::App& command, WatchOptions& options) {
+    command.add_option("--feature", options.filter.feature, "Only gestures of this feature");
+}
+
+void addHandEventOption(CLI::App& command, WatchOptions& options) {
+    command.add_option_function<std::string>(
+            "--event",
+            [&options](const std::string& text) {
+                options.filter.event = handEventOf(text);
+                if (!options.filter.event) {
+                    throw CLI::ValidationError("--event", noSuch("event", text, handEventWords()));
+                }
+            },
+            "Only this event, a number or a name like hand-detected");
+}
+
 void addWatchCommand(CLI::App& app, Action& action, const char* name, const char* help,
+                     const std::function<void(CLI::App&, WatchOptions&)>& addMore,
                      std::function<int(const WatchOptions&)> run) {
     auto options = std::make_shared<WatchOptions>();
     CLI::App* command = app.add_subcommand(name, help);
     addWatchOptions(*command, *options);
+    addMore(*command, *options);
     command->callback([=, &action] { action = [=] { return run(*options); }; });
 }
 
@@ -123,6 +159,7 @@ int watch(const WatchOptions& options, const MakeWatched& make) {
     // It lives as long as the process: an event may still be on its way when we leave.
     auto* receiver = new EventReceiver(options.output.empty() ? nullptr : &file, options.count,
                                        options.json);
+    receiver->choose(options.filter, options.draw);
     const Watched watched = make(receiver);
     const int result = Watcher(options, watched, *receiver).run();
     const uint64_t taken = receiver->close();

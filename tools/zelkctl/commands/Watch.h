@@ -16,14 +16,23 @@ struct WatchOptions {
     double seconds = 0;  ///< 0: until told to stop
     std::string output;
     bool json = false;
+    EventFilter filter;  ///< others are neither shown, nor counted, nor kept
+    bool draw = false;   ///< strokes
 
     bool isLimited() const { return count != 0 || seconds > 0; }
 };
 
 void addWatchOptions(CLI::App& command, WatchOptions& options);
 
-/// A command that watches, and has no other options.
+// Which of the events are wanted, for managers that report such.
+
+void addGestureOptions(CLI::App& command, WatchOptions& options);
+void addFeatureOption(CLI::App& command, WatchOptions& options);
+void addHandEventOption(CLI::App& command, WatchOptions& options);
+
+/// A command that watches, and has no options but these and those that `addMore` adds.
 void addWatchCommand(CLI::App& app, Action& action, const char* name, const char* help,
+                     const std::function<void(CLI::App&, WatchOptions&)>& addMore,
                      std::function<int(const WatchOptions&)> run);
 
 /// What is watched: a manager's name, and its client.

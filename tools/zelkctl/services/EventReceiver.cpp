@@ -7,6 +7,7 @@
 
 #include "frames/Checksum.h"
 #include "tools/zelkctl/terminal/Json.h"
+#include "tools/zelkctl/terminal/TerminalTraits.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -19,6 +20,27 @@ std::string timeOfDay(Clock::time_point when) {
                        rounded.time_since_epoch().count() % 1000);
 }
 
+std::string digestOf(const void* record, size_t size) {
+    return fmt::format("{:08x}", frames::crc32(record, size));
+}
+
+std::string jsonLine(Clock::time_point when, const void* record, size_t size,
+                     const EventRecord& event, bool stroke) {
+    JsonObject object;
+    object.addTime("time", when).add("size", static_cast<int64_t>(size));
+    object.add("digest", digestOf(record, size));
+    event.describe(object, stroke);
+    return object.text();
+}
+
+std::string plainLine(Clock::time_point when, const void* record, size_t size,
+                      const EventRecord& event) {
+    const std::string words = event.isKnown()
+                                      ? event.words()
+                                      : fmt::format("{} bytes  {}", size, digestOf(record, size));
+    return fmt::format("{}  {}", timeOfDay(when), words);
+}
+
 void printLine(const std::string& line) {
     fmt::print("{}\n", line);
     fflush(stdout);
@@ -27,9 +49,21 @@ void printLine(const std::string& line) {
 }  // namespace
 
 std::string eventLine(Clock::time_point when, const void* record, size_t size, bool json) {
-    const std::string digest = fmt::format("{:08x}", frames::crc32(record, size));
-    return json ? JsonObject().addTime("time", when).add("size", size).add("digest", digest).text()
-                : fmt::format("{}  {} bytes  {}", timeOfDay(when), size, digest);
+    const EventRecord event = EventRecord::read(record, size);
+    return json ? jsonLine(when, record, size, event, false) : plainLine(when, record, size, event);
+}
+
+std::string eventText(Clock::time_point when, const void* record, size_t size, bool json,
+                      bool unicode) {
+    const EventRecord event = EventRecord::read(record, size);
+    if (json) {
+        return jsonLine(when, record, size, event, true);
+    }
+    std::string text = plainLine(when, record, size, event);
+    for (const std::string& line : event.drawing(unicode)) {
+        text += "\n" + line;
+    }
+    return text;
 }
 
 std::string serviceLine(Clock::time_point when, const char* what, bool json) {
@@ -60,10 +94,14 @@ void EventReceiver::take(const void* record, size_t size) {
     }
     // The library hands on a record that the service cut short as none at all.
     const size_t present = record == nullptr ? 0 : size;
+    if (!mFilter.isEmpty() && !EventRecord::read(record, present).passes(mFilter)) {
+        return;
+    }
     if (mFile != nullptr && present != 0 && !mFile->write(record, present)) {
         mDone = true;
     } else {
-        printLine(eventLine(Clock::now(), record, present, mJson));
+        printLine(mDraw ? eventText(Clock::now(), record, present, mJson, terminalTraits().unicode)
+                        : eventLine(Clock::now(), record, present, mJson));
         mTaken += 1;
         mDone = mTaken == mLimit;
     }

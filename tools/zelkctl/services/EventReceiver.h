@@ -9,13 +9,15 @@
 #include <string>
 
 #include "frames/FrameFile.h"
+#include "tools/zelkctl/services/EventRecord.h"
 
 namespace pemaro::zelkctl {
 
-/// Prints the events of a manager, one a line, and keeps their records. What is in a record is a
-/// matter between the service and its users; a line tells when it came, its size and a digest,
-/// the CRC-32 of its bytes:
+/// Prints the events of a manager, one a line, and keeps their records. A line tells when an event came
+/// and what it was (see EventRecord), or of a record of an unknown kind its size and a digest, the
+/// CRC-32 of its bytes:
 ///
+///     19:14:05.123  #3  enrollment progress, 40 %
 ///     19:14:05.123  72144 bytes  3f2a9c01
 ///     {"time":1795201445.123,"size":72144,"digest":"3f2a9c01"}
 class EventReceiver {
@@ -23,6 +25,13 @@ class EventReceiver {
     /// `file` may be null; `limit` events are taken, all if 0.
     EventReceiver(frames::FrameFile* file, uint64_t limit, bool json)
             : mFile(file), mLimit(limit), mJson(json) {}
+
+    /// To be told before the first event: others are passed over, and strokes may be drawn, or with
+    /// JSON listed.
+    void choose(const EventFilter& filter, bool draw) {
+        mFilter = filter;
+        mDraw = draw;
+    }
 
     /// The callback of a client; `context` is the receiver.
     template <typename Record>
@@ -46,6 +55,8 @@ class EventReceiver {
     frames::FrameFile* const mFile;
     const uint64_t mLimit;
     const bool mJson;
+    EventFilter mFilter;
+    bool mDraw = false;
 
     std::mutex mLock;
     std::condition_variable mChanged;
@@ -56,6 +67,11 @@ class EventReceiver {
 /// The line of an event, or of one that came without a record, whose size is then 0.
 std::string eventLine(std::chrono::system_clock::time_point when, const void* record, size_t size,
                       bool json);
+
+/// The same, behind it a gesture's stroke: points in the JSON object, or else a drawing in lines of
+/// their own.
+std::string eventText(std::chrono::system_clock::time_point when, const void* record, size_t size,
+                      bool json, bool unicode);
 
 /// The line that tells that the service died or is back.
 std::string serviceLine(std::chrono::system_clock::time_point when, const char* what, bool json);

@@ -13,6 +13,12 @@ constexpr size_t kMinFrame = 12;
 
 }  // namespace
 
+std::string describeLosses(const FrameStats& stats) {
+    return stats.sequenced || stats.frames == 0
+                   ? fmt::format("{} lost in {} gaps", stats.lost, stats.gaps)
+                   : std::string("no sequence numbers");
+}
+
 void FrameReceiver::onFrame(int, void* frame, unsigned long length, void* context) {
     static_cast<FrameReceiver*>(context)->take(frame, length);
 }
@@ -71,15 +77,12 @@ std::string FrameReceiver::check(const void* frame, size_t length) {
 }
 
 void FrameReceiver::follow(uint32_t sequence) {
-    // The first frame of a recording has the number 0.
-    // A number that goes back is a gap of unknown size.
-    const auto missing = static_cast<int32_t>(sequence - mNextSequence);
-    if (missing != 0) {
+    uint64_t lost = 0;
+    if (mSequence.isGap(sequence, &lost)) {
         mStats.gaps += 1;
-        mStats.lost += missing > 0 ? static_cast<uint64_t>(missing) : 0;
+        mStats.lost += lost;
     }
     mStats.sequenced = true;
-    mNextSequence = sequence + 1;
 }
 
 }  // namespace pemaro::zelkctl

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "frames/FrameFile.h"
+#include "frames/Sequence.h"
 
 namespace pemaro::zelkctl {
 
@@ -21,6 +22,9 @@ struct FrameStats {
     bool sequenced = false;  ///< whether the frames carry sequence numbers at all
     std::string firstCorrupt;  ///< what was wrong with the first corrupt one
 };
+
+/// What is missing, in words.
+std::string describeLosses(const FrameStats& stats);
 
 /// Takes the frames of a recording: checks, counts and writes them.
 class FrameReceiver {
@@ -53,7 +57,7 @@ class FrameReceiver {
     std::condition_variable mChanged;
     FrameStats mStats;
     bool mDone = false;
-    uint32_t mNextSequence = 0;
+    frames::Sequence mSequence;
 };
 
 }  // namespace pemaro::zelkctl

@@ -5,6 +5,8 @@
 #include <rapidjson/encodings.h>
 #include <rapidjson/memorystream.h>
 
+#include <cmath>
+
 namespace pemaro::zelkctl {
 namespace {
 
@@ -51,6 +53,36 @@ JsonObject& JsonObject::add(const std::string& name, const std::vector<std::stri
         addText(value);
     }
     mWriter.EndArray();
+    return *this;
+}
+
+JsonObject& JsonObject::add(const std::string& name, const std::vector<int64_t>& values) {
+    addName(name);
+    mWriter.StartArray();
+    for (const int64_t value : values) {
+        mWriter.Int64(value);
+    }
+    mWriter.EndArray();
+    return *this;
+}
+
+JsonObject& JsonObject::add(const std::string& name, JsonObject& object) {
+    addName(name);
+    const std::string text = object.text();
+    mWriter.RawValue(text.data(), text.size(), rapidjson::kObjectType);
+    return *this;
+}
+
+JsonObject& JsonObject::add(const std::string& name, JsonArray& array) {
+    addName(name);
+    const std::string text = array.text();
+    mWriter.RawValue(text.data(), text.size(), rapidjson::kArrayType);
+    return *this;
+}
+
+JsonObject& JsonObject::addReal(const std::string& name, double value) {
+    addName(name);
+    mWriter.Double(std::round(value * 1e6) / 1e6);
     return *this;
 }
 

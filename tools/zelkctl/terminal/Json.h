@@ -11,6 +11,8 @@
 
 namespace pemaro::zelkctl {
 
+class JsonArray;
+
 /// A JSON object on one line, its members in the order in which they are added.
 ///
 ///     JsonObject().add("session", 3).text()    // {"session":3}
@@ -22,6 +24,12 @@ class JsonObject {
     /// Bytes that are no UTF-8 are replaced, each by U+FFFD: JSON has no place for them.
     JsonObject& add(const std::string& name, const std::string& value);
     JsonObject& add(const std::string& name, const std::vector<std::string>& values);
+    JsonObject& add(const std::string& name, const std::vector<int64_t>& values);
+    /// Objects within the object.
+    JsonObject& add(const std::string& name, JsonObject& object);
+    JsonObject& add(const std::string& name, JsonArray& array);
+    /// To the sixth decimal place. REQUIRES: it is finite.
+    JsonObject& addReal(const std::string& name, double value);
     JsonObject& addFlag(const std::string& name, bool value);
     /// Seconds since 1970, to the millisecond.
     JsonObject& addTime(const std::string& name, std::chrono::system_clock::time_point when);

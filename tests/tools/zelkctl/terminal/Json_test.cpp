@@ -50,6 +50,25 @@ TEST(JsonObject, WritesFlagsAndTimes) {
               JsonObject().addFlag("on", true).addFlag("off", false).addTime("time", when).text());
 }
 
+TEST(JsonObject, HoldsRealNumbers) {
+    EXPECT_EQ("{\"a\":1.5,\"b\":4.166667,\"c\":0.0,\"d\":-240.0}", JsonObject()
+                                                                           .addReal("a", 1.5)
+                                                                           .addReal("b", 25.0 / 6)
+                                                                           .addReal("c", 1e-9)
+                                                                           .addReal("d", -240)
+                                                                           .text());
+}
+
+TEST(JsonObject, HoldsObjectsAndArrays) {
+    EXPECT_EQ("{\"o\":{\"a\":1},\"l\":[{\"b\":2}],\"n\":[1,-2],\"e\":[]}",
+              JsonObject()
+                      .add("o", JsonObject().add("a", 1))
+                      .add("l", JsonArray().add(JsonObject().add("b", 2)))
+                      .add("n", std::vector<int64_t>{1, -2})
+                      .add("e", std::vector<int64_t>{})
+                      .text());
+}
+
 TEST(JsonArray, HoldsObjectsInTheirOrder) {
     EXPECT_EQ("[]", JsonArray().text());
     EXPECT_EQ("[{\"a\":1},{\"b\":2}]",

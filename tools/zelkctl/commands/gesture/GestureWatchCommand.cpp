@@ -5,7 +5,8 @@
 namespace pemaro::zelkctl {
 
 void addGestureWatchCommand(CLI::App& gesture, Action& action) {
-    addManagerWatchCommand<GestureManager>(gesture, action, "Print each gesture that is reported");
+    addManagerWatchCommand<GestureManager>(gesture, action, "Print each gesture that is reported",
+                                           addGestureOptions);
 }
 
 }  // namespace pemaro::zelkctl

@@ -39,6 +39,7 @@ void addHandActivityCommand(CLI::App& hand, Action& action, const HandActivity& 
             activity.name,
             std::string(activity.help) + "; with --count or --seconds, watch the events");
     addWatchOptions(*command, options->watch);
+    addHandEventOption(*command, options->watch);
     if (activity.stop != nullptr) {
         command->add_flag("--stop", options->stop, "End it instead")
                 ->excludes("--count")

@@ -5,7 +5,8 @@
 namespace pemaro::zelkctl {
 
 void addHandWatchCommand(CLI::App& hand, Action& action) {
-    addManagerWatchCommand<HandManager>(hand, action, "Print each event that is reported");
+    addManagerWatchCommand<HandManager>(hand, action, "Print each event that is reported",
+                                        addHandEventOption);
 }
 
 }  // namespace pemaro::zelkctl

@@ -5,7 +5,11 @@
 namespace pemaro::zelkctl {
 
 void addTouchWatchCommand(CLI::App& touch, Action& action) {
-    addManagerWatchCommand<TouchManager>(touch, action, "Print each gesture that is reported");
+    addManagerWatchCommand<TouchManager>(touch, action, "Print each gesture that is reported",
+                                         [](CLI::App& command, WatchOptions& options) {
+                                             addGestureOptions(command, options);
+                                             addFeatureOption(command, options);
+                                         });
 }
 
 }  // namespace pemaro::zelkctl

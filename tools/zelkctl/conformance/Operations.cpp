@@ -1,0 +1,203 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/conformance/Operations.h"
+
+#include <fmt/core.h>
+#include <utils/String8.h>
+
+#include <algorithm>
+
+#include "pemaro/IGestureManagerClient.h"
+#include "pemaro/SerializableMap.h"
+#include "pemaro/SerializableMapArray.h"
+#include "pemaro/Status.h"
+
+using android::Parcel;
+
+namespace pemaro::zelkctl {
+namespace {
+
+constexpr int32_t kNoSuchNumber = -77;
+constexpr const char* kNoSuchName = "\x01no profile has this name";
+
+void none(Parcel&) {}
+
+void writeText(Parcel& request, const std::string& text) {
+    request.writeString8(android::String8(text.data(), text.size()));
+}
+
+void feature(Parcel& request) {
+    request.writeInt32(1);
+}
+
+void noSuch(Parcel& request) {
+    request.writeInt32(kNoSuchNumber);
+}
+
+void emptyMap(Parcel& request) {
+    writeText(request, SerializableMap().serialize());
+}
+
+void noEvent(Parcel& request) {
+    request.writeInt32(0);
+    request.writeInt32(0);
+}
+
+void noLength(Parcel& request) {
+    request.writeInt32(0);
+}
+
+void wholeConfiguration(Parcel& request) {
+    request.writeInt32(512 * 1024);
+}
+
+void noName(Parcel& request) {
+    request.writeCString(kNoSuchName);
+}
+
+void emptyGesture(Parcel& request) {
+    const std::string zeros(sizeof(IGestureManagerClient::GestureData), '\0');
+    request.write(zeros.data(), zeros.size());
+}
+
+/// Reads one field; what is wrong with it.
+std::string fieldProblem(const Parcel& reply, char field, int32_t* status) {
+    int32_t number = 0;
+    const bool isText = field == 'm' || field == 'a';
+    if (reply.dataAvail() < sizeof(number)) {
+        return "the reply ends too early";
+    }
+    if (!isText) {
+        reply.readInt32(&number);
+    }
+    switch (field) {
+        case 'S':
+            if (status != nullptr) {
+                *status = number;
+            }
+            return isKnownStatus(number) ? "" : fmt::format("{} is no known status", number);
+        case 'u':
+            return number >= 0 ? "" : fmt::format("{} is no count", number);
+        case 'p':
+            return number > 0 && number < STATUS_UNKNOWN_ERROR
+                           ? ""
+                           : fmt::format("{} is no size of a packet", number);
+        case 'b':
+            return number == 0 || number == 1 ? "" : fmt::format("{} is no answer", number);
+        case 'B': {
+            const size_t padded = (static_cast<size_t>(std::max(number, 0)) + 3) & ~size_t{3};
+            if (number < 0 || reply.dataAvail() < padded) {
+                return fmt::format("a length of {} bytes, with {} there", number,
+                                   reply.dataAvail());
+            }
+            reply.setDataPosition(reply.dataPosition() + padded);
+            return "";
+        }
+        case 'n':
+            if (number < 0) {
+                return fmt::format("{} is no count", number);
+            }
+            for (int32_t i = 0; i < number; ++i) {
+                if (reply.readCString() == nullptr) {
+                    return fmt::format("{} names announced, and {} there", number, i);
+                }
+            }
+            return "";
+        case 'm':
+        case 'a': {
+            const android::String8 text = reply.readString8();
+            const std::string content(text.c_str(), text.size());
+            SerializableMap map;
+            SerializableMapArray array;
+            const int result = field == 'm' ? map.unserialize(content) : array.unserialize(content);
+            // A map without keys is written as a text that is no map.
+            return result == STATUS_NO_ERROR || content == SerializableMap().serialize()
+                           ? ""
+                           : "a map that cannot be read";
+        }
+        default:
+            return "";
+    }
+}
+
+}  // namespace
+
+const std::vector<CheckedInterface>& checkedInterfaces() {
+    static const std::vector<CheckedInterface> interfaces = {
+            {CheckedService::kCompanion,
+             "companion",
+             "pemaro.TouchService",
+             28,
+             {
+                     {14, "getProperties", none, "Sm", Harm::kNone},
+                     {15, "getAFEParams", none, "Sm", Harm::kNone},
+                     {17, "getAFEParams of all channels", none, "Sa", Harm::kNone},
+                     {20, "getPacketSize", none, "p", Harm::kNone},
+                     {22, "getConfigParams of no bytes", noLength, "u", Harm::kNone},
+                     {22, "getConfigParams of all bytes", wholeConfiguration, "B", Harm::kNone},
+                     {23, "inspect", none, "Si", Harm::kNone},
+                     {24, "getConfigParams of no key", emptyMap, "Sm", Harm::kNone},
+                     {9, "sendEvent", noEvent, "S", Harm::kState},
+                     {13, "setRecordParameter of no output", noSuch, "S", Harm::kState},
+                     {16, "setAFEParams of nothing", emptyMap, "S", Harm::kState},
+                     {25, "sendCommand of none", emptyMap, "Sm", Harm::kState},
+                     {26, "saveSession", none, "Si", Harm::kState},
+                     {27, "restoreSession of none", noSuch, "S", Harm::kState},
+             }},
+            {CheckedService::kTouch,
+             "touch",
+             "pemaro.TouchManagerService",
+             7,
+             {
+                     {3, "isSupported", feature, "bS", Harm::kNone},
+                     {3, "isSupported of no feature", noSuch, "bS", Harm::kNone},
+                     {4, "isEnabled", feature, "bS", Harm::kNone},
+                     {4, "isEnabled of no feature", noSuch, "bS", Harm::kNone},
+                     {5, "enable of no feature", noSuch, "S", Harm::kState},
+                     {6, "disable of no feature", noSuch, "S", Harm::kState},
+             }},
+            {CheckedService::kGesture,
+             "gesture",
+             "pemaro.GestureManagerService",
+             13,
+             {
+                     {12, "getMaxPreDefinedGesture", none, "uS", Harm::kNone},
+                     {13, "getMaxUserDefinedGesture", none, "uS", Harm::kNone},
+                     {7, "addGesture of a negative count", noSuch, "iS", Harm::kState},
+                     {8, "deleteGesture of none", noSuch, "S", Harm::kState},
+                     {9, "enableGesture of none", noSuch, "S", Harm::kState},
+                     {10, "disableGesture of none", noSuch, "S", Harm::kState},
+                     {11, "improveGestureTraining of nothing", emptyGesture, "iS", Harm::kState},
+             }},
+            {CheckedService::kHand,
+             "hand",
+             "pemaro.HandBiometricManagerService",
+             16,
+             {
+                     {13, "getMaxUser", none, "uS", Harm::kNone},
+                     {14, "getProfileList", none, "nS", Harm::kNone},
+                     {9, "setSecurity of no level", noSuch, "S", Harm::kState},
+                     {11, "deleteProfile of none", noName, "S", Harm::kState},
+             }},
+    };
+    return interfaces;
+}
+
+bool isKnownStatus(int32_t status) {
+    return status == STATUS_NO_ERROR ||
+           (status >= STATUS_UNKNOWN_ERROR && status <= STATUS_CORRUPT_DATA);
+}
+
+std::string replyProblem(const Parcel& reply, const char* layout, int32_t* status) {
+    reply.setDataPosition(0);
+    for (const char* field = layout; *field != '\0'; ++field) {
+        const std::string problem = fieldProblem(reply, *field, status);
+        if (!problem.empty()) {
+            return problem;
+        }
+    }
+    return reply.dataAvail() == 0
+                   ? ""
+                   : fmt::format("{} bytes too many in the reply", reply.dataAvail());
+}
+
+}  // namespace pemaro::zelkctl
