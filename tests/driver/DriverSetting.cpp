@@ -17,7 +17,7 @@ namespace pemaro::test {
 
 namespace {
 
-constexpr int kManagerTries = 50;
+constexpr int kManagerTries = 300;
 constexpr std::chrono::milliseconds kManagerPause(100);
 
 class DriverEnvironment : public ::testing::Environment {
