@@ -10,9 +10,18 @@
 
 namespace pemaro {
 
-ProxyCall::ProxyCall(const char* tag, const ProxyRow& row, const android::String16& descriptor)
+namespace {
+/// What a release's interface token has besides the characters of the descriptor, at most.
+constexpr size_t kTokenBytes = 32;
+}  // namespace
+
+ProxyCall::ProxyCall(const char* tag, const ProxyRow& row, const android::String16& descriptor,
+                     size_t argumentBytes)
         : mTag(tag), mRow(row) {
     logText(ANDROID_LOG_DEBUG, mTag, mRow.entry);
+    if (argumentBytes != 0) {
+        request.setDataCapacity(kTokenBytes + descriptor.size() * sizeof(char16_t) + argumentBytes);
+    }
     request.writeInterfaceToken(descriptor);
 }
 

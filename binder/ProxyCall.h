@@ -3,6 +3,7 @@
 
 #include <utils/String16.h>
 
+#include <cstddef>
 #include <cstdint>
 
 #include "pemaro/Binder.h"
@@ -37,8 +38,10 @@ struct ProxyRow {
 
 class ProxyCall {
   public:
-    /// Logs the entry text and begins the request with the interface token.
-    ProxyCall(const char* tag, const ProxyRow& row, const android::String16& descriptor);
+    /// Logs the entry text and begins the request with the interface token. For arguments of many
+    /// bytes, told beforehand, the request is allocated once instead of growing.
+    ProxyCall(const char* tag, const ProxyRow& row, const android::String16& descriptor,
+              size_t argumentBytes = 0);
 
     android::Parcel request;
     android::Parcel reply;

@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 
 #include "binder/Log.h"
 #include "pemaro/Binder.h"
@@ -40,8 +41,9 @@ android::status_t dispatch(const char* tag, const StubRow<Service> (&rows)[N],
     }
     const StubRow<Service>& row = rows[code - android::IBinder::FIRST_CALL_TRANSACTION];
     logText(ANDROID_LOG_DEBUG, tag, row.received);
-    android::Parcel unwanted;  // a local caller may pass no reply parcel
-    android::status_t result = row.handle(service, data, reply != nullptr ? *reply : unwanted);
+    std::optional<android::Parcel> unwanted;  // a local caller may pass no reply parcel
+    android::status_t result =
+            row.handle(service, data, reply != nullptr ? *reply : unwanted.emplace());
     logText(ANDROID_LOG_DEBUG, tag, row.finished);
     return result;
 }

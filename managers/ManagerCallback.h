@@ -34,7 +34,7 @@ android::status_t replyRecord(Client& client, const android::Parcel& data, andro
             : BpInterface<I##NAME>(remote) {}                                      \
     int Bp##NAME::OPERATION(RECORD* data) {                                        \
         static constexpr ProxyRow kRow = callbackRow(TEXTS);                       \
-        ManagerCall call(LOG_TAG, kRow, descriptor);                               \
+        ManagerCall call(LOG_TAG, kRow, descriptor, sizeof(RECORD));               \
         call.writeRecords(data, 1);                                                \
         return call.transactForStatus(remote());                                   \
     }                                                                              \

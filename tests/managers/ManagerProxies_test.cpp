@@ -460,5 +460,22 @@ TEST_F(ProfileListProxy, MissesAStatusThatIsNotThere) {
     EXPECT_THAT(mNames, ElementsAre("held", "alice", "barbara"));
 }
 
+// A parcel that grows takes half as much again, and copies what it had each time.
+TEST(CallbackProxy, SizesTheRequestForItsRecordBeforehand) {
+    const sp<RecordingBinder> remote = new RecordingBinder;
+    size_t size = 0;
+    size_t capacity = 0;
+    remote->handle([&](uint32_t, const Parcel& data, Parcel* reply) {
+        size = data.dataSize();
+        capacity = data.dataCapacity();
+        return reply->writeInt32(STATUS_NO_ERROR);
+    });
+    EXPECT_EQ(STATUS_NO_ERROR, ITouchManagerClient::asInterface(remote)->gestureCallback(
+                                       makeRecords<TouchGesture>(1).data()));
+    EXPECT_GT(size, sizeof(TouchGesture));
+    EXPECT_GE(capacity, size);
+    EXPECT_LT(capacity, size + 64);
+}
+
 }  // namespace
 }  // namespace pemaro::test
