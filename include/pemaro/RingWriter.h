@@ -59,6 +59,14 @@ class RingWriter {
     /// returned a slot since the last call.
     void publish();
 
+    /// Signals once more while the reader has not taken every frame, and tells whether it had to.
+    /// The signal of a frame wakes a waiting reader, but what ends its wait is what it saw before:
+    /// it looks, and waits again, for 16 ms. A second signal, when it is back in its wait, delivers
+    /// the frame then. A quarter of a millisecond after the frame, and while this returns true in
+    /// intervals that double until the next frame is due, is a good time; each call costs a look at
+    /// `read`, and a system call while the reader waits.
+    bool remind();
+
     RingWriter(const RingWriter&) = delete;
     RingWriter& operator=(const RingWriter&) = delete;
 
@@ -101,6 +109,14 @@ inline void RingWriter::publish() {
     }
     TouchCompanionSharedCblk::publishIndex(mBlock->write, ++mWrite);
     pthread_cond_signal(&mBlock->cond);
+}
+
+inline bool RingWriter::remind() {
+    if (TouchCompanionSharedCblk::acquireIndex(mBlock->read) == mWrite) {
+        return false;
+    }
+    pthread_cond_signal(&mBlock->cond);
+    return true;
 }
 
 inline bool RingWriter::put(const void* frame, size_t length) {

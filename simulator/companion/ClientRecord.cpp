@@ -101,7 +101,8 @@ int ClientRecord::start() {
             return STATUS_ERROR_OPENING_FILE;
         }
     }
-    mRecording = std::make_unique<Recording>(sink, makeSource(mOptions), mFilter);
+    mRecording = std::make_unique<Recording>(sink, makeSource(mOptions), mFilter,
+                                             std::chrono::microseconds(mOptions.remindUs));
     return STATUS_NO_ERROR;
 }
 

@@ -12,6 +12,10 @@ class FrameSink {
 
     /// Takes a whole frame. False when there is no room for it now; nothing is taken then.
     virtual bool put(const void* frame, size_t length) = 0;
+
+    /// Tells whoever takes the frames once more that there are some. False when all are taken, or
+    /// nobody needs to be told.
+    virtual bool remind() { return false; }
 };
 
 }  // namespace pemaro::simulator

@@ -23,21 +23,25 @@ constexpr auto kMaxLag = std::chrono::seconds(1);
 
 struct Recording::Worker {
     Worker(std::shared_ptr<FrameSink> frameSink, std::unique_ptr<FrameSource> frameSource,
-           std::shared_ptr<const std::atomic<uint32_t>> recordFilter)
+           std::shared_ptr<const std::atomic<uint32_t>> recordFilter,
+           std::chrono::microseconds remindDelay)
             : sink(std::move(frameSink)),
               source(std::move(frameSource)),
-              filter(std::move(recordFilter)) {}
+              filter(std::move(recordFilter)),
+              remindAfter(remindDelay) {}
 
     void run();
     void runPaced();
     void runUnpaced();
     FrameSource::Frame takeNext();
     bool put(const FrameSource::Frame& frame) { return sink->put(frame.bytes, frame.length); }
+    void remindUntil(Clock::time_point next);
     bool sleepUntil(Clock::time_point when);
 
     const std::shared_ptr<FrameSink> sink;
     const std::unique_ptr<FrameSource> source;
     const std::shared_ptr<const std::atomic<uint32_t>> filter;
+    const std::chrono::microseconds remindAfter;
     std::atomic<uint64_t> produced{0};
     std::atomic<uint64_t> dropped{0};
 
@@ -70,6 +74,21 @@ void Recording::Worker::runPaced() {
         if (!put(takeNext())) {
             dropped += 1;
         }
+        const auto next = source->due();
+        remindUntil(next ? start + *next : Clock::time_point::max());
+    }
+}
+
+/// Reminds the sink of its frames until all are taken or the next one is due.
+void Recording::Worker::remindUntil(Clock::time_point next) {
+    if (remindAfter.count() == 0) {
+        return;
+    }
+    const Clock::time_point start = Clock::now();
+    for (auto delay = remindAfter; start + delay < next; delay *= 2) {
+        if (!sleepUntil(start + delay) || !sink->remind()) {
+            return;
+        }
     }
 }
 
@@ -97,8 +116,10 @@ bool Recording::Worker::sleepUntil(Clock::time_point when) {
 }
 
 Recording::Recording(std::shared_ptr<FrameSink> sink, std::unique_ptr<FrameSource> source,
-                     std::shared_ptr<const std::atomic<uint32_t>> filter)
-        : mWorker(std::make_shared<Worker>(std::move(sink), std::move(source), std::move(filter))),
+                     std::shared_ptr<const std::atomic<uint32_t>> filter,
+                     std::chrono::microseconds remindAfter)
+        : mWorker(std::make_shared<Worker>(std::move(sink), std::move(source), std::move(filter),
+                                           remindAfter)),
           mThread([worker = mWorker] { worker->run(); }) {}
 
 Recording::~Recording() {

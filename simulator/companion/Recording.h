@@ -2,6 +2,7 @@
 #pragma once
 
 #include <atomic>
+#include <chrono>
 #include <cstdint>
 #include <memory>
 #include <thread>
@@ -21,9 +22,12 @@ class Recording {
     };
 
     /// Starts the thread. A frame that is due and finds no room is dropped; one of a source without a
-    /// pace waits for room. `filter` may change while the recording runs.
+    /// pace waits for room. `filter` may change while the recording runs. While a frame of a source
+    /// with a pace is not taken, the sink is reminded of it after `remindAfter`, and then in intervals
+    /// that double, until the next frame is due; never when that is 0.
     Recording(std::shared_ptr<FrameSink> sink, std::unique_ptr<FrameSource> source,
-              std::shared_ptr<const std::atomic<uint32_t>> filter);
+              std::shared_ptr<const std::atomic<uint32_t>> filter,
+              std::chrono::microseconds remindAfter = {});
 
     /// Stops the recording.
     ~Recording();

@@ -18,6 +18,8 @@ class RingSink : public FrameSink {
 
     bool put(const void* frame, size_t length) override { return mWriter->put(frame, length); }
 
+    bool remind() override { return mWriter->remind(); }
+
   private:
     const std::unique_ptr<RingWriter> mWriter;
 };

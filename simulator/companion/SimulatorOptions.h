@@ -21,6 +21,7 @@ struct SimulatorOptions {
     static constexpr uint32_t kMaxFingers = 10;
     static constexpr double kMaxRate = 100000;
     static constexpr double kMaxSpeed = 1000;
+    static constexpr uint32_t kMaxRemindUs = 1000000;
 
     double rate = 240;           ///< frames a second; 0: as fast as the client takes them
     uint32_t frameBytes = 4096;  ///< the packet size, and a slot of the ring
@@ -31,6 +32,7 @@ struct SimulatorOptions {
     std::shared_ptr<const Replay> replay;
     double speed = 1;               ///< of the replay; 0: as fast as the client takes them
     bool loop = false;              ///< whether the replay begins anew behind its end
+    uint32_t remindUs = 250;        ///< when to signal a frame again that was not taken; 0: never
     std::string configPath;         ///< the configuration's own place; empty: it has none
     std::string authText = "zelk";  ///< what setAuth() accepts
 

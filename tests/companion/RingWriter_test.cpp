@@ -3,9 +3,11 @@
 
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <cstring>
 #include <memory>
 #include <string>
+#include <thread>
 
 namespace pemaro::test {
 
@@ -140,6 +142,37 @@ TEST(RingWriter, BelievesNothingThatAClientWritesIntoTheBlock) {
     reader.block->read = 2;
     EXPECT_TRUE(put(*writer, "c"));
     EXPECT_STREQ("c", reinterpret_cast<char*>(reader.block->frames()));
+}
+
+TEST(RingWriter, RemindsUntilEveryFrameIsTaken) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    Reader reader(*writer);
+    EXPECT_FALSE(writer->remind());
+    EXPECT_TRUE(put(*writer, "a"));
+    EXPECT_TRUE(put(*writer, "b"));
+    EXPECT_TRUE(writer->remind());
+    reader.take();
+    EXPECT_TRUE(writer->remind());
+    reader.take();
+    EXPECT_FALSE(writer->remind());
+}
+
+TEST(RingWriter, WakesAWaitingReaderWithEachReminder) {
+    const std::shared_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    Reader reader(*writer);
+    EXPECT_TRUE(put(*writer, "a"));
+    ASSERT_EQ(0, pthread_mutex_lock(&reader.block->mutex));
+    std::atomic<bool> woken{false};
+    std::thread reminding([&] {
+        while (!woken) {
+            EXPECT_TRUE(writer->remind());
+            std::this_thread::yield();
+        }
+    });
+    EXPECT_EQ(0, pthread_cond_wait(&reader.block->cond, &reader.block->mutex));
+    woken = true;
+    reminding.join();
+    pthread_mutex_unlock(&reader.block->mutex);
 }
 
 TEST(RingWriter, WritesOnWhenTheReaderDiedWithTheMutex) {

@@ -61,6 +61,11 @@ void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
     app.add_option("--ring-frames", options.ringFrames, "Frames that the shared ring holds")
             ->check(CLI::Range(1u, SimulatorOptions::kMaxRingFrames))
             ->capture_default_str();
+    app.add_option("--remind", options.remindUs,
+                   "Microseconds after which a frame that was not taken is signalled again; 0 is "
+                   "never")
+            ->check(CLI::Range(0u, SimulatorOptions::kMaxRemindUs))
+            ->capture_default_str();
     app.add_option("--fingers", options.fingers, "Fingers on the panel")
             ->check(CLI::Range(0u, SimulatorOptions::kMaxFingers))
             ->capture_default_str();

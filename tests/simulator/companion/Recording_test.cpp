@@ -34,6 +34,7 @@ class NotingSink : public FrameSink {
         frames::FrameHeader header{};
         memcpy(&header, frame, sizeof(header));
         mFrames.push_back(header);
+        mChanged.notify_all();
         return true;
     }
 
@@ -47,6 +48,29 @@ class NotingSink : public FrameSink {
         mChanged.wait(guard, [this, count] { return mOffers >= count; });
     }
 
+    void awaitFrames(size_t count) {
+        std::unique_lock<std::mutex> guard(mLock);
+        mChanged.wait(guard, [this, count] { return mFrames.size() >= count; });
+    }
+
+    // Takes frames without having them taken from it.
+    bool remind() override {
+        std::lock_guard<std::mutex> guard(mLock);
+        mReminders += 1;
+        mChanged.notify_all();
+        return true;
+    }
+
+    uint64_t reminders() const {
+        std::lock_guard<std::mutex> guard(mLock);
+        return mReminders;
+    }
+
+    void awaitReminders(uint64_t count) {
+        std::unique_lock<std::mutex> guard(mLock);
+        mChanged.wait(guard, [this, count] { return mReminders >= count; });
+    }
+
     std::vector<frames::FrameHeader> frames() const {
         std::lock_guard<std::mutex> guard(mLock);
         return mFrames;
@@ -57,6 +81,7 @@ class NotingSink : public FrameSink {
     std::condition_variable mChanged;
     int mRoom;
     uint64_t mOffers = 0;
+    uint64_t mReminders = 0;
     std::vector<frames::FrameHeader> mFrames;
 };
 
@@ -65,10 +90,11 @@ std::unique_ptr<FrameSource> drawnFrames(double rate) {
 }
 
 struct RunningRecording {
-    explicit RunningRecording(double rate, int room = 1000000)
+    explicit RunningRecording(double rate, int room = 1000000,
+                              std::chrono::microseconds remindAfter = {})
             : sink(std::make_shared<NotingSink>(room)),
               filter(std::make_shared<std::atomic<uint32_t>>(frames::kFilterDefault)),
-              recording(sink, drawnFrames(rate), filter) {}
+              recording(sink, drawnFrames(rate), filter, remindAfter) {}
 
     const std::shared_ptr<NotingSink> sink;
     const std::shared_ptr<std::atomic<uint32_t>> filter;
@@ -94,12 +120,27 @@ TEST(Recording, CountsADroppedFrameAndLeavesItsNumberOut) {
     RunningRecording running(2000, 3);
     running.sink->awaitOffers(30);
     running.sink->makeRoom(1);
-    running.sink->awaitOffers(60);
+    running.sink->awaitFrames(4);
     const Recording::Counts counts = running.recording.stop();
     const std::vector<frames::FrameHeader> frames = running.sink->frames();
     ASSERT_EQ(4u, frames.size());
     EXPECT_EQ(counts.produced, counts.dropped + 4);
     EXPECT_GT(frames[3].sequence, 4u);
+}
+
+TEST(Recording, RemindsOfAFrameThatIsNotTaken) {
+    // One frame, and the next one not within this test.
+    RunningRecording running(0.001, 1000000, std::chrono::microseconds(100));
+    running.sink->awaitReminders(5);
+    running.recording.stop();
+    EXPECT_EQ(1u, running.sink->frames().size());
+}
+
+TEST(Recording, RemindsOfNothingUnlessTold) {
+    RunningRecording running(2000);
+    running.sink->awaitOffers(20);
+    running.recording.stop();
+    EXPECT_EQ(0u, running.sink->reminders());
 }
 
 TEST(Recording, WithoutAPaceDropsNothing) {
