@@ -169,7 +169,7 @@ const std::vector<Shape>& shapes() {
             {"deepArrays", [](size_t n) { return "{\"a\":" + enclosed("[", "1", "]", n) + "}"; }},
             // Hostile: each of these has a place to which a simpler reader would return again and again.
             {"unclosed", [](size_t n) { return repeated("{\"a\":[", n) + "}"; }},
-            {"noTokenEnds", [](size_t n) { return "{\"a\":[" + repeated("x", n) + "\"]}"; }},
+            {"noTokenEnds", [](size_t n) { return "[" + repeated("x", n) + "\"]"; }, true},
             {"escapedQuotes", [](size_t n) { return "{\"a\":\"" + repeated("\\\"", n) + "\"}"; }},
             {"equalKeys", [](size_t n) { return "{" + repeated("\"a\":1,", n) + "\"b\":2}"; }},
             {"longEqualStarts",

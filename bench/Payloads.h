@@ -25,6 +25,7 @@ Payload payload(const std::string& name);
 struct Shape {
     const char* name;
     std::string (*text)(size_t size);
+    bool ofArray = false;  ///< the text of an array, not of a map
 };
 const std::vector<Shape>& shapes();
 

@@ -21,6 +21,8 @@ PACKAGES_PACKAGING=(dpkg-dev debhelper lintian pkg-config)
 # What the Android tree is given is formatted and compiled by these: bpfmt, the policy's compilers, and the
 # compiler for 64-bit Arm.
 PACKAGES_ANDROID=(blueprint-tools checkpolicy secilc g++-aarch64-linux-gnu)
+# What ./dev bench reads its figures with.
+PACKAGES_BENCH=(python3 binutils)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 
