@@ -121,6 +121,11 @@ void measure(Report& report, int rate, int remindUs) {
 
 TEST(FramesOverTheDriver, ComeSoonerWithASecondSignal) {
     Report report;
+    if (setting("ZELK_BENCH_SECONDS", 0.5) < 0.5) {
+        // Only to see that it works.
+        for (const int remindUs : {0, 250}) measure(report, 60, remindUs);
+        return;
+    }
     for (const int rate : {60, 120, 240, 500, 1000, 2000, 4000}) {
         for (const int remindUs : {0, 250}) measure(report, rate, remindUs);
     }
