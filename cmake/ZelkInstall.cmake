@@ -75,8 +75,12 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/zelkclient.pc
   DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT Development)
 
 # ---- documents and examples ----------------------------------------------------------------------------
-install(FILES README.md LICENSE DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
-install(DIRECTORY docs examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
+install(FILES README.md CHANGELOG.md SECURITY.md LICENSE DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation
+  FILES_MATCHING PATTERN "*.md" PATTERN doxygen EXCLUDE)
+install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
+
+install(FILES docs/zelkclient.7 DESTINATION ${CMAKE_INSTALL_MANDIR}/man7 COMPONENT Development)
 
 # ---- symbols in files of their own ---------------------------------------------------------------------
 set(ZELK_STRIPPED ${CMAKE_INSTALL_LIBDIR}/$<TARGET_FILE_NAME:zelkclient>)

@@ -9,9 +9,10 @@ PACKAGES_BUILD=(g++ cmake ninja-build)
 # The address sanitizer is clang's, with its runtime and symbolizer. The exported interface is compared by
 # libabigail, and compiled with the device's C++ library as well; zsh runs its completion; spin verifies the
 # model of the shared ring, and tmux is a terminal to draw on. The benchmarks compare with nlohmann's reader;
-# valgrind counts instructions.
+# valgrind counts instructions. A program of the documents is in Python.
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev valgrind clang
-    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin tmux zsh)
+    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin tmux zsh
+    python3-minimal)
 # The browser that shows what zelkctl makes for browsers; large, and for the tests without the driver alone.
 PACKAGES_BROWSER=(chromium)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.
@@ -23,6 +24,8 @@ PACKAGES_PACKAGING=(dpkg-dev debhelper lintian pkg-config)
 PACKAGES_ANDROID=(blueprint-tools checkpolicy secilc g++-aarch64-linux-gnu)
 # What ./dev bench reads its figures with.
 PACKAGES_BENCH=(python3 binutils)
+# What makes the reference of the headers.
+PACKAGES_DOCS=(doxygen)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 

@@ -15,7 +15,7 @@ class ZELK_API BnHandBiometricManagerService
   public:
     /// Called by Binder on one of its threads. A request without the interface token is answered
     /// with -1 (PERMISSION_DENIED) and an untouched reply, before its code is looked at; a code
-    /// outside 1 to 16 goes to BBinder. Otherwise the result is 0, whatever the operation returns.
+    /// of no operation goes to BBinder. Otherwise the result is 0, whatever the operation returns.
     android::status_t onTransact(uint32_t code, const android::Parcel& data, android::Parcel* reply,
                                  uint32_t flags = 0) override;
 };

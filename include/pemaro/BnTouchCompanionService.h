@@ -15,7 +15,7 @@ class ZELK_API BnTouchCompanionService : public android::BnInterface<ITouchCompa
     /// Called by Binder on one of its threads.
     ///
     /// A request without the interface token is answered with -1 (PERMISSION_DENIED) and an
-    /// untouched reply, before its code is looked at; a code outside 1 to 28 goes to BBinder.
+    /// untouched reply, before its code is looked at; a code of no operation goes to BBinder.
     /// Otherwise the result is 0 with the operation's status in the reply, except that
     ///   - unregisterClient() returns its status as the result and writes no reply,
     ///   - getCblk() without a block returns 0x40000006,

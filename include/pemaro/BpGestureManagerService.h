@@ -10,6 +10,7 @@ namespace pemaro {
 /// any thread.
 class ZELK_API BpGestureManagerService : public android::BpInterface<IGestureManagerService> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpGestureManagerService(const android::sp<android::IBinder>& remote);
 
     int subscribe(const android::sp<IGestureManagerClient>& client) override;

@@ -11,6 +11,7 @@ namespace pemaro {
 class ZELK_API BpHandBiometricManagerClient
         : public android::BpInterface<IHandBiometricManagerClient> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpHandBiometricManagerClient(const android::sp<android::IBinder>& remote);
 
     int handBiometricCallback(HandBioData* data) override;

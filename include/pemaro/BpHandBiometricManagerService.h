@@ -14,6 +14,7 @@ namespace pemaro {
 class ZELK_API BpHandBiometricManagerService
         : public android::BpInterface<IHandBiometricManagerService> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpHandBiometricManagerService(const android::sp<android::IBinder>& remote);
 
     int subscribe(const android::sp<IHandBiometricManagerClient>& client) override;

@@ -9,6 +9,7 @@ namespace pemaro {
 /// Proxy of ITouchCompanionClient, held by the service; an identity without operations.
 class ZELK_API BpTouchCompanionClient : public android::BpInterface<ITouchCompanionClient> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpTouchCompanionClient(const android::sp<android::IBinder>& remote);
 };
 

@@ -10,6 +10,7 @@ namespace pemaro {
 /// thread.
 class ZELK_API BpTouchCompanionService : public android::BpInterface<ITouchCompanionService> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpTouchCompanionService(const android::sp<android::IBinder>& remote);
 
     int registerClient(const android::sp<ITouchCompanionClient>& client) override;

@@ -10,6 +10,7 @@ namespace pemaro {
 /// any thread.
 class ZELK_API BpTouchManagerClient : public android::BpInterface<ITouchManagerClient> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpTouchManagerClient(const android::sp<android::IBinder>& remote);
 
     int gestureCallback(GestureData* data) override;

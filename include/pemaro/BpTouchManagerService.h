@@ -10,6 +10,7 @@ namespace pemaro {
 /// thread.
 class ZELK_API BpTouchManagerService : public android::BpInterface<ITouchManagerService> {
   public:
+    /// A proxy of the object behind `remote`, which may be of any process.
     explicit BpTouchManagerService(const android::sp<android::IBinder>& remote);
 
     int subscribe(const android::sp<ITouchManagerClient>& client) override;

@@ -24,6 +24,14 @@ namespace pemaro {
 ///     ...
 ///     client->deinit();
 ///
+/// Gestures and death notices come on Binder's threads. A native program has none until it
+/// starts them, before init(); for an app the runtime has done it:
+///
+///     android::ProcessState::self()->startThreadPool();
+///
+/// Without them nothing fails, but no callback runs, and a service that reports a gesture waits for
+/// this process until it ends.
+///
 /// The client does not reconnect by itself. After a death the caller calls deinit(), which lets go
 /// of the dead service, and init(), which waits for a new one.
 ///

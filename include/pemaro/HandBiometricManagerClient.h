@@ -27,6 +27,9 @@ namespace pemaro {
 ///     ...
 ///     client->deinit();
 ///
+/// Events and death notices come on Binder's threads, which the process has to have: see
+/// GestureManagerClient.
+///
 /// The client does not reconnect by itself. After a death the caller calls deinit(), which lets go
 /// of the dead service, and init(), which waits for a new one.
 ///

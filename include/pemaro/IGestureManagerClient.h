@@ -21,7 +21,7 @@ class ZELK_API IGestureManagerClient : public android::IInterface {
     /// layout belongs to the service and the application. They cross Binder as they are, byte for
     /// byte.
     struct GestureData {
-        uint8_t bytes[72144];
+        uint8_t bytes[72144];  ///< the record, whole
     };
 
     /// Reports a gesture. Called on a Binder thread of the client's process.

@@ -21,7 +21,7 @@ class ZELK_API IHandBiometricManagerClient : public android::IInterface {
     /// One event: 10,016 bytes whose layout belongs to the service and the application. They cross
     /// Binder as they are, byte for byte.
     struct HandBioData {
-        uint8_t bytes[10016];
+        uint8_t bytes[10016];  ///< the record, whole
     };
 
     /// Reports an event. Called on a Binder thread of the client's process.

@@ -25,6 +25,7 @@ class ZELK_API ITouchCompanionFacade {
     /// is kept even when that fails.
     virtual int init(void (*callback)(int, void*, unsigned long, void*), void* context) = 0;
 
+    /// As the operations of TouchCompanionClient with the same names.
     virtual int setRecordOutput(int output) = 0;
     virtual int startRecord() = 0;
     virtual int stopRecord() = 0;
@@ -36,6 +37,7 @@ class ZELK_API ITouchCompanionFacade {
     /// Not supported: always 0x4000000E.
     virtual int setConfigParams(ISerializableParams4* params) = 0;
 
+    /// As the operations of TouchCompanionClient with the same names.
     virtual int getConfigParams(void* buffer, unsigned long* len) = 0;
     virtual int setConfigParams(const void* data, unsigned long size) = 0;
     virtual int getPacketSize() = 0;

@@ -18,6 +18,7 @@ class ZELK_API ITouchCompanionFacadeOld {
     /// 1792.
     virtual int getClassID() = 0;
 
+    /// As the operations of ITouchCompanionFacade with the same names.
     virtual int init(void (*callback)(int, void*, unsigned long, void*), void* context) = 0;
     virtual int setRecordOutput(int output) = 0;
     virtual int startRecord() = 0;
@@ -30,6 +31,7 @@ class ZELK_API ITouchCompanionFacadeOld {
     /// Not supported: always 0x4000000E, and both texts as they were.
     virtual int getFormatDescription(std::string& first, std::string& second) = 0;
 
+    /// As the operations of ITouchCompanionFacade with the same names.
     virtual int getPacketSize() = 0;
     virtual int inspect(unsigned int* value) = 0;
 };

@@ -18,7 +18,8 @@
 // Each makes a client with the constructor that takes callbacks and a context, stores its address
 // in `*out`, which must not be null, and returns 0. No reference is taken: the caller adopts the
 // object into a strong pointer before it calls init(), and the object lives as long as strong
-// pointers to it exist.
+// pointers to it exist. The clients' operations are no virtual functions: who does not link the
+// library finds each by its symbol, and calls it with the object in front (docs/manual.md).
 
 extern "C" {
 

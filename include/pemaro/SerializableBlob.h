@@ -21,13 +21,16 @@ class ZELK_API SerializableBlob {
     /// A copy of the `size` bytes at `data`; `data` is not looked at when `size` is 0.
     SerializableBlob(const void* data, unsigned long size);
 
+    /// A copy of the bytes.
     SerializableBlob(const SerializableBlob& other);
 
     /// Frees the bytes.
     virtual ~SerializableBlob();
 
+    /// Takes a copy of the other's bytes in place of its own.
     SerializableBlob& operator=(SerializableBlob other);
 
+    /// Exchanges the bytes, without copying.
     void swap(SerializableBlob& other);
 
     /// Size in bytes.

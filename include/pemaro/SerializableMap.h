@@ -36,10 +36,12 @@ namespace pemaro {
 class ZELK_API SerializableMap
         : public android::DefaultKeyedVector<std::string, SerializableValue> {
   public:
+    /// Makes an empty map or a deep copy of another, and destroys the entries.
     SerializableMap();
     SerializableMap(const SerializableMap& other);
     virtual ~SerializableMap();
 
+    /// Replaces the entries by deep copies of the other's.
     SerializableMap& operator=(const SerializableMap& other);
 
     /// The tag of the value under `key`; for an absent key that of the null item, VALUE_TYPE_NULL.

@@ -15,10 +15,12 @@ namespace pemaro {
 /// Not synchronised: an array belongs to one thread at a time.
 class ZELK_API SerializableMapArray {
   public:
+    /// Makes an empty array or a deep copy of another, and destroys the elements.
     SerializableMapArray();
     SerializableMapArray(const SerializableMapArray& other);
     virtual ~SerializableMapArray();
 
+    /// Replaces the elements by deep copies of the other's.
     SerializableMapArray& operator=(const SerializableMapArray& other);
 
     /// The element at `index`, valid until the array is changed. An index at or past the end is

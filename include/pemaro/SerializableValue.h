@@ -85,6 +85,7 @@ class ZELK_API SerializableValue {
     /// Destroys the map, array or blob held.
     virtual ~SerializableValue();
 
+    /// Takes a deep copy of the other's contents in place of its own.
     SerializableValue& operator=(SerializableValue other);
 
     /// Exchanges tag, contents and text, without copying.
@@ -141,10 +142,13 @@ class ZELK_API SerializableValue {
     std::string mValue;
 };
 
+/// The three that there are.
 template <>
 ZELK_API std::string& SerializableValue::getValue<std::string>();
+/// The three that there are.
 template <>
 ZELK_API SerializableMap& SerializableValue::getValue<SerializableMap>();
+/// The three that there are.
 template <>
 ZELK_API SerializableMapArray& SerializableValue::getValue<SerializableMapArray>();
 

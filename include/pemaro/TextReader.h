@@ -11,9 +11,9 @@
 namespace pemaro {
 
 /// The tag of a scalar token, white space around it already removed: VALUE_TYPE_BOOL for `true`,
-/// `false` and `null`; VALUE_TYPE_UINT32 when it begins with `-`; VALUE_TYPE_STRING when it begins
-/// and ends with a double quote; VALUE_TYPE_INT32 when it begins with `.`; VALUE_TYPE_FLOAT
-/// otherwise. An empty token is fatal.
+/// `false` and `null`; VALUE_TYPE_UINT32 when it begins with a minus sign; VALUE_TYPE_STRING when it
+/// begins and ends with a double quote; VALUE_TYPE_INT32 when it begins with a point;
+/// VALUE_TYPE_FLOAT otherwise. An empty token is fatal.
 ZELK_API int findValueType(const std::string& token);
 
 /// Removes white space from both ends of `text`, which stays as it is when there is nothing else in

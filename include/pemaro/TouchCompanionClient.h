@@ -75,9 +75,10 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     TouchCompanionClient(DataCallback callback, void* context);
 
     /// Looks the service up, registers this client and opens the service. 0x4000000A: no service
-    /// manager or no such service (after the platform's own lookup gave up); 0x4000000D: the binder
-    /// found is no touch companion service; else what registering or opening returned. Not guarded
-    /// against a second call, which registers anew.
+    /// manager or no such service (after the platform's own lookup gave up, some five seconds;
+    /// where no service manager runs at all, the platform waits for one without end); 0x4000000D:
+    /// the binder found is no touch companion service; else what registering or opening returned.
+    /// Not guarded against a second call, which registers anew.
     int init();
 
     /// 1 when the service's process answers a ping, else 0.

@@ -30,8 +30,8 @@ namespace pemaro {
 ///      136     .  the ring: bufferFrames x frameSize bytes
 ///
 /// `read` and `write` count on without end and wrap at 2^32; they are never reduced modulo the
-/// ring. The service keeps `write - read` at most `bufferFrames`. Frame number n lies at `data + (n
-/// - bufferFrames * readWrap) * frameSize`.
+/// ring. The service keeps `write - read` at most `bufferFrames`. Frame number n lies at
+/// `data + (n - bufferFrames * readWrap) * frameSize`.
 ///
 /// There is one writer and one reader, and no lock is taken to move the indices. Each side
 /// publishes its index with publishIndex() after it has finished with the frames, and looks at the
@@ -41,6 +41,7 @@ struct TouchCompanionSharedCblk {
     /// Run by the side that creates the block, once, before it shares the memory.
     ZELK_API TouchCompanionSharedCblk();
 
+    /// What each is for is told above.
     pthread_mutex_t mutex;
     pthread_cond_t cond;
     uint32_t read;

@@ -24,6 +24,8 @@ namespace pemaro {
 ///     ...
 ///     client->deinit();
 ///
+/// Gestures come on Binder's threads, which the process has to have: see GestureManagerClient.
+///
 /// The callback and its context belong to the class: those of the client that was constructed last
 /// serve every TouchManagerClient of the process.
 ///
@@ -47,8 +49,10 @@ class ZELK_API TouchManagerClient : public BnTouchManagerClient {
     TouchManagerClient();
 
     /// Looks the service up, once, and subscribes. 0x4000000A: no service manager or no such
-    /// service (after the platform's own lookup gave up); 0x4000000D: the binder found is no touch
-    /// manager; else what subscribing returned. A further call looks up and subscribes again.
+    /// service (after the platform's own lookup gave up, some five seconds; where no service
+    /// manager runs at all, the platform waits for one without end); 0x4000000D: the binder found
+    /// is no touch manager; else what subscribing returned. A further call looks up and subscribes
+    /// again.
     int init();
 
     /// Unsubscribes, if init() had succeeded, and lets go of the service. Always 0.

@@ -88,7 +88,8 @@ report_stages() {
 }
 
 stage_native() {
-    need_packages "${PACKAGES_PACKAGING[@]}" "${PACKAGES_ANDROID[@]}" "${PACKAGES_BROWSER[@]}"
+    need_packages "${PACKAGES_PACKAGING[@]}" "${PACKAGES_ANDROID[@]}" "${PACKAGES_BROWSER[@]}" \
+        "${PACKAGES_DOCS[@]}"
     run_ctest release native "$1"
 }
 

@@ -5,6 +5,7 @@
 
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
+#include "pemaro/Version.h"
 
 namespace pemaro::simulator {
 namespace {
@@ -139,7 +140,7 @@ int CommandInterpreter::runCommand(const std::string& name, const std::vector<in
                 " events=" + std::to_string(mDevice.events()) +
                 " authenticated=" + (mDevice.isAuthenticated() ? "yes" : "no");
     } else if (name == "version") {
-        *text = "zelk-touchstack 1.0.0";
+        *text = "zelk-touchstack " ZELK_VERSION;
     } else if (name == "selftest") {
         *text = selftest();
     } else if (name == "factoryreset") {

@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "pemaro/Version.h"
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FrameCollector.h"
@@ -33,7 +34,7 @@ TEST(CompanionCommands, OfTheDevice) {
     expectRows({
             {{"command", "calibrate 3 0x10"}, 0, "done\n"},
             {{"command", "status"}, 0, "filter=3 events=0 authenticated=no\n"},
-            {{"command", "version", "--json"}, 0, "{\"answer\":\"zelk-touchstack 1.0.0\"}\n"},
+            {{"command", "version", "--json"}, 0, "{\"answer\":\"zelk-touchstack " ZELK_VERSION "\"}\n"},
             {{"command", "selftest"},
              0,
              "configuration: intact\nanalog front end: 3 parameters\nselftest: passed\n"},

@@ -25,6 +25,7 @@ class FakeServiceManager : public android::IServiceManager {
     /// Called before each lookup with the name and its number, counted from 1 for each name.
     using LookupHook = std::function<void(const std::string& name, int attempt)>;
 
+    /// What a test does with it; `lookups` is how often a name was looked up.
     void add(const std::string& name, const android::sp<android::IBinder>& service);
     void remove(const std::string& name);
     int lookups(const std::string& name) const;
@@ -32,6 +33,7 @@ class FakeServiceManager : public android::IServiceManager {
     /// A hook may add or remove services, so that one appears at the n-th attempt.
     void onLookup(LookupHook hook);
 
+    /// What the library and the platform ask it.
     android::sp<android::IBinder> getService(const android::String16& name) const override;
     android::sp<android::IBinder> checkService(const android::String16& name) const override;
     android::status_t addService(const android::String16& name,
@@ -56,11 +58,13 @@ class FakeServiceManager : public android::IServiceManager {
 /// (NativeBinder.h).
 class ScopedServiceManager {
   public:
+    /// The manager takes its place, and leaves it.
     ScopedServiceManager();
     ~ScopedServiceManager();
     ScopedServiceManager(const ScopedServiceManager&) = delete;
     ScopedServiceManager& operator=(const ScopedServiceManager&) = delete;
 
+    /// The manager.
     FakeServiceManager* operator->() const { return mManager.get(); }
 
   private:

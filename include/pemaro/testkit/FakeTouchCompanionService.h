@@ -26,6 +26,7 @@ namespace pemaro::test {
 /// `getAFEParams(map)` against `getAFEParams(array)`.
 class FakeTouchCompanionService : public BnTouchCompanionService {
   public:
+    /// Notes of calls, in their order.
     using Calls = std::vector<std::string>;
 
     /// The status of an operation, by its bare name; 0 until set.
@@ -34,6 +35,7 @@ class FakeTouchCompanionService : public BnTouchCompanionService {
     /// Runs at each call, after it was noted and before it is answered, with the call's note.
     void onCall(std::function<void(const std::string& call)> hook);
 
+    /// The notes since the start or the last clearCalls().
     Calls calls() const;
     void clearCalls();
 

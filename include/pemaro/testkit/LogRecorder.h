@@ -10,11 +10,12 @@ namespace pemaro::test {
 
 /// One line of the platform's log, its text formatted.
 struct LogLine {
-    int priority;
-    std::string tag;
-    std::string text;
+    int priority;      ///< as the platform's: ANDROID_LOG_DEBUG …
+    std::string tag;   ///< who logged it
+    std::string text;  ///< without a line break at its end
 };
 
+/// Equality, and how a failed expectation shows a line.
 bool operator==(const LogLine& a, const LogLine& b);
 void PrintTo(const LogLine& line, std::ostream* out);
 
@@ -30,11 +31,14 @@ void PrintTo(const LogLine& line, std::ostream* out);
 /// death test can match. All of it may be used from any thread.
 class LogRecorder {
   public:
+    /// The one of the process.
     static LogRecorder& instance();
 
+    /// Forgets the lines; those since then, in their order.
     void clear();
     std::vector<LogLine> lines() const;
 
+    /// Adds a line, as the platform's log does.
     void record(LogLine line);
 
   private:

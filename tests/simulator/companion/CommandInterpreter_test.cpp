@@ -7,6 +7,7 @@
 #include <string>
 
 #include "pemaro/Status.h"
+#include "pemaro/Version.h"
 
 namespace pemaro::simulator {
 
@@ -55,7 +56,7 @@ TEST_F(CommandInterpreterTest, AnswersItsCommands) {
     } rows[] = {
             {command("calibrate", "3,16"), "done"},
             {command("calibrate"), "done"},
-            {command("version"), "zelk-touchstack 1.0.0"},
+            {command("version"), "zelk-touchstack " ZELK_VERSION},
             {command("status"), "filter=3 events=0 authenticated=no"},
             {command("selftest"),
              "configuration: intact\nanalog front end: 3 parameters\nselftest: passed"},

@@ -1,0 +1,45 @@
+#!/bin/bash
+# SPDX-License-Identifier: Apache-2.0
+# check-interfaces notices each list that an operation is missing in, in a copy of this tree.
+set -euo pipefail
+
+here=$(dirname -- "$(realpath -- "${BASH_SOURCE[0]}")")
+folder=$(mktemp -d)
+trap 'rm -rf -- "$folder"' EXIT
+failures=0
+
+cd -- "$here/../.."
+cp -r --parents -- include companion/ITouchCompanionService.cpp managers docs/*-protocol.md simulator/faults \
+    fuzz/proxies_fuzzer.cpp tests/companion tests/managers "$folder"
+cd -- "$folder"
+
+# forget FILE SED-COMMAND: what a contributor may forget.
+forget() {
+    cp -- "$1" "$folder/saved"
+    sed -i "$2" "$1"
+    if cmp -s "$1" "$folder/saved"; then
+        echo "there is no '$2' in $1" >&2
+        failures=$((failures + 1))
+    elif "$here/check-interfaces" "$folder" 2>"$folder/log"; then
+        echo "not noticed: '$2' in $1" >&2
+        failures=$((failures + 1))
+    elif ! grep -q -F "$1" "$folder/log"; then
+        echo "$1 is not named: $(<"$folder/log")" >&2
+        failures=$((failures + 1))
+    fi
+    mv -- "$folder/saved" "$1"
+}
+
+"$here/check-interfaces" "$folder"
+# shellcheck disable=SC2016 # the backquotes are meant
+{
+    forget simulator/faults/Fault.cpp '/"hand.scan"/d'
+    forget docs/binder-protocol.md 's/`Bp::inspect`/`Bp::Inspect`/'
+    forget docs/manager-protocol.md 's/`GET_MAXUSER`/`GET_MAX_USER`/'
+    forget managers/IHandBiometricManagerService.cpp 's/"SCAN transact received/"scan transact received/'
+    forget fuzz/proxies_fuzzer.cpp '/deleteGesture/d'
+    forget tests/companion/ITouchCompanionService_test.cpp '/Service::setAuth/d'
+    forget tests/companion/BnTouchCompanionService_test.cpp 's/{"saveSession", 26/{"saveSession", 99/'
+    forget tests/managers/ManagerStubs_test.cpp '/deleteGesture/d'
+}
+((failures == 0))
