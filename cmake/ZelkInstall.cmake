@@ -77,7 +77,7 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/zelkclient.pc
 # ---- documents and examples ----------------------------------------------------------------------------
 install(FILES README.md CHANGELOG.md SECURITY.md LICENSE DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
 install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation
-  FILES_MATCHING PATTERN "*.md" PATTERN doxygen EXCLUDE)
+  FILES_MATCHING PATTERN "*.md" PATTERN "*.svg" PATTERN doxygen EXCLUDE)
 install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
 
 install(FILES docs/zelkclient.7 DESTINATION ${CMAKE_INSTALL_MANDIR}/man7 COMPONENT Development)

@@ -34,7 +34,9 @@ TEST(CompanionCommands, OfTheDevice) {
     expectRows({
             {{"command", "calibrate 3 0x10"}, 0, "done\n"},
             {{"command", "status"}, 0, "filter=3 events=0 authenticated=no\n"},
-            {{"command", "version", "--json"}, 0, "{\"answer\":\"zelk-touchstack " ZELK_VERSION "\"}\n"},
+            {{"command", "version", "--json"},
+             0,
+             "{\"answer\":\"zelk-touchstack " ZELK_VERSION "\"}\n"},
             {{"command", "selftest"},
              0,
              "configuration: intact\nanalog front end: 3 parameters\nselftest: passed\n"},
