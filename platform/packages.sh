@@ -26,6 +26,10 @@ PACKAGES_ANDROID=(blueprint-tools checkpolicy secilc g++-aarch64-linux-gnu)
 PACKAGES_BENCH=(python3 binutils)
 # What makes the reference of the headers.
 PACKAGES_DOCS=(doxygen)
+# Terminals of a desk, and what makes them good to work at.
+PACKAGES_SHELL=(bash-completion dropbear-bin man-db openssh-client)
+# What formats the sources.
+PACKAGES_LINT=(clang-format)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 

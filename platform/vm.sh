@@ -176,15 +176,14 @@ vm_start_qemu() {
     VM_EXCHANGE=$VM_SCRATCH/exchange
     mkdir -p -- "$VM_EXCHANGE" "$ROOT/build"
     vm_write_command "$@" >"$VM_EXCHANGE/command"
-    realpath -- "$ROOT/build" >"$VM_EXCHANGE/build"
-    realpath -- "$ROOT" "$ZELK_CACHE" "$PWD" >"$VM_EXCHANGE/folders"
+    vm_write_folders "$PWD"
     : >"$VM_EXCHANGE/stdout"
     if ! [[ /dev/fd/1 -ef /dev/fd/2 ]]; then
         : >"$VM_EXCHANGE/stderr"
     fi
     mkfifo "$VM_SCRATCH/serial"
     exec {VM_SERIAL}<>"$VM_SCRATCH/serial"
-    vm_qemu_arguments
+    vm_qemu_arguments -chardev stdio,id=console,signal=off -serial chardev:console
     vm_helper qemu-system-x86_64 "${VM_QEMU[@]}" \
         <"$VM_SCRATCH/serial" >"$VM_SCRATCH/console" 2>&1 &
     VM_CHILD=$!
@@ -195,6 +194,12 @@ vm_start_qemu() {
         vm_follow "$VM_EXCHANGE/stderr" >&2 &
         VM_READERS+=("$!")
     fi
+}
+
+# vm_write_folders <folder> …: for the guest, what it is to show besides the tree and the cache. Parents come before what is in them.
+vm_write_folders() {
+    realpath -- "$ROOT/build" >"$VM_EXCHANGE/build"
+    realpath -- "$ROOT" "$ZELK_CACHE" "$@" | sort -u >"$VM_EXCHANGE/folders"
 }
 
 vm_follow() {
@@ -211,6 +216,7 @@ vm_watch_boot() {
     disown "$VM_WATCHDOG"
 }
 
+# vm_qemu_arguments <argument …>: VM_QEMU, with those.
 # shellcheck disable=SC2054 # commas are QEMU's
 vm_qemu_arguments() {
     local build
@@ -219,13 +225,13 @@ vm_qemu_arguments() {
         -kernel "$VM_KERNEL/vmlinuz" -initrd "$VM_INITRAMFS"
         # servicemanager asks for its callers' security contexts, which exist only with SELinux on.
         -append "console=ttyS0 quiet panic=-1 lsm=selinux selinux=1"
-        -chardev stdio,id=console,signal=off -serial chardev:console
         -fsdev "local,id=host,path=/,security_model=none,readonly=on,multidevs=remap"
         -device virtio-9p-pci,fsdev=host,mount_tag=host
         -fsdev "local,id=build,path=${build//,/,,},security_model=none,multidevs=remap"
         -device virtio-9p-pci,fsdev=build,mount_tag=build
         -fsdev "local,id=exchange,path=${VM_EXCHANGE//,/,,},security_model=none"
-        -device virtio-9p-pci,fsdev=exchange,mount_tag=exchange)
+        -device virtio-9p-pci,fsdev=exchange,mount_tag=exchange
+        "$@")
     if [[ ${ZELK_VM_ACCEL:-tcg} == kvm ]]; then
         VM_QEMU+=(-accel kvm -cpu host)
     else

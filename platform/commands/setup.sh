@@ -14,7 +14,7 @@ TEXT
 
 command_setup() {
     (($# == 0)) || die_usage "setup takes no argument"
-    begin all thread vm packaging --
+    begin all thread vm packaging android shell lint --
     ensure_platform ''
     ensure_platform thread
     setup_vm

@@ -35,9 +35,10 @@ expect_one_error() {
     expect_equal 1 "$(wc -l <"$SCRATCH/.errors")"
 }
 
+# For as long as a very busy machine may take.
 wait_until() {
     local attempt
-    for ((attempt = 0; attempt < 600; attempt++)); do
+    for ((attempt = 0; attempt < 3000; attempt++)); do
         if "$@"; then
             return
         fi

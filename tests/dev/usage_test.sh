@@ -37,6 +37,10 @@ build release nope|unknown preset 'nope'
 test --fast|unknown option '--fast'
 test -R|-R needs a regular expression
 demo 3|demo takes no argument
+shell now|unknown option 'now'; a command comes after --
+shell --stack|--stack needs zelk-touchstack's options
+shell --stack="|a quote in '"' has no end
+shell --|no command is given after --
 vm|no command is given
 vm --|no command is given
 vm --timeout|--timeout needs a number

@@ -95,6 +95,18 @@ SCRIPT
     rm -rf "$folder"
 }
 
+# It lies below the temporary folder, which is empty otherwise, and the tree lies in it.
+test_qemu_shows_a_current_folder_that_holds_the_tree() {
+    export ZELK_VM=qemu
+    mkdir -p folder/tree/build
+    cp -R "$ROOT/dev" "$ROOT/platform" folder/tree
+    echo seen >folder/file
+    cd folder
+    expect_status 0 tree/dev vm -- bash -c 'ls; cat file; touch tree/build/can; [[ ! -e ../.errors ]]'
+    expect_equal $'file\ntree\nseen' "$OUTPUT"
+    [[ -e tree/build/can ]] || fail "build/ is not the host's"
+}
+
 test_qemu_hands_ctrl_c_to_the_command() {
     export ZELK_VM=qemu
     start_vm bash -c "$handles_int"
