@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: Apache-2.0
-#: fuzz [target] [--seconds N] | attack each boundary, or one, with made-up inputs
+#: fuzz [options] | attack each boundary, or one, with made-up inputs
 # shellcheck shell=bash
 
 usage_fuzz() {
