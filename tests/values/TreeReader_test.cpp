@@ -132,6 +132,15 @@ TEST(MapReader, KeepsLastOfManyDuplicateKeys) {
               "\"z\":0}");
 }
 
+// A few bytes behind what all keys begin with are compared at once; the rest is when those are the same.
+TEST(MapReader, SortsKeysThatDifferFarBehindTheirBeginning) {
+    SerializableMap map;
+    ASSERT_EQ(0, map.unserialize(R"({"aaaaaaaaaaaaaaaa2":1,"b":2,"aaaaaaaaaaaaaaaa1":3,)"
+                                 R"("aaaaaaaaaaaaaaaa":4,"aaaaaaaaaaaaaaaa2":5})"));
+    EXPECT_EQ(R"({"aaaaaaaaaaaaaaaa":4,"aaaaaaaaaaaaaaaa1":3,"aaaaaaaaaaaaaaaa2":5,"b":2})",
+              map.serialize());
+}
+
 TEST(MapReader, DropsAKeyWithNothingBehindItsColon) {
     const Accepted kRows[] = {
             {"{\"a\":}", "13()"},
