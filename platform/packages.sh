@@ -8,11 +8,11 @@ PACKAGES_PLATFORM=(android-libutils-dev android-libcutils-dev android-liblog-dev
 PACKAGES_BUILD=(g++ cmake ninja-build)
 # The address sanitizer is clang's, with its runtime and symbolizer. The exported interface is compared by
 # libabigail, and compiled with the device's C++ library as well; zsh runs its completion; spin verifies the
-# model of the shared ring, and tmux is a terminal to draw on. The benchmarks compare with nlohmann's reader;
-# valgrind counts instructions. A program of the documents is in Python.
+# model of the shared ring, tmux is a terminal to draw on, and gcovr tells what the tests reach. The benchmarks
+# compare with nlohmann's reader; valgrind counts instructions. A program of the documents is in Python, and so is
+# the mutation check.
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev valgrind clang
-    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin tmux zsh
-    python3-minimal)
+    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin gcovr tmux zsh python3)
 # The browser that shows what zelkctl makes for browsers; large, and for the tests without the driver alone.
 PACKAGES_BROWSER=(chromium)
 # Libraries of zelkctl and the simulator; mandoc checks the manual pages.

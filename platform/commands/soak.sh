@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: Apache-2.0
-#: soak [--minutes N] [--seed SEED] | let clients and services work, stop and die at random over the real driver
+#: soak [options] | let clients and services work, stop and die at random over the real driver
 # shellcheck shell=bash
 
 usage_soak() {

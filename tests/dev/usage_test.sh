@@ -51,6 +51,13 @@ fuzz nothing|unknown target 'nothing'
 fuzz --seconds|--seconds needs a number
 fuzz --seconds 1h|'1h' is not a number of seconds
 fuzz --fast|unknown option '--fast'
+coverage values|coverage takes no argument
+mutate --count|--count needs a number
+mutate --count all|--count needs a number
+mutate values|unknown option 'values'
+soak --minutes|--minutes needs a number
+soak --minutes 0|--minutes needs a number
+soak --for 3|unknown option '--for'
 clean everything|clean takes no argument but --all
 ROWS
 }
