@@ -10,7 +10,7 @@ failures=0
 
 cd -- "$here/../.."
 cp -r --parents -- include companion/ITouchCompanionService.cpp managers docs/*-protocol.md simulator/faults \
-    fuzz/proxies_fuzzer.cpp tests/companion tests/managers "$folder"
+    fuzz/proxies_fuzzer.cpp tools/zelkctl/conformance tests/companion tests/managers "$folder"
 cd -- "$folder"
 
 # forget FILE SED-COMMAND: what a contributor may forget.
@@ -37,6 +37,7 @@ forget() {
     forget docs/binder-protocol.md 's/`Bp::inspect`/`Bp::Inspect`/'
     forget docs/manager-protocol.md 's/`GET_MAXUSER`/`GET_MAX_USER`/'
     forget managers/IHandBiometricManagerService.cpp 's/"SCAN transact received/"scan transact received/'
+    forget tools/zelkctl/conformance/Operations.cpp 's/^ *28,$/27,/'
     forget fuzz/proxies_fuzzer.cpp '/deleteGesture/d'
     forget tests/companion/ITouchCompanionService_test.cpp '/Service::setAuth/d'
     forget tests/companion/BnTouchCompanionService_test.cpp 's/{"saveSession", 26/{"saveSession", 99/'
