@@ -40,9 +40,6 @@ void summarize(const char* name, const android::sp<Simulator>& manager,
 
 TouchStack::TouchStack(const Options& options) {
     const auto has = [&options](ServiceKind service) { return options.services.count(service); };
-    if (has(ServiceKind::kCompanion)) {
-        mCompanion = new TouchCompanionSimulator(options.companion);
-    }
     if (has(ServiceKind::kTouch)) {
         mTouch = new TouchManagerSimulator(options.managers);
     }
@@ -51,6 +48,17 @@ TouchStack::TouchStack(const Options& options) {
     }
     if (has(ServiceKind::kHand)) {
         mHand = new HandBiometricManagerSimulator(options.managers);
+    }
+    if (has(ServiceKind::kCompanion)) {
+        SimulatorOptions companion = options.companion;
+        if (mGesture != nullptr) {
+            companion.states["gestures"] = [gesture = mGesture] { return gesture->gestures(); };
+            companion.states["gesturestate"] = [gesture = mGesture] { return gesture->state(); };
+        }
+        if (mHand != nullptr) {
+            companion.states["handstate"] = [hand = mHand] { return hand->state(); };
+        }
+        mCompanion = new TouchCompanionSimulator(companion);
     }
 }
 
@@ -77,18 +85,25 @@ void TouchStack::order(const Fault& fault) {
 
 std::string TouchStack::registerAll() {
     const auto manager = android::defaultServiceManager();
-    for (const ServiceKind service : kServiceKinds) {
-        const android::sp<android::IBinder> binder = binderOf(service);
-        if (binder == nullptr) {
-            continue;
-        }
-        const char* name = registeredName(service);
-        const android::status_t status = manager->addService(android::String16(name), binder);
+    for (const auto& [name, binder] : services()) {
+        const android::status_t status =
+                manager->addService(android::String16(name.c_str()), binder);
         if (status != android::OK) {
-            return std::string("the service manager refused ") + name + ": " + strerror(-status);
+            return "the service manager refused " + name + ": " + strerror(-status);
         }
     }
     return "";
+}
+
+std::vector<std::pair<std::string, android::sp<android::IBinder>>> TouchStack::services() const {
+    std::vector<std::pair<std::string, android::sp<android::IBinder>>> services;
+    for (const ServiceKind service : kServiceKinds) {
+        const android::sp<android::IBinder> binder = binderOf(service);
+        if (binder != nullptr) {
+            services.emplace_back(registeredName(service), binder);
+        }
+    }
+    return services;
 }
 
 android::sp<android::IBinder> TouchStack::binderOf(ServiceKind service) const {

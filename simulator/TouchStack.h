@@ -3,6 +3,7 @@
 
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "simulator/ServiceKind.h"
@@ -33,6 +34,9 @@ class TouchStack {
 
     /// Registers all services; empty, or why the service manager refused one.
     std::string registerAll();
+
+    /// The services with the names under which they are registered.
+    std::vector<std::pair<std::string, android::sp<android::IBinder>>> services() const;
 
     /// Ends all that goes on, and forgets all clients.
     void shutDown();

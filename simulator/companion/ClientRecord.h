@@ -39,6 +39,7 @@ class ClientRecord {
 
     bool isOpen() const { return mOpen; }
     bool isRecording() const { return mRecording != nullptr; }
+    bool recordsToFile() const { return isRecording() && mRing == nullptr; }
     void open() { mOpen = true; }
     void close() { mOpen = false; }
 

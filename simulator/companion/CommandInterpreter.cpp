@@ -35,8 +35,12 @@ bool getNumbers(const SerializableMap& params, std::vector<int>& numbers) {
     }
     SerializableMapArray values;
     params.valueFor("VALUES").getValue(values);
-    // An array does not tell its length; its text does: one more element than separators.
+    // An array does not tell its length; its text does: one more element than separators. A text
+    // among the elements may hold separators of its own, and is no number anyway.
     const std::string text = values.serialize();
+    if (text.find_first_of("\"{") != std::string::npos || text.find('[', 1) != std::string::npos) {
+        return false;
+    }
     const int present = text == "[]" ? 0 : 1 + std::count(text.begin(), text.end(), ',');
     if (present != count) {
         return false;
@@ -50,6 +54,14 @@ bool getNumbers(const SerializableMap& params, std::vector<int>& numbers) {
         numbers.push_back(number);
     }
     return true;
+}
+
+std::string joinLines(const std::vector<std::string>& lines) {
+    std::string text;
+    for (const std::string& line : lines) {
+        text += (text.empty() ? "" : "\n") + line;
+    }
+    return text;
 }
 
 SerializableMap wrapResults(const char* outer, const SerializableValue& results) {
@@ -89,6 +101,13 @@ int CommandInterpreter::answerDebug(const SerializableMap& body, SerializableMap
         mDevice.setFilter(mask);
         response = wrapResults(kDebug, 0);
         return STATUS_NO_ERROR;
+    }
+    if (action == "SET_CONFIG") {
+        const int status = mDevice.configuration().set(params);
+        if (status == STATUS_NO_ERROR) {
+            response = wrapResults(kDebug, 0);
+        }
+        return status;
     }
     std::string name;
     std::vector<int> numbers;
@@ -153,8 +172,14 @@ int CommandInterpreter::runCommand(const std::string& name, const std::vector<in
         for (int i = 0; i < bytes; ++i) {
             *text += static_cast<char>('a' + i % 26);
         }
+    } else if (name == "keys") {
+        *text = joinLines(mDevice.configuration().keys());
+    } else if (name == "sessions") {
+        *text = joinLines(mDevice.sessions());
     } else if (name == "fail") {
         return STATUS_ERROR_AFE_HAL;
+    } else if (mStates.count(name) != 0) {
+        *text = joinLines(mStates.at(name)());
     } else {
         return STATUS_INVALID_COMMAND;
     }

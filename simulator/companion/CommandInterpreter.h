@@ -2,10 +2,12 @@
 #pragma once
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "pemaro/SerializableMap.h"
 #include "simulator/companion/Device.h"
+#include "simulator/companion/SimulatorOptions.h"
 
 namespace pemaro::simulator {
 
@@ -18,11 +20,16 @@ namespace pemaro::simulator {
 ///     selftest             a report of several lines
 ///     factoryreset         forgets all settings; needs authentication
 ///     dump [BYTES]         an answer of this length, 65536 if not told, 262144 at most
+///     keys                 the keys of the configuration, one a line
+///     sessions             the sessions that can be restored, one a line
 ///     fail                 always fails, with 0x40000010
-/// A command without a text of its own answers with the length 0.
+/// and those of the services beside it that tell their state. The action SET_CONFIG takes new values
+/// for keys of the configuration, its parameters, all or none. A command without a text of its own answers with the length 0.
 class CommandInterpreter {
   public:
-    explicit CommandInterpreter(Device& device) : mDevice(device) {}
+    /// `states` are further commands.
+    explicit CommandInterpreter(Device& device, StateCommands states = {})
+            : mDevice(device), mStates(std::move(states)) {}
 
     /// Returns a status of Status.h; `response` is filled when it is 0.
     int answer(const SerializableMap& request, SerializableMap& response);
@@ -34,6 +41,7 @@ class CommandInterpreter {
     std::string selftest() const;
 
     Device& mDevice;
+    const StateCommands mStates;
 };
 
 }  // namespace pemaro::simulator

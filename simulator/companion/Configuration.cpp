@@ -102,6 +102,15 @@ int Configuration::get(SerializableMap& wanted) const {
     return STATUS_NO_ERROR;
 }
 
+std::vector<std::string> Configuration::keys() const {
+    SerializableMap values = mValues;
+    std::vector<std::string> keys(values.size());
+    for (size_t i = 0; i < keys.size(); ++i) {
+        values.keyAt(i, keys[i]);
+    }
+    return keys;
+}
+
 int Configuration::set(const SerializableMap& changes) {
     SerializableMap given = changes;
     SerializableMap values = mValues;

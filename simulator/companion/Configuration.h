@@ -35,6 +35,8 @@ class Configuration {
     /// Gives each key of `wanted` its value.
     int get(SerializableMap& wanted) const;
 
+    std::vector<std::string> keys() const;
+
     /// Takes new values for some keys.
     int set(const SerializableMap& changes);
 

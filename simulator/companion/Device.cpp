@@ -95,6 +95,14 @@ int Device::restoreSession(int id) {
     return STATUS_NO_ERROR;
 }
 
+std::vector<std::string> Device::sessions() const {
+    std::vector<std::string> sessions;
+    for (const auto& [id, settings] : mSessions) {
+        sessions.push_back(std::to_string(id));
+    }
+    return sessions;
+}
+
 int Device::authenticate(const std::string& text) {
     mAuthenticated = text == mAuthText;
     return mAuthenticated ? STATUS_NO_ERROR : STATUS_BAD_PARAMETER;

@@ -6,6 +6,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "frames/Frame.h"
 #include "pemaro/SerializableMap.h"
@@ -46,6 +47,8 @@ class Device {
     /// Keeps the configuration, front end and filter of now under a new identifier, from 1.
     int saveSession();
     int restoreSession(int id);
+    /// Their identifiers, the oldest first.
+    std::vector<std::string> sessions() const;
 
     int authenticate(const std::string& text);
     bool isAuthenticated() const { return mAuthenticated; }

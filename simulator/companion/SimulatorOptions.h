@@ -3,14 +3,20 @@
 
 #include <cstdint>
 #include <functional>
+#include <map>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "frames/Frame.h"
 
 namespace pemaro::simulator {
 
 class Replay;
+
+/// Debug commands without numbers, each with what yields the lines of its answer. Called with the
+/// service's lock held.
+using StateCommands = std::map<std::string, std::function<std::vector<std::string>()>>;
 
 /// What kind of touch stack is simulated.
 struct SimulatorOptions {
@@ -35,6 +41,9 @@ struct SimulatorOptions {
     uint32_t remindUs = 250;        ///< when to signal a frame again that was not taken; 0: never
     std::string configPath;         ///< the configuration's own place; empty: it has none
     std::string authText = "zelk";  ///< what setAuth() accepts
+
+    /// What the services beside this one tell of their state.
+    StateCommands states;
 
     /// Told one line about each thing that happens, if set. Called with the service's lock held.
     std::function<void(const std::string&)> narrate;

@@ -32,7 +32,7 @@ class TouchCompanionSimulator::DeathWatcher : public IBinder::DeathRecipient {
 };
 
 TouchCompanionSimulator::TouchCompanionSimulator(const SimulatorOptions& options)
-        : mOptions(options), mDevice(options.authText), mInterpreter(mDevice) {}
+        : mOptions(options), mDevice(options.authText), mInterpreter(mDevice, options.states) {}
 
 /// Runs an operation under the lock, unless a fault takes its place.
 template <typename Body>
@@ -174,15 +174,17 @@ int TouchCompanionSimulator::stopRecord() {
         if (!client.isRecording()) {
             return STATUS_INVALID_STATE;
         }
-        endRecording(client);
-        return STATUS_NO_ERROR;
+        // A frame that a file had no room for is lost to whoever wanted the recording there.
+        const bool isFile = client.recordsToFile();
+        const uint64_t dropped = endRecording(client);
+        return isFile && dropped > 0 ? STATUS_ERROR_WRITING_TO_FILE : STATUS_NO_ERROR;
     });
 }
 
-void TouchCompanionSimulator::endRecording(ClientRecord& client) {
+uint64_t TouchCompanionSimulator::endRecording(ClientRecord& client) {
     Recording::Counts counts;
     if (client.stop(&counts) != STATUS_NO_ERROR) {
-        return;
+        return 0;
     }
     mTotals.recordings += 1;
     mTotals.produced += counts.produced;
@@ -190,6 +192,7 @@ void TouchCompanionSimulator::endRecording(ClientRecord& client) {
     narrate("client " + std::to_string(client.pid()) +
             " stopped: " + std::to_string(counts.produced) + " frames, " +
             std::to_string(counts.dropped) + " without room in the ring");
+    return counts.dropped;
 }
 
 int TouchCompanionSimulator::getPacketSize() {

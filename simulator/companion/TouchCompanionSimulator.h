@@ -83,7 +83,8 @@ class TouchCompanionSimulator : public BnTouchCompanionService {
     int performForClient(const char* operation, Body body);
     int configPath(const std::string* given, std::string* path) const;
     void forgetDead(const android::IBinder* handle);
-    void endRecording(ClientRecord& client);
+    /// How many frames found no room.
+    uint64_t endRecording(ClientRecord& client);
     void narrate(const std::string& line) const;
 
     const SimulatorOptions mOptions;

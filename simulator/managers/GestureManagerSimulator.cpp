@@ -214,4 +214,20 @@ int GestureManagerSimulator::getMaxUserDefinedGesture(unsigned int& count) {
     });
 }
 
+std::vector<std::string> GestureManagerSimulator::gestures() {
+    std::lock_guard<std::mutex> guard(lock());
+    std::vector<std::string> lines;
+    for (const auto& [number, gesture] : mGestures) {
+        lines.push_back(std::to_string(number) + (gesture.enabled ? " enabled " : " disabled ") +
+                        std::to_string(gesture.samples.size()));
+    }
+    return lines;
+}
+
+std::vector<std::string> GestureManagerSimulator::state() {
+    std::lock_guard<std::mutex> guard(lock());
+    return {std::string("detection=") + (mDetection ? "on" : "off"),
+            std::string("wakeup=") + (mWakeup ? "on" : "off")};
+}
+
 }  // namespace pemaro::simulator

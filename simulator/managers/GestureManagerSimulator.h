@@ -40,6 +40,12 @@ class GestureManagerSimulator : public GestureManagerBase {
     /// The next gesture, if there is one. Its own clock calls this.
     void tick();
 
+    /// A line for each gesture: its number, whether it is enabled, how many samples it has (none when
+    /// the panel knows it by itself).
+    std::vector<std::string> gestures();
+    /// "detection=on" and "wakeup=off".
+    std::vector<std::string> state();
+
     int enableWakeup() override;
     int disableWakeup() override;
     int startGestureDetection() override;

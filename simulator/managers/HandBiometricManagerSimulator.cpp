@@ -312,4 +312,12 @@ int HandBiometricManagerSimulator::getProfileList(std::vector<std::string>& name
     });
 }
 
+std::vector<std::string> HandBiometricManagerSimulator::state() {
+    static constexpr const char* kNames[] = {"idle", "enrolling", "scanning", "matching"};
+    std::lock_guard<std::mutex> guard(lock());
+    return {std::string("activity=") + kNames[static_cast<int>(mActivity)],
+            std::string("wakeup=") + (mWakeup ? "on" : "off"),
+            "security=" + std::to_string(mSecurity)};
+}
+
 }  // namespace pemaro::simulator

@@ -41,6 +41,9 @@ class HandBiometricManagerSimulator : public HandManagerBase {
     /// One step of what is going on. Its own clock calls this.
     void tick();
 
+    /// What goes on, wake-up and security level, as in "activity=idle".
+    std::vector<std::string> state();
+
     int startEnrollment() override;
     int stopEnrollment() override;
     int scan() override;

@@ -9,8 +9,8 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <atomic>
 #include <chrono>
-#include <cstdio>
 #include <set>
 #include <string>
 #include <vector>
@@ -19,6 +19,9 @@
 #include "simulator/companion/ReplayedFrames.h"
 #include "tools/common/BinderDriver.h"
 #include "tools/common/CommandLine.h"
+#include "tools/common/Number.h"
+#include "tools/common/StandardOutput.h"
+#include "tools/touchstack/Registrar.h"
 
 using pemaro::simulator::Fault;
 using pemaro::simulator::ManagerOptions;
@@ -28,8 +31,12 @@ using pemaro::simulator::SimulatorOptions;
 using pemaro::simulator::TouchStack;
 using pemaro::tools::kExitFailure;
 using pemaro::tools::kExitSuccess;
+using pemaro::touchstack::Registrar;
 
 namespace {
+
+/// How often the service manager is looked after.
+constexpr timespec kManagerPeriod{0, 500000000};
 
 struct CommandLine {
     TouchStack::Options options;
@@ -39,9 +46,17 @@ struct CommandLine {
     bool showLog = false;
 };
 
-int fail(const std::string& problem) {
-    fmt::print(stderr, "zelk-touchstack: {}\n", problem);
-    return kExitFailure;
+int fail(const std::string& problem, int status = kExitFailure) {
+    pemaro::tools::writeError("zelk-touchstack: " + problem);
+    return status;
+}
+
+/// Tells a line. When nobody can read it any more, that is said once, and the services go on.
+void tell(const std::string& line) {
+    static std::atomic<bool> told{false};
+    if (!pemaro::tools::writeOutput(line + "\n") && !told.exchange(true)) {
+        fail(pemaro::tools::outputProblem() + "; the services go on in silence");
+    }
 }
 
 /// The texts of a command line that are looked at when all are there.
@@ -50,16 +65,29 @@ struct Texts {
     std::vector<std::string> faults;
 };
 
+/// Whole numbers of a range, and numbers with a fraction.
+std::function<std::string(const std::string&)> whole(int64_t least, int64_t most) {
+    return [=](const std::string& text) {
+        return pemaro::tools::numberProblem(text, {least, most});
+    };
+}
+
+std::function<std::string(const std::string&)> decimal(double least, double most) {
+    return [=](const std::string& text) {
+        return pemaro::tools::decimalProblem(text, {least, most});
+    };
+}
+
 void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
     SimulatorOptions& options = line.options.companion;
     app.add_option("--rate", options.rate, "Frames a second; 0 is as fast as the client takes them")
-            ->check(CLI::Range(0.0, SimulatorOptions::kMaxRate))
+            ->check(decimal(0, SimulatorOptions::kMaxRate), "")
             ->capture_default_str();
     app.add_option("--frame-bytes", options.frameBytes, "Packet size in bytes")
-            ->check(CLI::Range(SimulatorOptions::kMinFrameBytes, SimulatorOptions::kMaxFrameBytes))
+            ->check(whole(SimulatorOptions::kMinFrameBytes, SimulatorOptions::kMaxFrameBytes), "")
             ->capture_default_str();
     app.add_option("--ring-frames", options.ringFrames, "Frames that the shared ring holds")
-            ->check(CLI::Range(1u, SimulatorOptions::kMaxRingFrames))
+            ->check(whole(1, SimulatorOptions::kMaxRingFrames), "")
             ->capture_default_str();
     app.add_option("--remind", options.remindUs,
                    "Microseconds after which a frame that was not taken is signalled again; 0 is "
@@ -67,7 +95,7 @@ void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
             ->check(CLI::Range(0u, SimulatorOptions::kMaxRemindUs))
             ->capture_default_str();
     app.add_option("--fingers", options.fingers, "Fingers on the panel")
-            ->check(CLI::Range(0u, SimulatorOptions::kMaxFingers))
+            ->check(whole(0, SimulatorOptions::kMaxFingers), "")
             ->capture_default_str();
     app.add_option("--config-file", options.configPath,
                    "Where the configuration is saved and reloaded when no path is told");
@@ -94,7 +122,7 @@ void addReplayOptions(CLI::App& app, CommandLine& line) {
     app.add_option("--speed", options.speed,
                    "How fast to play it: 2 is twice as fast, 0 as fast as the client takes it")
             ->needs(replay)
-            ->check(CLI::Range(0.0, SimulatorOptions::kMaxSpeed))
+            ->check(decimal(0, SimulatorOptions::kMaxSpeed), "")
             ->capture_default_str();
     app.add_flag("--loop", options.loop, "Play it again and again")->needs(replay);
 }
@@ -102,17 +130,17 @@ void addReplayOptions(CLI::App& app, CommandLine& line) {
 void addManagerOptions(CLI::App& app, ManagerOptions& options) {
     app.add_option("--gesture-rate", options.gestureRate,
                    "Gestures a second of the touch and the gesture manager")
-            ->check(CLI::Range(0.0, ManagerOptions::kMaxRate))
+            ->check(decimal(0, ManagerOptions::kMaxRate), "")
             ->capture_default_str();
     app.add_option("--hand-rate", options.handRate,
                    "Steps a second of an enrollment, a scan or a matching")
-            ->check(CLI::Range(0.0, ManagerOptions::kMaxRate))
+            ->check(decimal(0, ManagerOptions::kMaxRate), "")
             ->capture_default_str();
     app.add_option("--user-gestures", options.userGestures, "Gestures that can be defined")
-            ->check(CLI::Range(0u, ManagerOptions::kMaxUserGestures))
+            ->check(whole(0, ManagerOptions::kMaxUserGestures), "")
             ->capture_default_str();
     app.add_option("--hand-profiles", options.handProfiles, "Hands that can be enrolled")
-            ->check(CLI::Range(0u, ManagerOptions::kMaxHandProfiles))
+            ->check(whole(0, ManagerOptions::kMaxHandProfiles), "")
             ->capture_default_str();
 }
 
@@ -176,20 +204,21 @@ const char* kUnpaced = "as fast as they are taken";
 void describeReplay(const CommandLine& line) {
     const SimulatorOptions& options = line.options.companion;
     const double seconds = std::chrono::duration<double>(options.replay->duration()).count();
-    fmt::print("replay      {}, {} frames of {:.3f} s, {}{}\n", line.replayPath,
-               options.replay->frames(), seconds,
-               options.speed > 0 ? fmt::format("speed {:g}", options.speed) : kUnpaced,
-               options.loop ? ", again and again" : "");
+    tell(fmt::format("replay      {}, {} frames of {:.3f} s, {}{}", line.replayPath,
+                     options.replay->frames(), seconds,
+                     options.speed > 0 ? fmt::format("speed {:g}", options.speed) : kUnpaced,
+                     options.loop ? ", again and again" : ""));
     if (options.replay->leftOut() != 0) {
-        fmt::print("left out    {} bytes that are no frame\n", options.replay->leftOut());
+        tell(fmt::format("left out    {} bytes that are no frame", options.replay->leftOut()));
     }
-    fmt::print("frames      {} bytes\n", options.frameBytes);
+    tell(fmt::format("frames      {} bytes", options.frameBytes));
 }
 
 void describeDrawing(const SimulatorOptions& options) {
     const std::string rate =
             options.rate > 0 ? fmt::format("{:g} frames/s", options.rate) : std::string(kUnpaced);
-    fmt::print("frames      {} bytes, {}, {} fingers\n", options.frameBytes, rate, options.fingers);
+    tell(fmt::format("frames      {} bytes, {}, {} fingers", options.frameBytes, rate,
+                     options.fingers));
 }
 
 void describeFrames(const CommandLine& line) {
@@ -199,28 +228,28 @@ void describeFrames(const CommandLine& line) {
     } else {
         describeDrawing(options);
     }
-    fmt::print("ring        {} frames, {} bytes\n", options.ringFrames,
-               pemaro::kTouchCompanionRingOffset + size_t{options.frameBytes} * options.ringFrames);
+    tell(fmt::format(
+            "ring        {} frames, {} bytes", options.ringFrames,
+            pemaro::kTouchCompanionRingOffset + size_t{options.frameBytes} * options.ringFrames));
     if (!options.configPath.empty()) {
-        fmt::print("config      {}\n", options.configPath);
+        tell("config      " + options.configPath);
     }
 }
 
 void describe(const CommandLine& line) {
     const TouchStack::Options& options = line.options;
     for (const ServiceKind service : options.services) {
-        fmt::print("serving     {}\n", pemaro::simulator::registeredName(service));
+        tell(fmt::format("serving     {}", pemaro::simulator::registeredName(service)));
     }
     if (options.services.count(ServiceKind::kCompanion) != 0) {
         describeFrames(line);
     }
-    fmt::print("events      {:g} gestures/s, {:g} hand steps/s\n", options.managers.gestureRate,
-               options.managers.handRate);
+    tell(fmt::format("events      {:g} gestures/s, {:g} hand steps/s", options.managers.gestureRate,
+                     options.managers.handRate));
     if (!line.faults.empty()) {
-        fmt::print("faults      {}\n", line.faults.size());
+        tell(fmt::format("faults      {}", line.faults.size()));
     }
-    fmt::print("process     {}\n", getpid());
-    fflush(stdout);
+    tell(fmt::format("process     {}", getpid()));
 }
 
 sigset_t stopSignals() {
@@ -232,19 +261,15 @@ sigset_t stopSignals() {
 }
 
 int serve(CommandLine& line) {
-    // Blocked before the first thread is made, so that only sigwait below sees them.
+    // Blocked before the first thread is made, so that only sigtimedwait below sees them.
     const sigset_t signals = stopSignals();
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
-    signal(SIGPIPE, SIG_IGN);
 
     const std::string problem = pemaro::tools::binderProblem();
     if (!problem.empty()) {
-        return fail(problem);
+        return fail(problem, pemaro::tools::kExitAbsent);
     }
-    line.options.companion.narrate = line.options.managers.narrate = [](const std::string& text) {
-        fmt::print("{}\n", text);
-        fflush(stdout);
-    };
+    line.options.companion.narrate = line.options.managers.narrate = tell;
     TouchStack stack(line.options);
     for (const Fault& fault : line.faults) {
         stack.order(fault);
@@ -256,18 +281,25 @@ int serve(CommandLine& line) {
     }
     describe(line);
 
-    int received = 0;
-    sigwait(&signals, &received);
+    Registrar registrar(stack.services(), tell);
+    while (sigtimedwait(&signals, nullptr, &kManagerPeriod) < 0) {
+        registrar.check();
+    }
     stack.shutDown();
     for (const std::string& text : stack.summary()) {
-        fmt::print("{}\n", text);
+        tell(text);
     }
-    return kExitSuccess;
+    return pemaro::tools::outputProblem().empty() ? kExitSuccess : kExitFailure;
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
+    pemaro::tools::openStandardStreams();
+    signal(SIGPIPE, SIG_IGN);
+    if (!pemaro::tools::outputProblem().empty()) {
+        pemaro::tools::leave(fail(pemaro::tools::outputProblem()));
+    }
     CLI::App app(
             "A simulated touch stack that serves the touch companion and the touch, gesture "
             "and hand biometric managers over Binder until SIGINT or SIGTERM.",

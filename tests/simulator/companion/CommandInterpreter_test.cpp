@@ -57,6 +57,10 @@ TEST_F(CommandInterpreterTest, AnswersItsCommands) {
             {command("calibrate", "3,16"), "done"},
             {command("calibrate"), "done"},
             {command("version"), "zelk-touchstack " ZELK_VERSION},
+            {command("keys"),
+             "device.name\nedge.zones\ngain\nnoise.threshold\npalm.rejection\npanel.size\n"
+             "report.rate\ntouch.threshold"},
+            {command("sessions"), ""},
             {command("status"), "filter=3 events=0 authenticated=no"},
             {command("selftest"),
              "configuration: intact\nanalog front end: 3 parameters\nselftest: passed"},
@@ -66,6 +70,57 @@ TEST_F(CommandInterpreterTest, AnswersItsCommands) {
         EXPECT_EQ(0, answer(row.request)) << row.request;
         EXPECT_EQ(results(row.text), response.serialize());
     }
+}
+
+TEST_F(CommandInterpreterTest, ListsTheSessions) {
+    device.saveSession();
+    device.saveSession();
+    EXPECT_EQ(0, answer(command("sessions")));
+    EXPECT_EQ(results("1\n2"), response.serialize());
+}
+
+TEST_F(CommandInterpreterTest, TellsTheStateOfTheServicesBesideIt) {
+    CommandInterpreter more(device,
+                            {{"handstate", [] {
+                                  return std::vector<std::string>{"activity=idle", "wakeup=off"};
+                              }}});
+    SerializableMap request;
+    EXPECT_EQ(0, request.unserialize(command("handstate")));
+    EXPECT_EQ(0, more.answer(request, response));
+    EXPECT_EQ(results("activity=idle\nwakeup=off"), response.serialize());
+    EXPECT_EQ(STATUS_INVALID_COMMAND, answer(command("handstate")));
+}
+
+TEST_F(CommandInterpreterTest, SetsValuesOfTheConfigurationAllOrNone) {
+    const auto set = [](const std::string& values) {
+        return "{\"DEBUG_COMMAND\":{\"REQUEST\":{\"ACTION\":\"SET_CONFIG\",\"PARAMETERS\":" +
+               values + "}}}";
+    };
+    const auto gain = [this] {
+        SerializableMap values;
+        values.add("gain", std::string("?"));
+        device.configuration().get(values);
+        return values.serialize();
+    };
+    EXPECT_EQ(STATUS_ERROR_PARSING_CONFIGURATION_SETTING,
+              answer(set("{\"gain\":2.5,\"volume\":3}")));
+    EXPECT_EQ("{\"gain\":1.500000}", gain());
+    EXPECT_EQ(0, answer(set("{\"gain\":2.5,\"noise.threshold\":3}")));
+    EXPECT_EQ("{\"gain\":2.5}", gain());
+}
+
+// What VALUES hold are numbers; a text with separators of its own is none of several.
+TEST_F(CommandInterpreterTest, RefusesTextsAmongNumbers) {
+    const auto request = [](const char* count, const char* values) {
+        return std::string(
+                       "{\"DEBUG_COMMAND\":{\"REQUEST\":{\"ACTION\":\"SEND_COMMAND\","
+                       "\"PARAMETERS\":{\"NUM_OF_ELEMENTS\":") +
+               count + ",\"SEND_COMMAND_NAME\":\"calibrate\",\"VALUES\":" + values + "}}}}";
+    };
+    EXPECT_EQ(STATUS_ERROR_PARSING_PARAMETER, answer(request("2", "[\"1,2\"]")));
+    EXPECT_EQ(STATUS_ERROR_PARSING_PARAMETER, answer(request("3", "[\"1,2\",3]")));
+    EXPECT_EQ(STATUS_ERROR_PARSING_PARAMETER, answer(request("2", "[[1,2]]")));
+    EXPECT_EQ(STATUS_ERROR_PARSING_PARAMETER, answer(request("2", "[{\"a\":1,\"b\":2}]")));
 }
 
 TEST_F(CommandInterpreterTest, CalibratesTheConfiguration) {
