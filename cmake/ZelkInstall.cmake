@@ -9,11 +9,11 @@ install(TARGETS zelktestkit zelktestkit_recorder EXPORT zelkclientTargets COMPON
 if(ZELK_BUILD_TOOLS)
   install(TARGETS zelkctl zelk-touchstack COMPONENT Tools)
   # Where bash, zsh and man look for them.
-  install(FILES tools/completions/zelkctl.bash
+  install(FILES ${ZELK_REFERENCE_DIR}/zelkctl.bash
     DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME zelkctl COMPONENT Tools)
-  install(FILES tools/completions/_zelkctl
+  install(FILES ${ZELK_REFERENCE_DIR}/_zelkctl
     DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions COMPONENT Tools)
-  install(FILES tools/man/zelkctl.1 tools/man/zelk-touchstack.1
+  install(FILES ${ZELK_REFERENCE_DIR}/zelkctl.1 tools/man/zelk-touchstack.1
     DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT Tools)
 endif()
 

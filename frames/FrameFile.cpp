@@ -4,14 +4,24 @@
 #include <android-base/errno_restorer.h>
 #include <android-base/macros.h>
 #include <fcntl.h>
+#include <limits.h>
+#include <poll.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <chrono>
 #include <cstdint>
 #include <cstring>
+#include <thread>
+#include <utility>
 
 namespace pemaro::frames {
 namespace {
+
+/// How often the other end of a pipe is looked at.
+constexpr std::chrono::milliseconds kPeriod(20);
 
 bool takeBack(int fd, size_t bytes) {
     const off_t end = ::lseek(fd, -static_cast<off_t>(bytes), SEEK_CUR);
@@ -37,20 +47,50 @@ Appended appendFrame(int fd, const void* frame, size_t length) {
 }
 
 FrameFile::~FrameFile() {
-    close();
+    // Nothing was to be written to it after all.
+    if (mFd.ok() && mIsCreated && !mHasBegun) {
+        ::unlink(mPath.c_str());
+    }
 }
 
-bool FrameFile::open(const std::string& path) {
-    mPath = path;
-    mFd.reset(::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644));
+bool FrameFile::open(const std::string& path, std::function<bool()> giveUp) {
+    mPath = mName = path;
+    mGiveUp = std::move(giveUp);
+    struct stat info {};
+    if (path == "-") {
+        mName = "the standard output";
+        mFd.reset(::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 0));
+    } else if (::stat(path.c_str(), &info) == 0) {
+        if (S_ISFIFO(info.st_mode)) {
+            return openFifo(path);
+        }
+        mFd.reset(::open(path.c_str(), O_WRONLY | O_CLOEXEC));
+    } else {
+        mFd.reset(::open(path.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0644));
+        mIsCreated = mFd.ok();
+    }
+    mIsFile = mFd.ok() && ::fstat(mFd.get(), &info) == 0 && S_ISREG(info.st_mode);
+    return mFd.ok() || fail("open");
+}
+
+bool FrameFile::openFifo(const std::string& path) {
+    // Opened to wait, it could not be given up.
+    mFd.reset(::open(path.c_str(), O_WRONLY | O_NONBLOCK | O_CLOEXEC));
+    while (!mFd.ok() && errno == ENXIO && !givesUp()) {
+        std::this_thread::sleep_for(kPeriod);
+        mFd.reset(::open(path.c_str(), O_WRONLY | O_NONBLOCK | O_CLOEXEC));
+    }
     return mFd.ok() || fail("open");
 }
 
 bool FrameFile::write(const void* frame, size_t length) {
-    if (!mProblem.empty()) {
+    if (!mProblem.empty() || !begin()) {
         return false;
     }
-    const Appended appended = appendFrame(mFd.get(), frame, length);
+    mWithinFrame = true;
+    const Appended appended =
+            mIsFile ? appendFrame(mFd.get(), frame, length) : appendToStream(frame, length);
+    mWithinFrame = appended == Appended::kPart;
     if (appended == Appended::kWhole) {
         return true;
     }
@@ -61,7 +101,48 @@ bool FrameFile::write(const void* frame, size_t length) {
     return false;
 }
 
+/// What a file held before gives way. The standard output is the caller's, who may be adding to it.
+bool FrameFile::begin() {
+    if (!mHasBegun && mIsFile && mPath != "-" && ::ftruncate(mFd.get(), 0) != 0) {
+        return fail("write");
+    }
+    mHasBegun = true;
+    return true;
+}
+
+Appended FrameFile::appendToStream(const void* frame, size_t length) {
+    const auto* next = static_cast<const uint8_t*>(frame);
+    size_t left = length;
+    while (left > 0) {
+        // A pipe that has room has room for so much.
+        const ssize_t written =
+                awaitRoom() ? ::write(mFd.get(), next, std::min<size_t>(left, PIPE_BUF)) : -1;
+        if (written >= 0) {
+            next += written;
+            left -= static_cast<size_t>(written);
+        } else if (errno != EINTR && errno != EAGAIN) {
+            return left == length ? Appended::kNothing : Appended::kPart;
+        }
+    }
+    return Appended::kWhole;
+}
+
+/// False, with an errno, when it is given up.
+bool FrameFile::awaitRoom() const {
+    pollfd entry{mFd.get(), POLLOUT, 0};
+    while (::poll(&entry, 1, static_cast<int>(kPeriod.count())) == 0) {
+        if (givesUp()) {
+            errno = ETIMEDOUT;
+            return false;
+        }
+    }
+    return true;
+}
+
 bool FrameFile::close() {
+    if (mFd.ok() && mProblem.empty()) {
+        begin();
+    }
     if (mFd.ok() && ::close(mFd.release()) != 0 && mProblem.empty()) {
         fail("write");
     }
@@ -69,7 +150,7 @@ bool FrameFile::close() {
 }
 
 bool FrameFile::fail(const char* what) {
-    mProblem = std::string("cannot ") + what + " " + mPath + ": " + strerror(errno);
+    mProblem = std::string("cannot ") + what + " " + mName + ": " + strerror(errno);
     return false;
 }
 

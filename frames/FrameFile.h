@@ -3,7 +3,9 @@
 
 #include <android-base/unique_fd.h>
 
+#include <atomic>
 #include <cstddef>
+#include <functional>
 #include <string>
 
 namespace pemaro::frames {
@@ -18,29 +20,49 @@ enum class Appended {
 /// file stays readable frame by frame; errno tells why.
 Appended appendFrame(int fd, const void* frame, size_t length);
 
-/// A file of raw frames, one after another. It never keeps a part of a frame.
+/// Raw frames, one after another, in a file, or to what is no file: the standard output, which is
+/// called "-", a pipe, a device. It never keeps a part of a frame in a file, and touches one that is
+/// there no sooner than there is something to write. One thread at a time.
 class FrameFile {
   public:
     ~FrameFile();
 
-    /// Creates or empties the file; false, with the reason in problem(), when it cannot.
-    bool open(const std::string& path);
+    /// Opens what is called `path`, through links, and creates it when it is not there; waits for
+    /// the reader of a FIFO. False, with the reason in problem(), when it cannot, or when `giveUp`
+    /// returns true; that is asked as well while whoever reads what is no file takes nothing.
+    bool open(const std::string& path, std::function<bool()> giveUp = nullptr);
 
-    /// Adds a frame. False after the first failure, and then nothing is written any more.
+    /// Adds a frame; the first takes the place of what the file held. False after the first
+    /// failure, and then nothing is written any more.
     bool write(const void* frame, size_t length);
 
-    /// Closes the file; false when something written before did not reach it.
+    /// Closes the file; false when something written before did not reach it. A file to which
+    /// nothing was written is empty then.
     bool close();
 
     /// The first failure, told with the file's name; empty as long as there is none.
     const std::string& problem() const { return mProblem; }
 
+    /// Whether a frame is being written, from any thread.
+    bool isWithinFrame() const { return mWithinFrame; }
+
   private:
+    bool openFifo(const std::string& path);
+    bool begin();
+    Appended appendToStream(const void* frame, size_t length);
+    bool awaitRoom() const;
+    bool givesUp() const { return mGiveUp && mGiveUp(); }
     bool fail(const char* what);
 
     std::string mPath;
+    std::string mName;
     std::string mProblem;
     android::base::unique_fd mFd;
+    std::function<bool()> mGiveUp;
+    bool mIsFile = false;
+    bool mIsCreated = false;
+    bool mHasBegun = false;
+    std::atomic<bool> mWithinFrame{false};
 };
 
 }  // namespace pemaro::frames

@@ -21,11 +21,11 @@
 #include "fuzz/support/ParcelInput.h"
 #include "simulator/companion/Configuration.h"
 #include "simulator/faults/Fault.h"
+#include "tools/common/Number.h"
 #include "tools/zelkctl/files/ConfigFile.h"
 #include "tools/zelkctl/files/GestureFile.h"
 #include "tools/zelkctl/services/FrameReceiver.h"
 #include "tools/zelkctl/terminal/Json.h"
-#include "tools/zelkctl/terminal/Number.h"
 
 namespace {
 
@@ -49,7 +49,7 @@ class File {
 };
 
 void checkNumber(const std::string& text) {
-    const auto number = zelkctl::parseNumber(text, zelkctl::kAny32);
+    const auto number = tools::parseNumber(text, tools::kAny32);
     errno = 0;
     char* end = nullptr;
     const long long expected = strtoll(text.c_str(), &end, 0);
@@ -57,12 +57,15 @@ void checkNumber(const std::string& text) {
                        end == text.c_str() + text.size() && errno == 0 && expected >= INT32_MIN &&
                        expected <= UINT32_MAX;
     fuzz::expect(number.has_value() == whole && (!whole || *number == expected), "another number");
+    const auto decimal = tools::parseDecimal(text, {-1e6, 1e6});
+    fuzz::expect(!decimal || (*decimal >= -1e6 && *decimal <= 1e6), "a number out of its range");
 }
 
 void checkJson(const std::string& name, const std::string& value) {
     zelkctl::JsonObject object;
     object.add("x" + name, value)
             .add("list", std::vector<std::string>{value, name})
+            .addParsed("parsed", value)
             .add("number", 3);
     rapidjson::Document read;
     read.Parse(object.text().c_str());

@@ -89,8 +89,8 @@ TEST(Check, SpeaksJsonAndTap) {
 
 TEST(Check, TellsWhatIsNotThere) {
     expectRows(
-            {{{"check"}, 1, "none of the services is running\n"},
-             {{"check", "touch"}, 1, "the service pemaro.TouchManagerService is not running\n"}});
+            {{{"check"}, 3, "none of the services is running\n"},
+             {{"check", "touch"}, 3, "the service pemaro.TouchManagerService is not running\n"}});
 }
 
 TEST_P(CheckFinds, TheFault) {

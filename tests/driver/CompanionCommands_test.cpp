@@ -41,25 +41,27 @@ TEST(CompanionCommands, OfTheDevice) {
              0,
              "configuration: intact\nanalog front end: 3 parameters\nselftest: passed\n"},
             {{"command", "dump 30"}, 0, "abcdefghijklmnopqrstuvwxyzabcd\n"},
-            {{"command", "fail"}, 1, "sendCommand: Error involving AFE HAL\n"},
-            {{"command", "dance"}, 1, "sendCommand: Invalid command\n"},
+            {{"command", "fail"}, 1, "sendCommand: Error involving AFE HAL (0x40000010): fail\n"},
+            {{"command", "dance"}, 1, "sendCommand: Invalid command (0x40000005): dance\n"},
             {{"filter", "0x1f"}, 0, "record filter 0x1f\n"},
             {{"filter", "8"}, 0, "record filter 0x8\n"},
             {{"property", "set", "setRollingLogSize", "512"}, 0, "setRollingLogSize set to 512\n"},
             {{"property", "set", "setRollingLogSize", "-1"},
              1,
-             "setProperty: Bad parameter (setRollingLogSize)\n"},
+             "setProperty: Bad parameter (0x4000000D): setRollingLogSize\n"},
             {{"property", "set", "SetRollingLogSize", "512"},
              1,
-             "setProperty: Invalid command (SetRollingLogSize)\n"},
+             "setProperty: Invalid command (0x40000005): SetRollingLogSize\n"},
             {{"event", "7", "0xffffffff"}, 0, "event 7 with 4294967295 sent\n"},
             {{"event", "-7", "0"}, 0, "event -7 with 0 sent\n"},
             {{"inspect"}, 0, "0x00010002\n"},
             {{"inspect", "--json"}, 0, "{\"value\":65538}\n"},
             {{"packet-size"}, 0, "4096\n"},
             {{"packet-size", "--json"}, 0, "{\"packetSize\":4096}\n"},
-            {{"auth", "guess"}, 1, "setAuth: Bad parameter\n"},
-            {{"command", "factoryreset"}, 1, "sendCommand: Invalid state\n"},
+            {{"auth", "guess"}, 1, "setAuth: Bad parameter (0x4000000D)\n"},
+            {{"command", "factoryreset"},
+             1,
+             "sendCommand: Invalid state (0x4000000B): factoryreset\n"},
             {{"auth", "zelk"}, 0, "authenticated\n"},
             {{"command", "status"}, 0, "filter=8 events=2 authenticated=yes\n"},
             {{"command", "factoryreset"}, 0, "response success\n"},
@@ -83,13 +85,12 @@ TEST(CompanionCommands, SendsNothingOfWhatItRefuses) {
     const std::string large = files.write("large", std::string(kMaxConfigBytes + 1, '\0'));
     expectRows({
             {{"command", "calibrate 3 x"},
-             1,
-             "command: Error parsing parameter (number: 'x' is no number from -2147483648 to "
-             "4294967295)\n"},
+             2,
+             "TEXT: 'x' is no number from -2147483648 to 4294967295 (--help tells more)\n"},
             {{"config", "load", large},
              1,
-             "config load: Data size exceeds size of buffer (" + large +
-                     " has more than 1039360 bytes, the most that a transaction carries)\n"},
+             "config load: Data size exceeds size of buffer (0x4000001A): " + large +
+                     " has more than 1039360 bytes, the most that a transaction carries\n"},
     });
     EXPECT_THAT(stack.process().output(), Not(HasSubstr(" registered")));
 }
@@ -104,9 +105,10 @@ TEST(CompanionCommands, ReadsValuesOfTheConfiguration) {
              "device.name=simulated touch panel\nedge.zones=[0,120,240]\ngain=1.500000\n"},
             {{"config", "get", "--json", "palm.rejection", "panel.size"},
              0,
-             "{\"palm.rejection\":\"true\","
-             "\"panel.size\":\"{\\\"height\\\":2400,\\\"width\\\":1080}\"}\n"},
-            {{"config", "get", "gain", "volume"}, 1, "getConfigParams: Not Found (gain, volume)\n"},
+             "{\"palm.rejection\":true,\"panel.size\":{\"height\":2400,\"width\":1080}}\n"},
+            {{"config", "get", "gain", "volume"},
+             1,
+             "getConfigParams: Not Found (0x40000019): volume\n"},
     });
 }
 
@@ -129,12 +131,14 @@ TEST(CompanionCommands, DumpsAndLoadsTheBinaryConfiguration) {
             {{"command", "calibrate 9"}, 0, "done\n"},
             {{"config", "load", files.write("corrupt", corrupt)},
              1,
-             "setConfigParams: Corrupt data (" + files.path("corrupt") + ")\n"},
+             "setConfigParams: Corrupt data (0x4000001D): " + files.path("corrupt") + "\n"},
             {{"config", "load", files.write("empty", "")},
              1,
-             "setConfigParams: Invalid format (" + files.path("empty") + ")\n"},
+             "setConfigParams: Invalid format (0x4000000C): " + files.path("empty") + "\n"},
             // As much as a transaction carries reaches the service.
-            {{"config", "load", largest}, 1, "setConfigParams: Invalid format (" + largest + ")\n"},
+            {{"config", "load", largest},
+             1,
+             "setConfigParams: Invalid format (0x4000000C): " + largest + "\n"},
             {{"config", "dump", second},
              0,
              "configuration of " + size + " bytes written to " + second + "\n"},
@@ -149,7 +153,8 @@ TEST(CompanionCommands, DumpsAndLoadsTheBinaryConfiguration) {
              "configuration of " + size + " bytes written to " + second + "\n"},
             {{"config", "dump", "/no/such/file"},
              1,
-             "config dump: Error opening file (/no/such/file: No such file or directory)\n"},
+             "config dump: Error opening file (0x40000001): /no/such/file: No such file or "
+             "directory\n"},
     });
     EXPECT_EQ(binary, files.read("second"));
     EXPECT_EQ("corrupt\nempty\nfirst\nlargest\nsecond\n", run({"ls", files.folder()}).output);
@@ -163,7 +168,7 @@ TEST(CompanionCommands, MakesTheServiceReadAndWriteItsConfiguration) {
     expectRows({
             {{"config", "reload", other}, 0, "configuration reloaded: " + other + "\n"},
             {{"config", "get", "gain"}, 0, "gain=2.5\n"},
-            {{"config", "reload"}, 1, "reloadConfig: Error opening file\n"},
+            {{"config", "reload"}, 1, "reloadConfig: Error opening file (0x40000001)\n"},
             {{"config", "save"}, 0, "configuration saved\n"},
             {{"session", "save"}, 0, "session 1\n"},
             {{"config", "reload", files.write("third", "{\"gain\":3}")},
@@ -175,7 +180,7 @@ TEST(CompanionCommands, MakesTheServiceReadAndWriteItsConfiguration) {
             {{"config", "get", "gain"}, 0, "gain=2.5\n"},
             {{"session", "restore", "0x2"}, 0, "session 2 restored\n"},
             {{"config", "get", "gain"}, 0, "gain=3\n"},
-            {{"session", "restore", "3"}, 1, "restoreSession: Not Found (3)\n"},
+            {{"session", "restore", "3"}, 1, "restoreSession: Not Found (0x40000019): session 3\n"},
             {{"config", "reload"}, 0, "configuration reloaded\n"},
             {{"config", "get", "gain"}, 0, "gain=2.5\n"},
             {{"config", "save", files.path("fourth")},
@@ -183,11 +188,10 @@ TEST(CompanionCommands, MakesTheServiceReadAndWriteItsConfiguration) {
              "configuration saved: " + files.path("fourth") + "\n"},
             {{"config", "save", "/no/such/file"},
              1,
-             "saveConfig: Error opening file (/no/such/file)\n"},
+             "saveConfig: Error opening file (0x40000001): /no/such/file\n"},
             {{"config", "reload", "/no/such/file"},
              1,
-             "reloadConfig: Error opening file (/no/such/file)\n"},
-            {{"config", "reload", ""}, 1, "reloadConfig: Invalid file path\n"},
+             "reloadConfig: Error opening file (0x40000001): /no/such/file\n"},
     });
     EXPECT_EQ(files.read("own"), files.read("fourth"));
     EXPECT_THAT(files.read("own"), HasSubstr("\"gain\":2.5,"));
@@ -206,24 +210,30 @@ TEST(CompanionCommands, TellInOneLineThatTheServiceRefuses) {
     Files files;
     const std::string file = files.write("file", "old");
     expectRows({
-            {{"command", "status"}, 1, "sendCommand: Broken pipe\n"},
-            {{"filter", "1"}, 1, "setRecordFilter: Broken pipe\n"},
+            {{"command", "status"}, 1, "sendCommand: Broken pipe (0x40000009): status\n"},
+            {{"filter", "1"}, 1, "setRecordFilter: Broken pipe (0x40000009): record filter 0x1\n"},
             {{"property", "set", "setRollingLogSize", "1"},
              1,
-             "setProperty: Broken pipe (setRollingLogSize)\n"},
-            {{"config", "get", "gain"}, 1, "getConfigParams: Broken pipe (gain)\n"},
+             "setProperty: Broken pipe (0x40000009): setRollingLogSize\n"},
+            {{"config", "get", "gain"}, 1, "getConfigParams: Broken pipe (0x40000009): gain\n"},
             // The binary form has no place for a status.
-            {{"config", "dump", file}, 1, "getConfigParams: An unknown error has occurred\n"},
-            {{"config", "load", file}, 1, "setConfigParams: Broken pipe (" + file + ")\n"},
-            {{"config", "reload"}, 1, "reloadConfig: Broken pipe\n"},
-            {{"config", "save"}, 1, "saveConfig: Broken pipe\n"},
-            {{"session", "save"}, 1, "saveSession: Broken pipe\n"},
-            {{"session", "restore", "1"}, 1, "restoreSession: Broken pipe (1)\n"},
-            {{"event", "1", "2"}, 1, "sendEvent: Broken pipe\n"},
-            {{"inspect", "--json"}, 1, "inspect: Broken pipe\n"},
-            {{"packet-size"}, 1, "getPacketSize: Broken pipe\n"},
-            {{"auth", "zelk"}, 1, "setAuth: Broken pipe\n"},
-            {{"record-file", file}, 1, "setRecordFile: Broken pipe (" + file + ")\n"},
+            {{"config", "dump", file},
+             1,
+             "getConfigParams: An unknown error has occurred (0x40000000)\n"},
+            {{"config", "load", file},
+             1,
+             "setConfigParams: Broken pipe (0x40000009): " + file + "\n"},
+            {{"config", "reload"}, 1, "reloadConfig: Broken pipe (0x40000009)\n"},
+            {{"config", "save"}, 1, "saveConfig: Broken pipe (0x40000009)\n"},
+            {{"session", "save"}, 1, "saveSession: Broken pipe (0x40000009)\n"},
+            {{"session", "restore", "1"},
+             1,
+             "restoreSession: Broken pipe (0x40000009): session 1\n"},
+            {{"event", "1", "2"}, 1, "sendEvent: Broken pipe (0x40000009): event 1 with 2\n"},
+            {{"inspect"}, 1, "inspect: Broken pipe (0x40000009)\n"},
+            {{"packet-size"}, 1, "getPacketSize: Broken pipe (0x40000009)\n"},
+            {{"auth", "zelk"}, 1, "setAuth: Broken pipe (0x40000009)\n"},
+            {{"record-file", file}, 1, "setRecordFile: Broken pipe (0x40000009): " + file + "\n"},
     });
     EXPECT_EQ("old", files.read("file"));
     EXPECT_EQ("file\n", run({"ls", files.folder()}).output);
@@ -232,13 +242,13 @@ TEST(CompanionCommands, TellInOneLineThatTheServiceRefuses) {
 TEST(CompanionCommands, TellInOneLineThatTheServiceIsNotThereOrDies) {
     const std::string absent = "the service pemaro.TouchService is not running\n";
     expectRows({
-            {{"command", "status"}, 1, absent},
-            {{"config", "get", "gain"}, 1, absent},
-            {{"session", "save"}, 1, absent},
-            {{"record-file", "/tmp/frames"}, 1, absent},
+            {{"command", "status"}, 3, absent},
+            {{"config", "get", "gain"}, 3, absent},
+            {{"session", "save"}, 3, absent},
+            {{"record-file", "/tmp/frames"}, 3, absent},
     });
     TouchStack stack({"--fault", "inspect=die"});
-    expectRows({{{"inspect"}, 1, "inspect: An unknown error has occurred\n"}});
+    expectRows({{{"inspect"}, 1, "inspect: An unknown error has occurred (0x40000000)\n"}});
 }
 
 TEST(RecordFile, MakesTheServiceRecordToAFile) {
@@ -274,8 +284,7 @@ TEST(RecordFile, IsRefusedWhenTheServiceCannotWriteThere) {
     expectRows({
             {{"record-file", "/no/such/file"},
              1,
-             "startRecord: Error opening file (/no/such/file)\n"},
-            {{"record-file", ""}, 1, "setRecordFile: Invalid file path\n"},
+             "startRecord: Error opening file (0x40000001): /no/such/file\n"},
     });
 }
 
@@ -285,7 +294,7 @@ TEST(RecordFile, ReportsTheDeathOfTheService) {
     ChildProcess record({binary("zelkctl"), "record-file", files.path("frames")});
     ASSERT_TRUE(record.awaitOutput("recording to "));
     stack.kill();
-    EXPECT_EQ(1, record.wait());
+    EXPECT_EQ(3, record.wait());
     EXPECT_THAT(record.errors(), MatchesRegex("zelkctl: the service died after [0-9.]+ s\n"));
 }
 

@@ -40,19 +40,23 @@ TEST(ManagerCommands, OfTheTouchManager) {
             {{"touch", "enable", "3"}, 0, "feature 3 enabled\n"},
             {{"touch", "features", "--first", "3", "--last", "4", "--json"},
              0,
-             "[{\"feature\":3,\"enabled\":true},{\"feature\":4,\"enabled\":false}]\n"},
+             "{\"feature\":3,\"enabled\":true}\n{\"feature\":4,\"enabled\":false}\n"},
             {{"touch", "disable", "3"}, 0, "feature 3 disabled\n"},
             {{"touch", "features", "--first", "7", "--last", "8"},
              0,
              "no feature from 7 to 8 is supported\n"},
-            {{"touch", "features", "--first", "7", "--last", "8", "--json"}, 0, "[]\n"},
-            {{"touch", "enable", "5"}, 1, "enable: Action/command is unsupported\n"},
-            {{"touch", "disable", "-1"}, 1, "disable: Action/command is unsupported\n"},
+            {{"touch", "features", "--first", "7", "--last", "8", "--json"}, 0, ""},
+            {{"touch", "enable", "5"},
+             1,
+             "enable: Action/command is unsupported (0x4000000E): feature 5\n"},
+            {{"touch", "disable", "-1"},
+             1,
+             "disable: Action/command is unsupported (0x4000000E): feature -1\n"},
             {{"touch", "region", "-1", "2", "300", "400"}, 0, "region -1,2 to 300,400 on\n"},
             {{"touch", "region", "0", "0", "3", "4", "--off"}, 0, "region 0,0 to 3,4 off\n"},
             {{"touch", "region", "3", "0", "3", "4", "--on"},
              1,
-             "configure_vm_region: Bad parameter\n"},
+             "configure_vm_region: Bad parameter (0x4000000D): region 3,0 to 3,4\n"},
     });
     EXPECT_TRUE(stack.awaitLine("touch: region -1,2 to 300,400 on"));
     EXPECT_TRUE(stack.awaitLine("touch: region 0,0 to 3,4 off"));
@@ -81,16 +85,21 @@ TEST(ManagerCommands, OfTheGestureManager) {
             {{"gesture", "add", two, two}, 0, "gesture 10 added\n"},
             {{"gesture", "verify", one}, 0, "gesture 9\n"},
             {{"gesture", "disable", "9"}, 0, "gesture 9 disabled\n"},
-            {{"gesture", "verify", one}, 1, "verifyGesture: Not Found\n"},
+            {{"gesture", "verify", one}, 1, "verifyGesture: Not Found (0x40000019): " + one + "\n"},
             {{"gesture", "enable", "9"}, 0, "gesture 9 enabled\n"},
             {{"gesture", "delete", "9"}, 0, "gesture 9 deleted\n"},
-            {{"gesture", "delete", "9"}, 1, "deleteGesture: Not Found\n"},
-            {{"gesture", "delete", "1"}, 1, "deleteGesture: Action/command is unsupported\n"},
-            {{"gesture", "add", zeros}, 1, "addGesture: Invalid format\n"},
+            {{"gesture", "delete", "9"}, 1, "deleteGesture: Not Found (0x40000019): gesture 9\n"},
+            {{"gesture", "delete", "1"},
+             1,
+             "deleteGesture: Action/command is unsupported (0x4000000E): gesture 1\n"},
+            {{"gesture", "add", zeros},
+             1,
+             "addGesture: Invalid format (0x4000000C): " + zeros + "\n"},
             {{"gesture", "add", files.path("seen")},
              1,
-             "addGesture: An unknown error has occurred (20 records are 1442880 bytes, and a "
-             "transaction carries 14 records at most; nothing was added)\n"},
+             "addGesture: An unknown error has occurred (0x40000000): 20 records are 1442880 "
+             "bytes, "
+             "and a transaction carries 14 records at most; nothing was added\n"},
             {{"gesture", "add", cut},
              1,
              cut + " holds 5 bytes more than whole records of 72144 bytes\n"},
@@ -124,18 +133,22 @@ TEST(ManagerCommands, OfTheHandBiometricManager) {
             {{"hand", "rename", "Anna", "B\"\\\n"}, 0, "profile Anna renamed B\"\\?\n"},
             {{"hand", "profiles", "--json"}, 0, "{\"profiles\":[\"B\\\"\\\\\\n\"],\"max\":5}\n"},
             {{"hand", "profiles"}, 0, "B\"\\?\n1 of 5 profiles\n"},
-            {{"hand", "rename", "Carl", "Dora"}, 1, "renameProfile: Not Found\n"},
-            {{"hand", "delete", "Carl"}, 1, "deleteProfile: Not Found\n"},
+            {{"hand", "rename", "Carl", "Dora"},
+             1,
+             "renameProfile: Not Found (0x40000019): Carl to Dora\n"},
+            {{"hand", "delete", "Carl"}, 1, "deleteProfile: Not Found (0x40000019): Carl\n"},
             {{"hand", "delete", "B\"\\\n"}, 0, "profile B\"\\? deleted\n"},
-            {{"hand", "name", "Emil"}, 1, "setProfileName: Invalid state\n"},
+            {{"hand", "name", "Emil"}, 1, "setProfileName: Invalid state (0x4000000B): Emil\n"},
             {{"hand", "profiles", "--json"}, 0, "{\"profiles\":[],\"max\":5}\n"},
             {{"hand", "security", "3"}, 0, "security level 3\n"},
-            {{"hand", "security", "-2"}, 1, "setSecurity: Bad parameter\n"},
+            {{"hand", "security", "-2"},
+             1,
+             "setSecurity: Bad parameter (0x4000000D): security level -2\n"},
             {{"hand", "match"}, 0, "matching started\n"},
-            {{"hand", "scan"}, 1, "scan: Invalid state\n"},
+            {{"hand", "scan"}, 1, "scan: Invalid state (0x4000000B)\n"},
             {{"hand", "match", "--stop"}, 0, "matching stopped\n"},
-            {{"hand", "enroll", "--stop"}, 1, "stopEnrollment: Invalid state\n"},
-            {{"hand", "cancel"}, 1, "cancelScan: Invalid state\n"},
+            {{"hand", "enroll", "--stop"}, 1, "stopEnrollment: Invalid state (0x4000000B)\n"},
+            {{"hand", "cancel"}, 1, "cancelScan: Invalid state (0x4000000B)\n"},
             {{"hand", "match"}, 0, "matching started\n"},
             {{"hand", "cancel"}, 0, "cancelled\n"},
             {{"hand", "scan"}, 0, "scan started\n"},
@@ -253,12 +266,12 @@ TEST(ManagerCommands, TellThatTheServiceIsNotThere) {
     TouchStack stack({"--services", "touch"});
     ChildProcess gesture({binary("zelkctl"), "gesture", "limits"});
     ChildProcess hand({binary("zelkctl"), "hand", "watch"});
-    EXPECT_EQ(1, gesture.wait());
+    EXPECT_EQ(3, gesture.wait());
     EXPECT_EQ(
             "zelkctl: waiting for the service pemaro.GestureManagerService\n"
             "zelkctl: the service pemaro.GestureManagerService is not running\n",
             gesture.errors());
-    EXPECT_EQ(1, hand.wait());
+    EXPECT_EQ(3, hand.wait());
     EXPECT_THAT(hand.errors(),
                 HasSubstr("the service pemaro.HandBiometricManagerService is not running\n"));
 }
@@ -275,11 +288,15 @@ TEST(ManagerCommands, TellTheStatusOfAFaultyService) {
                       "gesture.getMaxPreDefinedGesture=status:0x40000015", "--fault",
                       "hand.startEnrollment=status:0x40000010", "--fault", "hand.scan=die"});
     expectRows({
-            {{"touch", "watch"}, 1, "init: Error allocating memory\n"},
-            {{"gesture", "limits"}, 1, "getMaxPreDefinedGesture: Timeout has occurred\n"},
-            {{"hand", "enroll"}, 1, "startEnrollment: Error involving AFE HAL\n"},
-            {{"hand", "enroll", "-n", "1"}, 1, "startEnrollment: Error involving AFE HAL\n"},
-            {{"hand", "scan"}, 1, "scan: An unknown error has occurred\n"},
+            {{"touch", "watch"}, 1, "init: Error allocating memory (0x40000006)\n"},
+            {{"gesture", "limits"},
+             1,
+             "getMaxPreDefinedGesture: Timeout has occurred (0x40000015)\n"},
+            {{"hand", "enroll"}, 1, "startEnrollment: Error involving AFE HAL (0x40000010)\n"},
+            {{"hand", "enroll", "-n", "1"},
+             1,
+             "startEnrollment: Error involving AFE HAL (0x40000010)\n"},
+            {{"hand", "scan"}, 1, "scan: An unknown error has occurred (0x40000000)\n"},
     });
 }
 

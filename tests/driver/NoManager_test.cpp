@@ -2,9 +2,12 @@
 // The programs on a machine with the Binder driver and without a service manager.
 
 #include <gtest/gtest.h>
+#include <signal.h>
 #include <unistd.h>
 
+#include <memory>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "tests/support/ChildProcess.h"
@@ -21,10 +24,32 @@ TEST(NoServiceManager, IsToldAtOnceInOneLine) {
         const std::string name = command[0];
         command[0] = folder + name;
         const RunResult result = run(command, std::chrono::seconds(10));
-        EXPECT_EQ(1, result.status);
+        EXPECT_EQ(3, result.status);
         EXPECT_EQ(name + ": no service manager is running\n", result.errors);
         EXPECT_EQ("", result.output);
     }
+}
+
+// The service manager of a desk is a program like any other.
+TEST(ServiceManager, ThatIsNewLearnsOfTheServices) {
+    const std::string folder = ZELK_BIN_DIR "/";
+    auto manager = std::make_unique<ChildProcess>(
+            std::vector<std::string>{ZELK_PLATFORM_BIN_DIR "/servicemanager"});
+    std::this_thread::sleep_for(std::chrono::milliseconds(500));
+    ChildProcess stack({folder + "zelk-touchstack", "--gesture-rate", "0"});
+    ASSERT_TRUE(stack.awaitOutput("process "));
+    EXPECT_EQ(0, run({folder + "zelkctl", "ping"}).status);
+
+    manager.reset();
+    EXPECT_TRUE(stack.awaitOutput("the service manager died; nobody new finds the services\n"));
+    EXPECT_EQ(3, run({folder + "zelkctl", "ping"}).status);
+    manager = std::make_unique<ChildProcess>(
+            std::vector<std::string>{ZELK_PLATFORM_BIN_DIR "/servicemanager"});
+    EXPECT_TRUE(stack.awaitOutput("registered again with the new service manager\n"));
+    EXPECT_EQ(0, run({folder + "zelkctl", "ping"}).status);
+    EXPECT_EQ(0, run({folder + "zelkctl", "gesture", "limits"}).status);
+    stack.signal(SIGTERM);
+    EXPECT_EQ(0, stack.wait());
 }
 
 }  // namespace pemaro::test

@@ -56,7 +56,7 @@ TEST(Zelkctl, PingsTheService) {
 TEST(Zelkctl, TellsAtOnceThatThereIsNoService) {
     for (const char* command : {"ping", "record"}) {
         const RunResult result = zelkctl({command});
-        EXPECT_EQ(1, result.status);
+        EXPECT_EQ(3, result.status);
         EXPECT_EQ("", result.output);
         EXPECT_EQ("zelkctl: the service pemaro.TouchService is not running\n", result.errors);
     }
@@ -155,7 +155,7 @@ TEST(Zelkctl, ReportsTheDeathOfTheService) {
     ChildProcess record({binary("zelkctl"), "record"});
     ASSERT_TRUE(record.awaitOutput(" frames/s "));
     touchStack.kill();
-    EXPECT_EQ(1, record.wait());
+    EXPECT_EQ(3, record.wait());
     EXPECT_THAT(record.errors(), MatchesRegex("zelkctl: the service died after [0-9]+ frames\n"));
     EXPECT_THAT(lastLine(record.output()), MatchesRegex("recorded [0-9]+ frames, .*"));
 }
@@ -180,21 +180,23 @@ TEST_P(ZelkctlRefusal, IsTheStatusInOneLine) {
 
 INSTANTIATE_TEST_SUITE_P(
         All, ZelkctlRefusal,
-        ::testing::Values(Refusal{"open=status:0x4000000A",
-                                  "zelkctl: init: Error attempting to acquire resource\n"},
-                          Refusal{"getPacketSize=status:0x40000007",
-                                  "zelkctl: getPacketSize: Invalid packet size\n"},
-                          Refusal{"getPacketSize=status:0",
-                                  "zelkctl: the service tells a packet size of 0 bytes\n"},
-                          Refusal{"setRecordParameter=status:0x4000000E",
-                                  "zelkctl: setRecordOutput: Action/command is unsupported\n"},
-                          Refusal{"getCblk=null",
-                                  "zelkctl: startRecord: Error attempting to acquire resource\n"},
-                          Refusal{"startRecord=status:0x40000010",
-                                  "zelkctl: startRecord: Error involving AFE HAL\n"},
-                          Refusal{"stopRecord=status:0x40000015",
-                                  "zelkctl: stopRecord: Timeout has occurred\n"},
-                          Refusal{"startRecord=die",
-                                  "zelkctl: startRecord: An unknown error has occurred\n"}));
+        ::testing::Values(
+                Refusal{"open=status:0x4000000A",
+                        "zelkctl: init: Error attempting to acquire resource (0x4000000A)\n"},
+                Refusal{"getPacketSize=status:0x40000007",
+                        "zelkctl: getPacketSize: Invalid packet size (0x40000007)\n"},
+                Refusal{"getPacketSize=status:0",
+                        "zelkctl: the service tells a packet size of 0 bytes\n"},
+                Refusal{"setRecordParameter=status:0x4000000E",
+                        "zelkctl: setRecordOutput: Action/command is unsupported (0x4000000E)\n"},
+                Refusal{"getCblk=null",
+                        "zelkctl: startRecord: Error attempting to acquire resource "
+                        "(0x4000000A)\n"},
+                Refusal{"startRecord=status:0x40000010",
+                        "zelkctl: startRecord: Error involving AFE HAL (0x40000010)\n"},
+                Refusal{"stopRecord=status:0x40000015",
+                        "zelkctl: stopRecord: Timeout has occurred (0x40000015)\n"},
+                Refusal{"startRecord=die",
+                        "zelkctl: startRecord: An unknown error has occurred (0x40000000)\n"}));
 
 }  // namespace pemaro::test

@@ -1,14 +1,17 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "frames/FrameFile.h"
 
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/resource.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <csignal>
 #include <fstream>
 #include <iterator>
 #include <string>
+#include <vector>
 
 namespace pemaro::frames {
 
@@ -43,6 +46,65 @@ TEST_F(FrameFileTest, TellsWhyItCannotBeOpened) {
     EXPECT_FALSE(file.open("/no/such/folder/file"));
     EXPECT_EQ("cannot open /no/such/folder/file: No such file or directory", file.problem());
     EXPECT_FALSE(file.close());
+}
+
+TEST_F(FrameFileTest, LeavesAFileAloneUntilThereIsSomethingToWrite) {
+    std::ofstream(path) << "what was there before";
+    {
+        FrameFile other;
+        ASSERT_TRUE(other.open(path));
+    }
+    EXPECT_EQ("what was there before", contents(path));
+    ASSERT_TRUE(file.open(path));
+    EXPECT_EQ("what was there before", contents(path));
+    EXPECT_TRUE(file.close());
+    EXPECT_EQ("", contents(path));
+}
+
+TEST_F(FrameFileTest, LeavesNoFileWhenThereWasNothingToWrite) {
+    {
+        FrameFile other;
+        ASSERT_TRUE(other.open(path));
+    }
+    EXPECT_NE(0, access(path.c_str(), F_OK));
+    ASSERT_TRUE(file.open(path));
+    EXPECT_TRUE(file.close());
+    EXPECT_EQ(0, access(path.c_str(), F_OK));
+}
+
+TEST_F(FrameFileTest, FollowsALink) {
+    const std::string link = path + ".link";
+    std::ofstream(path) << "old";
+    ASSERT_EQ(0, symlink(path.c_str(), link.c_str()));
+    ASSERT_TRUE(file.open(link));
+    EXPECT_TRUE(file.write("new", 3));
+    EXPECT_TRUE(file.close());
+    struct stat info {};
+    EXPECT_EQ(0, lstat(link.c_str(), &info));
+    EXPECT_TRUE(S_ISLNK(info.st_mode));
+    EXPECT_EQ("new", contents(path));
+    unlink(link.c_str());
+}
+
+TEST_F(FrameFileTest, WaitsForTheReaderOfAFifoUntilItGivesUp) {
+    ASSERT_EQ(0, mkfifo(path.c_str(), 0600));
+    int asked = 0;
+    EXPECT_FALSE(file.open(path, [&asked] { return ++asked == 3; }));
+    EXPECT_EQ("cannot open " + path + ": No such device or address", file.problem());
+
+    const int reader = ::open(path.c_str(), O_RDONLY | O_NONBLOCK);
+    FrameFile fifo;
+    asked = 0;
+    ASSERT_TRUE(fifo.open(path, [&asked] { return ++asked == 3; }));
+    EXPECT_TRUE(fifo.write("frame", 5));
+    EXPECT_FALSE(fifo.isWithinFrame());
+    // The pipe is full before all of it is in it, and nobody reads.
+    const std::vector<char> large(1 << 20);
+    EXPECT_FALSE(fifo.write(large.data(), large.size()));
+    EXPECT_TRUE(fifo.isWithinFrame());
+    EXPECT_EQ("cannot write " + path + ": Connection timed out, which ends within a frame",
+              fifo.problem());
+    ::close(reader);
 }
 
 TEST_F(FrameFileTest, WritesNothingMoreAfterAFailure) {

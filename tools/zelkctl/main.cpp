@@ -5,47 +5,59 @@
 #include <signal.h>
 
 #include <CLI/CLI.hpp>
+#include <cstring>
 
 #include "tools/common/CommandLine.h"
-#include "tools/zelkctl/commands/CheckCommand.h"
-#include "tools/zelkctl/commands/Commands.h"
-#include "tools/zelkctl/commands/frames/FramesCommands.h"
+#include "tools/common/StandardOutput.h"
+#include "tools/zelkctl/commands/CommandTree.h"
+#include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
+
+using namespace pemaro;
+
+namespace {
+
+/// What is wrong with a command line is told before it is read, and in the form that it asks for.
+bool asksForJson(int argc, char** argv) {
+    for (int i = 1; i < argc; ++i) {
+        if (strcmp(argv[i], "--json") == 0) {
+            return true;
+        }
+    }
+    return false;
+}
+
+}  // namespace
 
 int main(int argc, char** argv) {
-    CLI::App app("Talks to the touch service through libzelkclient.", "zelkctl");
-    app.require_subcommand(0, 1);
-    bool showLog = false;
-    app.add_flag("--log", showLog, "Show the platform's log lines on stderr");
-
-    pemaro::zelkctl::Action action;
-    pemaro::zelkctl::addPingCommand(app, action);
-    pemaro::zelkctl::addCheckCommand(app, action);
-    pemaro::zelkctl::addRecordCommand(app, action);
-    pemaro::zelkctl::addRecordFileCommand(app, action);
-    pemaro::zelkctl::addFramesCommands(app, action);
-    pemaro::zelkctl::addCommandCommand(app, action);
-    pemaro::zelkctl::addFilterCommand(app, action);
-    pemaro::zelkctl::addPropertySetCommand(app, action);
-    pemaro::zelkctl::addEventCommand(app, action);
-    pemaro::zelkctl::addInspectCommand(app, action);
-    pemaro::zelkctl::addPacketSizeCommand(app, action);
-    pemaro::zelkctl::addAuthCommand(app, action);
-    pemaro::zelkctl::addConfigCommands(app, action);
-    pemaro::zelkctl::addSessionCommands(app, action);
-    pemaro::zelkctl::addTouchCommands(app, action);
-    pemaro::zelkctl::addGestureCommands(app, action);
-    pemaro::zelkctl::addHandCommands(app, action);
-
-    const auto done = pemaro::tools::parseCommandLine(app, argc, argv, [&action] {
-        if (!action) {
-            throw CLI::ValidationError("a command is required");
-        }
-    });
-    if (done) {
-        return *done;
-    }
-    pemaro::tools::showPlatformLog(showLog);
-    // A reader of our output that went away is an error of writing, not the end of the recording.
+    tools::openStandardStreams();
+    // A reader of our output that went away is an error of writing, not the end of the command.
     signal(SIGPIPE, SIG_IGN);
-    pemaro::tools::leave(action());
+    zelkctl::settings().json = asksForJson(argc, argv);
+    if (!tools::outputProblem().empty()) {
+        tools::leave(zelkctl::fail(tools::outputProblem()));
+    }
+
+    CLI::App app;
+    zelkctl::Action action;
+    zelkctl::addCommandTree(app, action);
+    const auto done = tools::parseCommandLine(
+            app, argc, argv,
+            [&] {
+                if (action) {
+                    return;
+                }
+                if (!app.get_subcommands().empty()) {
+                    throw CLI::ValidationError(app.get_subcommands()[0]->get_name() +
+                                               ": a command is required");
+                }
+                throw CLI::CallForHelp();
+            },
+            [](const std::string& problem) { zelkctl::failUsage(problem); });
+    if (done) {
+        tools::leave(*done);
+    }
+    tools::showPlatformLog(zelkctl::settings().log);
+    tools::leave(zelkctl::supervise(action, zelkctl::settings().timeout));
 }

@@ -3,7 +3,6 @@
 
 #include <binder/IServiceManager.h>
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <memory>
 #include <string>
@@ -11,7 +10,10 @@
 
 #include "tools/zelkctl/conformance/Conformance.h"
 #include "tools/zelkctl/services/ServiceWatch.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 using android::IBinder;
 using android::sp;
@@ -22,11 +24,12 @@ namespace {
 struct CheckOptions {
     std::vector<std::string> services;
     bool invasive = false;
-    bool json = false;
     bool tap = false;
 
     Findings::Style style() const {
-        return json ? Findings::Style::kJson : tap ? Findings::Style::kTap : Findings::Style::kText;
+        return settings().json ? Findings::Style::kJson
+               : tap           ? Findings::Style::kTap
+                               : Findings::Style::kText;
     }
     bool asksFor(const CheckedInterface& interface) const {
         return services.empty() ||
@@ -34,20 +37,26 @@ struct CheckOptions {
     }
 };
 
-void printLine(const std::string& line) {
-    fmt::print("{}\n", line);
-    fflush(stdout);
+bool isChecked(const std::string& service) {
+    const auto& interfaces = checkedInterfaces();
+    return std::any_of(
+            std::begin(interfaces), std::end(interfaces),
+            [&service](const CheckedInterface& interface) { return interface.word == service; });
 }
 
 int check(const CheckOptions& options) {
-    if (!startBinder()) {
-        return tools::kExitFailure;
+    const int exitStatus = startBinder();
+    if (exitStatus != tools::kExitSuccess) {
+        return exitStatus;
     }
     const auto manager = android::defaultServiceManager();
     std::vector<std::pair<const CheckedInterface*, sp<IBinder>>> found;
     for (const CheckedInterface& interface : checkedInterfaces()) {
         if (!options.asksFor(interface)) {
             continue;
+        }
+        if (mustStop()) {
+            return failStopped();
         }
         const sp<IBinder> binder = manager->checkService(android::String16(interface.descriptor));
         if (binder != nullptr) {
@@ -57,10 +66,11 @@ int check(const CheckOptions& options) {
         }
     }
     if (found.empty()) {
-        return fail("none of the services is running");
+        return fail("none of the services is running", tools::kExitAbsent);
     }
-    Findings findings(options.style(), printLine);
+    Findings findings(options.style(), say);
     for (const auto& [interface, binder] : found) {
+        const Calling calling(std::string("check of ") + interface->word);
         checkService(binder, *interface, options.invasive,
                      [&findings](const Finding& finding) { findings.add(finding); });
     }
@@ -72,20 +82,21 @@ int check(const CheckOptions& options) {
 
 void addCheckCommand(CLI::App& app, Action& action) {
     auto options = std::make_shared<CheckOptions>();
-    CLI::App* command =
-            app.add_subcommand("check", "Find out whether the services that run are good ones");
-    std::vector<std::string> words;
-    for (const CheckedInterface& interface : checkedInterfaces()) {
-        words.emplace_back(interface.word);
-    }
-    command->add_option("SERVICE", options->services,
-                        "companion, touch, gesture or hand (all that run)")
-            ->check(CLI::IsMember(words));
-    command->add_flag("--invasive", options->invasive,
-                      "Check operations as well that may change the service's state");
-    CLI::Option* json = command->add_flag("--json", options->json, "Print a line of JSON for each");
-    command->add_flag("--tap", options->tap, "Print in the Test Anything Protocol")->excludes(json);
-    command->callback([options, &action] { action = [options] { return check(*options); }; });
+    Command(app, action, "check", "Find out whether the services that run are good ones")
+            .operands("SERVICE", options->services,
+                      "companion, touch, gesture or hand (all that run)", 0)
+            .flag("--invasive", options->invasive,
+                  "Check operations as well that may change the service's state")
+            .flag("--tap", options->tap, "Print in the Test Anything Protocol")
+            .check([options]() -> std::string {
+                for (const std::string& service : options->services) {
+                    if (!isChecked(service)) {
+                        return fmt::format("SERVICE: there is no '{}'", service);
+                    }
+                }
+                return options->tap && settings().json ? "--tap excludes --json" : "";
+            })
+            .runs([options] { return check(*options); });
 }
 
 }  // namespace pemaro::zelkctl

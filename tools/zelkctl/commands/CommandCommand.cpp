@@ -1,48 +1,36 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
 #include <cstdlib>
 #include <memory>
 #include <string>
 
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/Json.h"
-#include "tools/zelkctl/terminal/Number.h"
+#include "tools/zelkctl/services/MapText.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
 using Text = std::unique_ptr<char, decltype(&free)>;
 
-/// A name that the text form of a map can carry, which has no way to quote a quote.
-bool checkName(const char* command, const std::string& name) {
-    if (!name.empty() && name.find_first_of("\"\\") == std::string::npos) {
-        return true;
-    }
-    failStatus(command, STATUS_INVALID_COMMAND,
-               name.empty() ? "it has no name" : "a name has no \" and no \\");
-    return false;
-}
-
 /// The library takes all that stands behind the first space for numbers.
-bool checkCommand(const std::string& text) {
+std::string commandProblem(const std::string& text) {
     const size_t space = text.find(' ');
-    return checkName("command", text.substr(0, space)) &&
-           (space == std::string::npos || checkNumbers("command", text.substr(space + 1)));
+    const std::string wrong = keyProblem(text.substr(0, space));
+    return wrong.empty() && space != std::string::npos
+                   ? tools::numberListProblem(text.substr(space + 1))
+                   : wrong;
 }
 
-int sendCommand(const std::string& text, bool json) {
-    if (!checkCommand(text)) {
-        return tools::kExitFailure;
-    }
+int sendCommand(const std::string& text) {
     return withFacade([&](ITouchCompanionFacade& facade) {
         char* received = nullptr;
-        const int status = facade.sendCommand(text.c_str(), &received);
+        const int status =
+                call("sendCommand", [&] { return facade.sendCommand(text.c_str(), &received); });
         const Text answer(received, &free);
         if (status != STATUS_NO_ERROR) {
-            return failStatus("sendCommand", status);
+            return failStatus("sendCommand", status, text);
         }
-        fmt::print("{}\n", json ? JsonObject().add("answer", answer.get()).text() : answer.get());
+        sayResult(answer.get(), JsonObject().add("answer", std::string(answer.get())));
         return tools::kExitSuccess;
     });
 }
@@ -51,12 +39,16 @@ int sendCommand(const std::string& text, bool json) {
 
 void addCommandCommand(CLI::App& app, Action& action) {
     auto text = std::make_shared<std::string>();
-    auto json = std::make_shared<bool>(false);
-    CLI::App* command = app.add_subcommand("command", "Send a debug command, and print the answer");
-    command->add_option("TEXT", *text, "The command's name and its numbers, as one argument")
-            ->required();
-    command->add_flag("--json", *json, "Print a JSON object");
-    command->callback([=, &action] { action = [=] { return sendCommand(*text, *json); }; });
+    Command(app, action, "command", "Send a debug command, and print the answer")
+            .operand("TEXT", *text, "The command's name and its numbers, as one argument")
+            .details(
+                    "The service defines the commands. One space stands before each number; a "
+                    "name contains neither \" nor \\.")
+            .check([text] {
+                const std::string problem = commandProblem(*text);
+                return problem.empty() ? "" : "TEXT: " + problem;
+            })
+            .runs([text] { return sendCommand(*text); });
 }
 
 }  // namespace pemaro::zelkctl

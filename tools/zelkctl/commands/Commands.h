@@ -1,27 +1,26 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <functional>
-#include <string>
-
-namespace CLI {
-class App;
-}
+#include "tools/zelkctl/commands/Command.h"
 
 namespace pemaro::zelkctl {
 
-/// What a command does once the command line is known to be right; returns the exit status.
-using Action = std::function<int()>;
+/// Adds all commands and their arguments to `app`, in the order in which the help lists them; each
+/// sets `action` when it is chosen. The arguments live as long as `app`.
+void addAllCommands(CLI::App& app, Action& action);
 
-// Each adds its command, or its group of commands, and their arguments to `app`, and sets `action`
-// when one is chosen. The arguments live as long as `app`.
+// Each adds its command, or its group of commands.
 
+void addHelpCommand(CLI::App& app, Action& action);
+void addStatusCommand(CLI::App& app, Action& action);
+void addInfoCommand(CLI::App& app, Action& action);
 void addPingCommand(CLI::App& app, Action& action);
 void addRecordCommand(CLI::App& app, Action& action);
 void addRecordFileCommand(CLI::App& app, Action& action);
 void addCommandCommand(CLI::App& app, Action& action);
 void addFilterCommand(CLI::App& app, Action& action);
-void addPropertySetCommand(CLI::App& app, Action& action);
+void addPropertyCommands(CLI::App& app, Action& action);
+void addAfeCommands(CLI::App& app, Action& action);
 void addEventCommand(CLI::App& app, Action& action);
 void addInspectCommand(CLI::App& app, Action& action);
 void addPacketSizeCommand(CLI::App& app, Action& action);
@@ -32,26 +31,7 @@ void addTouchCommands(CLI::App& app, Action& action);
 void addGestureCommands(CLI::App& app, Action& action);
 void addHandCommands(CLI::App& app, Action& action);
 
-// The kinds of commands of which there are several.
-
-/// A word in front of other commands, which are added to what is returned.
-CLI::App& addGroup(CLI::App& app, const char* name, const char* help);
-
-/// A command without arguments.
-void addPlainCommand(CLI::App& app, Action& action, const char* name, const char* help, Action run);
-
-/// A command that prints what it was told, in JSON with --json.
-void addQueryCommand(CLI::App& app, Action& action, const char* name, const char* help,
-                     std::function<int(bool json)> query);
-
-/// A command with one argument, which is a text.
-void addTextCommand(CLI::App& app, Action& action, const char* name, const char* help,
-                    const char* argument, const char* argumentHelp,
-                    std::function<int(const std::string& text)> run);
-
-/// A command with one argument, which is a number.
-void addNumberCommand(CLI::App& app, Action& action, const char* name, const char* help,
-                      const char* argument, const std::string& argumentHelp,
-                      std::function<int(int number)> run);
+/// What `completion` offers for the operands of a command; not listed.
+void addWordsCommand(CLI::App& app, Action& action);
 
 }  // namespace pemaro::zelkctl

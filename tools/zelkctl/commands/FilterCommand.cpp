@@ -1,22 +1,20 @@
 // SPDX-License-Identifier: Apache-2.0
+#include <memory>
+
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/Number.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
-int setFilter(const std::string& text) {
-    const auto mask = readNumber("filter", "MASK", text, kUnsigned32);
-    if (!mask) {
-        return tools::kExitFailure;
-    }
+int setFilter(unsigned int mask) {
     return withFacade([&](ITouchCompanionFacade& facade) {
-        const int status = facade.setRecordFilter(static_cast<unsigned int>(*mask));
+        const int status = call("setRecordFilter", [&] { return facade.setRecordFilter(mask); });
+        const std::string words = fmt::format("record filter {:#x}", mask);
         if (status != STATUS_NO_ERROR) {
-            return failStatus("setRecordFilter", status);
+            return failStatus("setRecordFilter", status, words);
         }
-        fmt::print("record filter {:#x}\n", *mask);
+        sayResult(words, JsonObject().add("filter", mask));
         return tools::kExitSuccess;
     });
 }
@@ -24,8 +22,13 @@ int setFilter(const std::string& text) {
 }  // namespace
 
 void addFilterCommand(CLI::App& app, Action& action) {
-    addTextCommand(app, action, "filter", "Choose what recorded frames contain", "MASK",
-                   "Bits that the service defines", setFilter);
+    auto mask = std::make_shared<unsigned int>(0);
+    Command(app, action, "filter", "Choose what recorded frames contain")
+            .number("MASK", *mask, "Bits that the service defines")
+            .details(
+                    "A service may tell the filter in force among its properties: "
+                    "zelkctl property get.")
+            .runs([mask] { return setFilter(*mask); });
 }
 
 }  // namespace pemaro::zelkctl

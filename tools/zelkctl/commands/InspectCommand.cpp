@@ -1,20 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/Json.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
-int inspect(bool json) {
-    return withFacade([json](ITouchCompanionFacade& facade) {
+int inspect() {
+    return withFacade([](ITouchCompanionFacade& facade) {
         unsigned int value = 0;
-        const int status = facade.inspect(&value);
+        const int status = call("inspect", [&] { return facade.inspect(&value); });
         if (status != STATUS_NO_ERROR) {
             return failStatus("inspect", status);
         }
-        fmt::print("{}\n",
-                   json ? JsonObject().add("value", value).text() : fmt::format("{:#010x}", value));
+        sayResult(fmt::format("{:#010x}", value), JsonObject().add("value", value));
         return tools::kExitSuccess;
     });
 }
@@ -22,7 +20,7 @@ int inspect(bool json) {
 }  // namespace
 
 void addInspectCommand(CLI::App& app, Action& action) {
-    addQueryCommand(app, action, "inspect", "Print the service's inspection word", inspect);
+    Command(app, action, "inspect", "Print the service's inspection word").runs(inspect);
 }
 
 }  // namespace pemaro::zelkctl

@@ -3,17 +3,15 @@
 
 #include <chrono>
 
-namespace CLI {
-class App;
-}
+#include "tools/zelkctl/commands/Command.h"
 
 // What the commands share that last until they are told to stop.
 namespace pemaro::zelkctl {
 
-/// How soon a signal, or the service's death, is noticed.
+/// How soon the service's death, or a request to stop, is noticed.
 constexpr std::chrono::milliseconds kWatchPeriod(50);
 
 /// The option that ends such a command by itself; `seconds` stays 0 without it.
-void addSecondsOption(CLI::App& command, double& seconds);
+void addSecondsOption(Command& command, double& seconds);
 
 }  // namespace pemaro::zelkctl

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <functional>
+#include <memory>
 #include <string>
 
 #include "tools/zelkctl/commands/Commands.h"
@@ -12,45 +13,74 @@ namespace pemaro::zelkctl {
 
 // Commands that more than one manager has.
 
-/// Watches a manager's events, after an operation that the first connection is for, if any.
+/// What a watch does besides, with the client that it has.
+template <typename Client>
+struct WatchSteps {
+    const char* beginName = nullptr;
+    int (Client::*begin)() = nullptr;
+    const char* endName = nullptr;
+    int (Client::*end)() = nullptr;
+    std::string (*silence)(Client&) = nullptr;
+};
+
+/// Watches a manager's events.
 template <typename Manager>
-int watchManager(const WatchOptions& options, int (Manager::Client::*begin)() = nullptr,
-                 const char* beginName = nullptr) {
+int watchManager(const WatchOptions& options,
+                 const WatchSteps<typename Manager::Client>& steps = {}) {
     return watch(options, [&](EventReceiver* receiver) {
         const android::sp<typename Manager::Client> client = Manager::create(receiver);
         Watched watched;
         watched.service = Manager::kService;
         watched.init = [client] { return client->init(); };
         watched.deinit = [client] { return client->deinit(); };
-        watched.beginName = beginName;
-        if (begin != nullptr) {
-            watched.begin = [client, begin] { return (client.get()->*begin)(); };
+        watched.beginName = steps.beginName;
+        watched.endName = steps.endName;
+        if (steps.begin != nullptr) {
+            watched.begin = [client, steps] { return (client.get()->*steps.begin)(); };
+        }
+        if (steps.end != nullptr) {
+            watched.end = [client, steps] { return (client.get()->*steps.end)(); };
+        }
+        if (steps.silence != nullptr) {
+            watched.silence = [client, steps] { return steps.silence(*client); };
         }
         return watched;
     });
 }
 
+/// `silence` tells why no events are to be expected, or nothing.
 template <typename Manager>
 void addManagerWatchCommand(CLI::App& manager, Action& action, const char* help,
-                            const std::function<void(CLI::App&, WatchOptions&)>& addMore) {
+                            const std::function<void(Command&, WatchOptions&)>& addMore,
+                            std::string (*silence)(typename Manager::Client&)) {
     addWatchCommand(manager, action, "watch", help, addMore,
-                    [](const WatchOptions& options) { return watchManager<Manager>(options); });
+                    [silence](const WatchOptions& options) {
+                        WatchSteps<typename Manager::Client> steps;
+                        steps.silence = silence;
+                        return watchManager<Manager>(options, steps);
+                    });
 }
 
-/// A command with one number, which it hands to an operation; "NAME" prints "WHAT n NAMEd".
+/// A command with one number, which it hands to an operation; "NAME" prints "WHAT n NAMEd". The
+/// operand is called as what it numbers is, in capitals.
 template <typename Manager>
 void addManagerNumberCommand(CLI::App& manager, Action& action, const char* name, const char* help,
-                             const char* what, const char* operationName,
+                             const char* operand, const char* what, const char* operationName,
                              int (Manager::Client::*operation)(int)) {
-    addNumberCommand(manager, action, name, help, "NUMBER",
-                     std::string("The ") + what + "'s number", [=](int number) {
-                         return operate<Manager>(
-                                 operationName,
-                                 [=](typename Manager::Client& client) {
-                                     return (client.*operation)(number);
-                                 },
-                                 fmt::format("{} {} {}d", what, number, name));
-                     });
+    auto number = std::make_shared<int>(0);
+    Command(manager, action, name, help)
+            .number(operand, *number, std::string("The ") + what + "'s number")
+            .runs([=] {
+                const std::string words = fmt::format("{} {}", what, *number);
+                return operate<Manager>(
+                        operationName,
+                        [&](typename Manager::Client& client) {
+                            return (client.*operation)(*number);
+                        },
+                        fmt::format("{} {}d", words, name),
+                        JsonObject().add(what, *number).addFlag(std::string(name) + "d", true),
+                        words);
+            });
 }
 
 /// One of the two words that a switch takes, and what it does and prints.
@@ -62,22 +92,22 @@ struct SwitchWord {
     const char* done;
 };
 
-/// A command that takes one of two words; `run` is told whether it was the first.
-void addEitherCommand(CLI::App& manager, Action& action, const char* name, const char* help,
-                      const char* first, const char* second, std::function<int(bool isFirst)> run);
-
-/// The same, with what a manager does for each.
+/// A command that takes one of two words, with what a manager does for each.
 template <typename Manager>
 void addSwitchCommand(CLI::App& manager, Action& action, const char* name, const char* help,
                       SwitchWord<typename Manager::Client> on,
                       SwitchWord<typename Manager::Client> off) {
     using Client = typename Manager::Client;
-    addEitherCommand(manager, action, name, help, on.word, off.word, [=](bool isOn) {
-        const SwitchWord<Client>& chosen = isOn ? on : off;
-        return operate<Manager>(
-                chosen.operationName, [&](Client& client) { return (client.*chosen.operation)(); },
-                chosen.done);
-    });
+    auto word = std::make_shared<std::string>();
+    Command(manager, action, name, help)
+            .choice(*word, {on.word, off.word}, "What to do with it")
+            .runs([=] {
+                const SwitchWord<Client>& chosen = *word == on.word ? on : off;
+                return operate<Manager>(
+                        chosen.operationName,
+                        [&](Client& client) { return (client.*chosen.operation)(); }, chosen.done,
+                        JsonObject().addFlag(name, *word == on.word));
+            });
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,20 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/Json.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
-int showPacketSize(bool json) {
-    return withFacade([json](ITouchCompanionFacade& facade) {
-        const int size = facade.getPacketSize();
+int showPacketSize() {
+    return withFacade([](ITouchCompanionFacade& facade) {
+        const int size = call("getPacketSize", [&] { return facade.getPacketSize(); });
         // A failure cannot be told from the size that has its number.
         if (size >= STATUS_UNKNOWN_ERROR) {
             return failStatus("getPacketSize", size);
         }
-        fmt::print("{}\n",
-                   json ? JsonObject().add("packetSize", size).text() : std::to_string(size));
+        sayResult(std::to_string(size), JsonObject().add("packetSize", size));
         return tools::kExitSuccess;
     });
 }
@@ -22,7 +20,7 @@ int showPacketSize(bool json) {
 }  // namespace
 
 void addPacketSizeCommand(CLI::App& app, Action& action) {
-    addQueryCommand(app, action, "packet-size", "Print the bytes of a frame", showPacketSize);
+    Command(app, action, "packet-size", "Print the bytes of a frame").runs(showPacketSize);
 }
 
 }  // namespace pemaro::zelkctl

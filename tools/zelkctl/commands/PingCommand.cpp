@@ -7,10 +7,10 @@ namespace {
 
 int ping() {
     return withClient([](TouchCompanionClient& client) {
-        if (client.pingService() != 1) {
-            return fail("the service does not answer a ping");
+        if (call("ping", [&] { return client.pingService(); }) != 1) {
+            return fail("the service does not answer a ping", tools::kExitAbsent);
         }
-        fmt::print("the service is alive\n");
+        sayResult("the service is alive", JsonObject().addFlag("alive", true));
         return tools::kExitSuccess;
     });
 }
@@ -18,7 +18,7 @@ int ping() {
 }  // namespace
 
 void addPingCommand(CLI::App& app, Action& action) {
-    addPlainCommand(app, action, "ping", "Ask whether the touch service is alive", ping);
+    Command(app, action, "ping", "Ask whether the touch service is alive").runs(ping);
 }
 
 }  // namespace pemaro::zelkctl

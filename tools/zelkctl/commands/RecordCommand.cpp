@@ -1,19 +1,24 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
+#include <unistd.h>
+
 #include <algorithm>
 #include <chrono>
 #include <memory>
+#include <string>
 
 #include "frames/FrameFile.h"
 #include "pemaro/ITouchCompanionFacade.h"
+#include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/commands/Lasting.h"
 #include "tools/zelkctl/services/Connection.h"
 #include "tools/zelkctl/services/FrameReceiver.h"
 #include "tools/zelkctl/services/FrameStream.h"
 #include "tools/zelkctl/terminal/LiveLine.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
-#include "tools/zelkctl/terminal/StopSignal.h"
+#include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -22,7 +27,7 @@ using Clock = std::chrono::steady_clock;
 using Seconds = std::chrono::duration<double>;
 using std::chrono::milliseconds;
 
-constexpr uint64_t kMaxFrames = 1000000000000;
+constexpr int64_t kMaxFrames = 1000000000000;
 constexpr milliseconds kRedrawPeriod(200);
 constexpr milliseconds kLinePeriod(1000);
 
@@ -32,6 +37,25 @@ struct RecordOptions {
     std::string output;
 };
 
+std::string summary(const FrameStats& stats, double seconds) {
+    const double rate = seconds > 0 ? static_cast<double>(stats.frames) / seconds : 0.0;
+    if (settings().json) {
+        return JsonObject()
+                .add("frames", static_cast<int64_t>(stats.frames))
+                .add("bytes", static_cast<int64_t>(stats.bytes))
+                .addReal("seconds", seconds)
+                .addReal("rate", rate)
+                .addFlag("sequenced", stats.sequenced)
+                .add("lost", static_cast<int64_t>(stats.lost))
+                .add("gaps", static_cast<int64_t>(stats.gaps))
+                .add("corrupt", static_cast<int64_t>(stats.corrupt))
+                .text();
+    }
+    return fmt::format("recorded {} frames, {} bytes in {:.1f} s, {:.1f} frames/s, {}, {} corrupt",
+                       stats.frames, stats.bytes, seconds, rate, describeLosses(stats),
+                       stats.corrupt);
+}
+
 /// Shows the progress of a recording now and then.
 class Progress {
   public:
@@ -39,10 +63,13 @@ class Progress {
 
     void update(const FrameStats& stats) {
         const Clock::time_point now = Clock::now();
-        if (now - mShownAt < (mLine.isTerminal() ? kRedrawPeriod : kLinePeriod)) {
+        // What is to be read by a program ends with the summary, and holds nothing else.
+        if (settings().json ||
+            now - mShownAt < (mLine.isTerminal() ? kRedrawPeriod : kLinePeriod)) {
             return;
         }
-        const double rate = (stats.frames - mShownFrames) / Seconds(now - mShownAt).count();
+        const double rate =
+                static_cast<double>(stats.frames - mShownFrames) / Seconds(now - mShownAt).count();
         mLine.show(fmt::format("{:7.1f} s  {} frames  {:.1f} frames/s  {} bytes  {}",
                                Seconds(now - mStart).count(), stats.frames, rate, stats.bytes,
                                describeLosses(stats)));
@@ -57,91 +84,136 @@ class Progress {
     uint64_t mShownFrames = 0;
 };
 
-/// Returns when the recording is to end, for whatever reason; the seconds that it took.
-double watch(const RecordOptions& options, const Connection& connection,
-             const StopSignal& stopSignal, FrameReceiver& receiver) {
-    const Clock::time_point start = Clock::now();
-    Progress progress(start);
-    while (!stopSignal.caught() && !connection.serviceDied()) {
-        milliseconds patience = kWatchPeriod;
-        if (options.seconds > 0) {
-            const Seconds left(options.seconds - Seconds(Clock::now() - start).count());
-            if (left.count() <= 0) {
+/// A recording from its first call to its last.
+class Recorder {
+  public:
+    explicit Recorder(const RecordOptions& options)
+            : mOptions(options),
+              mReceiver(options.output.empty() ? nullptr : &mFile, options.frames) {}
+
+    int run() {
+        int exitStatus = tools::kExitSuccess;
+        mConnection = Connection::open(exitStatus);
+        if (mConnection == nullptr) {
+            return exitStatus;
+        }
+        mFacade = Connection::openFacade(exitStatus, &FrameReceiver::onFrame, &mReceiver);
+        if (mFacade == nullptr || (exitStatus = prepare()) != tools::kExitSuccess) {
+            return exitStatus;
+        }
+        const LastWords lastWords([this] { speakLast(); });
+        mStart = Clock::now();
+        exitStatus = startStream(*mFacade);
+        if (exitStatus != tools::kExitSuccess) {
+            return exitStatus;
+        }
+        watch();
+        return finish();
+    }
+
+  private:
+    int prepare() {
+        const int exitStatus = preparePackets(*mFacade, mReceiver);
+        if (exitStatus != tools::kExitSuccess) {
+            return exitStatus;
+        }
+        if (mOptions.output.empty()) {
+            return tools::kExitSuccess;
+        }
+        const Waiting waiting("while waiting for a reader of " + mOptions.output);
+        if (!mFile.open(mOptions.output, mustStop)) {
+            return mustStop() ? failStopped() : fail(mFile.problem());
+        }
+        return tools::kExitSuccess;
+    }
+
+    /// Returns when the recording is to end, for whatever reason.
+    void watch() {
+        Progress progress(mStart);
+        while (!mustStop() && !mConnection->serviceDied()) {
+            milliseconds patience = kWatchPeriod;
+            if (mOptions.seconds > 0) {
+                const Seconds left(mOptions.seconds - seconds());
+                if (left.count() <= 0) {
+                    break;
+                }
+                patience = std::min(patience, std::chrono::ceil<milliseconds>(left));
+            }
+            if (mReceiver.waitUntilDone(patience)) {
                 break;
             }
-            patience = std::min(patience, std::chrono::ceil<milliseconds>(left));
+            progress.update(mReceiver.stats());
         }
-        if (receiver.waitUntilDone(patience)) {
-            break;
+    }
+
+    /// Stops the service, prints the summary, and judges how it went.
+    int finish() {
+        const double took = seconds();
+        const int status = call("stopRecord", [this] { return mFacade->stopRecord(); });
+        const FrameStats stats = mReceiver.stats();
+        say(summary(stats, took));
+        // A service that died before it sent anything leaves what the file held before.
+        const bool isWritten = mOptions.output.empty() || stats.frames > 0 ||
+                               (status == STATUS_NO_ERROR && !mConnection->serviceDied());
+        if (isWritten && !mFile.close()) {
+            return fail(
+                    fmt::format("{} (it holds {} whole frames)", mFile.problem(), stats.frames));
         }
-        progress.update(receiver.stats());
+        if (mConnection->serviceDied()) {
+            return fail(fmt::format("the service died after {} frames", stats.frames),
+                        tools::kExitAbsent);
+        }
+        if (status != STATUS_NO_ERROR) {
+            return failStatus("stopRecord", status);
+        }
+        if (stats.corrupt != 0) {
+            return fail(fmt::format("{} corrupt frames; {}", stats.corrupt, stats.firstCorrupt));
+        }
+        return tools::kExitSuccess;
     }
-    return Seconds(Clock::now() - start).count();
-}
 
-void printSummary(const FrameStats& stats, double seconds) {
-    fmt::print("recorded {} frames, {} bytes in {:.1f} s, {:.1f} frames/s, {}, {} corrupt\n",
-               stats.frames, stats.bytes, seconds, seconds > 0 ? stats.frames / seconds : 0.0,
-               describeLosses(stats), stats.corrupt);
-}
+    /// The process ends while a call, or the file, keeps the recording waiting.
+    void speakLast() {
+        mReceiver.tryStats(mLastStats);
+        const std::string words = summary(mLastStats, seconds()) + "\n";
+        if (wordsDescriptor() == STDOUT_FILENO) {
+            tools::tryWriteOutput(words);
+        } else {
+            tools::writeError(words.substr(0, words.size() - 1));
+        }
+        note(mFile.isWithinFrame() ? fmt::format("{} ends within a frame, behind {} whole ones",
+                                                 mOptions.output, mLastStats.frames)
+                                   : "the service was not told that the recording ends");
+    }
 
-/// Stops the service, prints the summary, and judges how it went.
-int finish(ITouchCompanionFacade& facade, const Connection& connection, frames::FrameFile& file,
-           const FrameReceiver& receiver, double seconds) {
-    const int status = facade.stopRecord();
-    const FrameStats stats = receiver.stats();
-    printSummary(stats, seconds);
-    if (!file.close()) {
-        return fail(fmt::format("{} (it holds {} whole frames)", file.problem(), stats.frames));
-    }
-    if (connection.serviceDied()) {
-        return fail(fmt::format("the service died after {} frames", stats.frames));
-    }
-    if (status != STATUS_NO_ERROR) {
-        return failStatus("stopRecord", status);
-    }
-    if (stats.corrupt != 0) {
-        return fail(fmt::format("{} corrupt frames; {}", stats.corrupt, stats.firstCorrupt));
-    }
-    return tools::kExitSuccess;
-}
+    double seconds() const { return Seconds(Clock::now() - mStart).count(); }
+
+    const RecordOptions mOptions;
+    std::unique_ptr<Connection> mConnection;
+    frames::FrameFile mFile;
+    FrameReceiver mReceiver;
+    std::unique_ptr<ITouchCompanionFacade> mFacade;
+    Clock::time_point mStart;
+    FrameStats mLastStats;
+};
 
 int record(const RecordOptions& options) {
-    const StopSignal stopSignal;
-    const std::unique_ptr<Connection> connection = Connection::open();
-    if (connection == nullptr) {
-        return tools::kExitFailure;
+    if (options.output == kStandardOutput) {
+        giveOutputToData();
     }
-    frames::FrameFile file;
-    FrameReceiver receiver(options.output.empty() ? nullptr : &file, options.frames);
-    const auto facade = Connection::openFacade(&FrameReceiver::onFrame, &receiver);
-    if (facade == nullptr) {
-        return tools::kExitFailure;
-    }
-    if (preparePackets(*facade, receiver) != tools::kExitSuccess) {
-        return tools::kExitFailure;
-    }
-    if (!options.output.empty() && !file.open(options.output)) {
-        return fail(file.problem());
-    }
-    if (startStream(*facade) != tools::kExitSuccess) {
-        return tools::kExitFailure;
-    }
-    const double seconds = watch(options, *connection, stopSignal, receiver);
-    return finish(*facade, *connection, file, receiver, seconds);
+    return Recorder(options).run();
 }
 
 }  // namespace
 
 void addRecordCommand(CLI::App& app, Action& action) {
     auto options = std::make_shared<RecordOptions>();
-    CLI::App* command = app.add_subcommand("record", "Record touch frames until told to stop");
-    command->add_option("-n,--frames", options->frames, "End after so many frames")
-            ->check(CLI::Range(uint64_t{1}, kMaxFrames));
-    addSecondsOption(*command, options->seconds);
-    command->add_option("-o,--output", options->output,
-                        "File to write the frames to, one after another");
-    command->callback([options, &action] { action = [options] { return record(*options); }; });
+    Command command(app, action, "record", "Record touch frames until told to stop");
+    command.number("-n,--frames", options->frames, "End after so many frames", {1, kMaxFrames});
+    addSecondsOption(command, options->seconds);
+    command.option("-o,--output", "FILE", options->output,
+                   "File to write the frames to, one after another; - is the standard output")
+            .runs([options] { return record(*options); });
 }
 
 }  // namespace pemaro::zelkctl

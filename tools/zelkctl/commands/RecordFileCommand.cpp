@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
 #include <chrono>
 #include <memory>
 #include <string>
@@ -8,7 +7,6 @@
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/commands/Lasting.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/StopSignal.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -30,24 +28,23 @@ struct Outcome {
 };
 
 Outcome start(TouchCompanionClient& client, const std::string& path) {
-    int status = client.setRecordOutput(kOutputFile);
+    int status = call("setRecordOutput", [&] { return client.setRecordOutput(kOutputFile); });
     if (status != STATUS_NO_ERROR) {
         return {"setRecordOutput", status};
     }
-    status = client.setRecordFile(path);
+    status = call("setRecordFile", [&] { return client.setRecordFile(path); });
     if (status != STATUS_NO_ERROR) {
         return {"setRecordFile", status};
     }
-    status = client.startRecord();
+    status = call("startRecord", [&] { return client.startRecord(); });
     return {status == STATUS_NO_ERROR ? nullptr : "startRecord", status};
 }
 
 /// Returns when the recording is to end, for whatever reason; the seconds that it took.
-double wait(double seconds, const Connection& connection, const StopSignal& stopSignal) {
+double wait(double seconds, const Connection& connection) {
     const Clock::time_point begin = Clock::now();
     Seconds passed(0);
-    while (!stopSignal.caught() && !connection.serviceDied() &&
-           (seconds == 0 || passed.count() < seconds)) {
+    while (!mustStop() && !connection.serviceDied() && (seconds == 0 || passed.count() < seconds)) {
         const Seconds left(seconds - passed.count());
         std::this_thread::sleep_for(seconds == 0 || left > kWatchPeriod ? Seconds(kWatchPeriod)
                                                                         : left);
@@ -57,30 +54,31 @@ double wait(double seconds, const Connection& connection, const StopSignal& stop
 }
 
 int recordFile(const RecordFileOptions& options) {
-    const StopSignal stopSignal;
-    const std::unique_ptr<Connection> connection = Connection::open();
+    int exitStatus = tools::kExitSuccess;
+    const std::unique_ptr<Connection> connection = Connection::open(exitStatus);
     if (connection == nullptr) {
-        return tools::kExitFailure;
+        return exitStatus;
     }
-    const android::sp<TouchCompanionClient> client = Connection::openClient();
+    const android::sp<TouchCompanionClient> client = Connection::openClient(exitStatus);
     if (client == nullptr) {
-        return tools::kExitFailure;
+        return exitStatus;
     }
+    const LastWords lastWords([] { note("the service was not told that the recording ends"); });
     const Outcome started = start(*client, options.path);
     if (started.operation != nullptr) {
         return failStatus(started.operation, started.status, options.path);
     }
-    fmt::print("recording to {}\n", options.path);
-    fflush(stdout);
-    const double seconds = wait(options.seconds, *connection, stopSignal);
-    const int status = client->stopRecord();
+    sayResult("recording to " + options.path, JsonObject().add("recording", options.path));
+    const double seconds = wait(options.seconds, *connection);
+    const int status = call("stopRecord", [&] { return client->stopRecord(); });
     if (connection->serviceDied()) {
-        return fail(fmt::format("the service died after {:.1f} s", seconds));
+        return fail(fmt::format("the service died after {:.1f} s", seconds), tools::kExitAbsent);
     }
     if (status != STATUS_NO_ERROR) {
         return failStatus("stopRecord", status, options.path);
     }
-    fmt::print("recorded {:.1f} s\n", seconds);
+    sayResult(fmt::format("recorded {:.1f} s", seconds),
+              JsonObject().add("recorded", options.path).addReal("seconds", seconds));
     return tools::kExitSuccess;
 }
 
@@ -88,11 +86,11 @@ int recordFile(const RecordFileOptions& options) {
 
 void addRecordFileCommand(CLI::App& app, Action& action) {
     auto options = std::make_shared<RecordFileOptions>();
-    CLI::App* command = app.add_subcommand(
-            "record-file", "Make the service record to a file of its own until told to stop");
-    command->add_option("PATH", options->path, "The file as the service sees it")->required();
-    addSecondsOption(*command, options->seconds);
-    command->callback([=, &action] { action = [=] { return recordFile(*options); }; });
+    Command command(app, action, "record-file",
+                    "Make the service record to a file of its own until told to stop");
+    command.operand("PATH", options->path, "The file as the service sees it");
+    addSecondsOption(command, options->seconds);
+    command.runs([options] { return recordFile(*options); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,16 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/commands/Watch.h"
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <chrono>
 #include <memory>
+#include <utility>
 
 #include "frames/FrameFile.h"
 #include "tools/zelkctl/commands/Lasting.h"
 #include "tools/zelkctl/services/ServiceWatch.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
-#include "tools/zelkctl/terminal/StopSignal.h"
+#include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -18,7 +20,7 @@ namespace {
 using Clock = std::chrono::steady_clock;
 using std::chrono::milliseconds;
 
-constexpr uint64_t kMaxEvents = 1000000000000;
+constexpr int64_t kMaxEvents = 1000000000000;
 
 std::string noSuch(const char* what, const std::string& text, const std::string& words) {
     return fmt::format("there is no {} '{}'; there are {}", what, text, words);
@@ -41,38 +43,57 @@ class Watcher {
         mService = ServiceWatch::await(mWatched.service, ServiceWatch::kPatience,
                                        [this] { return isOver(milliseconds(0)); });
         if (mService == nullptr) {
-            return mStopSignal.caught() ? tools::kExitSuccess : failAbsent(mWatched.service);
+            return mustStop() ? tools::kExitSuccess : failAbsent(mWatched.service);
         }
-        int status = mWatched.init();
+        const LastWords lastWords([] { note("the service was not told that the watch ends"); });
+        int status = call("init", mWatched.init);
         if (status != STATUS_NO_ERROR) {
             return failStatus("init", status);
         }
-        if (mWatched.begin && (status = mWatched.begin()) != STATUS_NO_ERROR) {
-            failStatus(mWatched.beginName, status);
-        }
+        status = begin();
         while (status == STATUS_NO_ERROR && !isOver(kWatchPeriod)) {
             if (mService->died()) {
                 status = reconnect();
             }
         }
-        mWatched.deinit();
+        if (mHasBegun && mWatched.end && !mService->died()) {
+            // It may have ended by itself, and then the service refuses, which is as well.
+            call(mWatched.endName, mWatched.end);
+        }
+        call("deinit", mWatched.deinit);
         return status == STATUS_NO_ERROR ? tools::kExitSuccess : tools::kExitFailure;
     }
 
   private:
+    int begin() {
+        if (mWatched.begin) {
+            const int status = call(mWatched.beginName, mWatched.begin);
+            mHasBegun = status == STATUS_NO_ERROR;
+            if (!mHasBegun) {
+                failStatus(mWatched.beginName, status);
+                return status;
+            }
+        }
+        const std::string silence = mWatched.silence ? mWatched.silence() : "";
+        if (!silence.empty()) {
+            note(silence);
+        }
+        return STATUS_NO_ERROR;
+    }
+
     /// Waits for so long to see whether the watch is to end.
     bool isOver(milliseconds patience) {
         const auto left = std::max(Clock::duration(0), mDeadline - Clock::now());
         if (left < patience) {
             patience = std::chrono::ceil<milliseconds>(left);
         }
-        return mReceiver.waitUntilDone(patience) || mStopSignal.caught() ||
-               Clock::now() >= mDeadline;
+        return mReceiver.waitUntilDone(patience) || mustStop() || Clock::now() >= mDeadline;
     }
 
     int reconnect() {
+        mHasBegun = false;
         mReceiver.tellOfService("died");
-        mWatched.deinit();
+        call("deinit", mWatched.deinit);
         int status = STATUS_NO_ERROR;
         do {
             mService = ServiceWatch::await(mWatched.service, std::nullopt,
@@ -80,7 +101,7 @@ class Watcher {
             if (mService == nullptr) {
                 return STATUS_NO_ERROR;
             }
-            status = mWatched.init();
+            status = call("init", mWatched.init);
         } while (status != STATUS_NO_ERROR && mService->died());
         if (status != STATUS_NO_ERROR) {
             failStatus("init", status);
@@ -90,80 +111,86 @@ class Watcher {
         return STATUS_NO_ERROR;
     }
 
-    const StopSignal mStopSignal;
     const Watched& mWatched;
     EventReceiver& mReceiver;
     const Clock::time_point mDeadline;
     std::unique_ptr<ServiceWatch> mService;
+    bool mHasBegun = false;
 };
 
 }  // namespace
 
-void addWatchOptions(CLI::App& command, WatchOptions& options) {
-    command.add_option("-n,--count", options.count, "End after so many events")
-            ->check(CLI::Range(uint64_t{1}, kMaxEvents));
+void addWatchOptions(Command& command, WatchOptions& options) {
+    command.number("-n,--count", options.count, "End after so many events", {1, kMaxEvents});
     addSecondsOption(command, options.seconds);
-    command.add_option("-o,--output", options.output,
-                       "File to write the events' records to, one after another");
-    command.add_flag("--json", options.json, "Print each event as a line of JSON");
+    command.option("-o,--output", "FILE", options.output,
+                   "File to write the events' records to, one after another; - is the standard "
+                   "output");
 }
 
-void addGestureOptions(CLI::App& command, WatchOptions& options) {
-    command.add_option_function<std::string>(
-            "--gesture",
-            [&options](const std::string& text) {
-                options.filter.gesture = gestureOf(text);
-                if (!options.filter.gesture) {
-                    throw CLI::ValidationError("--gesture",
-                                               noSuch("gesture", text, gestureWords()));
-                }
-            },
-            "Only this gesture, a number or a name like swipe-right");
-    command.add_flag("--draw", options.draw, "Draw the strokes, or with --json list their points");
+void addGestureOptions(Command& command, WatchOptions& options) {
+    command.parsed("--gesture", "GESTURE", "Only this gesture, a number or a name like swipe-right",
+                   [&options](const std::string& text) {
+                       options.filter.gesture = gestureOf(text);
+                       return options.filter.gesture ? "" : noSuch("gesture", text, gestureWords());
+                   })
+            .flag("--draw", options.draw, "Draw the strokes, or with --json list their points");
 }
 
-void addFeatureOption(CLI::App& command, WatchOptions& options) {
-    command.add_option("--feature", options.filter.feature, "Only gestures of this feature");
+void addFeatureOption(Command& command, WatchOptions& options) {
+    command.parsed("--feature", "FEATURE", "Only gestures of this feature",
+                   [&options](const std::string& text) {
+                       const auto number = tools::parseNumber(text, tools::kSigned32);
+                       if (number) {
+                           options.filter.feature = static_cast<int>(*number);
+                       }
+                       return tools::numberProblem(text, tools::kSigned32);
+                   });
 }
 
-void addHandEventOption(CLI::App& command, WatchOptions& options) {
-    command.add_option_function<std::string>(
-            "--event",
-            [&options](const std::string& text) {
-                options.filter.event = handEventOf(text);
-                if (!options.filter.event) {
-                    throw CLI::ValidationError("--event", noSuch("event", text, handEventWords()));
-                }
-            },
-            "Only this event, a number or a name like hand-detected");
+void addHandEventOption(Command& command, WatchOptions& options) {
+    command.parsed("--event", "EVENT", "Only this event, a number or a name like hand-detected",
+                   [&options](const std::string& text) {
+                       options.filter.event = handEventOf(text);
+                       return options.filter.event ? "" : noSuch("event", text, handEventWords());
+                   });
 }
 
 void addWatchCommand(CLI::App& app, Action& action, const char* name, const char* help,
-                     const std::function<void(CLI::App&, WatchOptions&)>& addMore,
+                     const std::function<void(Command&, WatchOptions&)>& addMore,
                      std::function<int(const WatchOptions&)> run) {
     auto options = std::make_shared<WatchOptions>();
-    CLI::App* command = app.add_subcommand(name, help);
-    addWatchOptions(*command, *options);
-    addMore(*command, *options);
-    command->callback([=, &action] { action = [=] { return run(*options); }; });
+    Command command(app, action, name, help);
+    addWatchOptions(command, *options);
+    addMore(command, *options);
+    command.runs([options, run = std::move(run)] { return run(*options); });
 }
 
 int watch(const WatchOptions& options, const MakeWatched& make) {
-    if (!startBinder()) {
-        return tools::kExitFailure;
+    if (options.output == kStandardOutput) {
+        giveOutputToData();
+    }
+    int result = startBinder();
+    if (result != tools::kExitSuccess) {
+        return result;
     }
     frames::FrameFile file;
-    if (!options.output.empty() && !file.open(options.output)) {
-        return fail(file.problem());
+    if (!options.output.empty()) {
+        const Waiting waiting("while waiting for a reader of " + options.output);
+        if (!file.open(options.output, mustStop)) {
+            return mustStop() ? failStopped() : fail(file.problem());
+        }
     }
     // It lives as long as the process: an event may still be on its way when we leave.
     auto* receiver = new EventReceiver(options.output.empty() ? nullptr : &file, options.count,
-                                       options.json);
+                                       settings().json);
     receiver->choose(options.filter, options.draw);
     const Watched watched = make(receiver);
-    const int result = Watcher(options, watched, *receiver).run();
+    result = Watcher(options, watched, *receiver).run();
     const uint64_t taken = receiver->close();
-    if (!file.close()) {
+    // Without an event, and without success, a file stays what it was.
+    const bool isWritten = taken > 0 || result == tools::kExitSuccess || !file.problem().empty();
+    if (isWritten && !file.close()) {
         return fail(fmt::format("{} (it holds the records of {} events)", file.problem(), taken));
     }
     return result;

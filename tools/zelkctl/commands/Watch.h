@@ -5,7 +5,7 @@
 #include <functional>
 #include <string>
 
-#include "tools/zelkctl/commands/Commands.h"
+#include "tools/zelkctl/commands/Command.h"
 #include "tools/zelkctl/services/EventReceiver.h"
 
 namespace pemaro::zelkctl {
@@ -15,24 +15,23 @@ struct WatchOptions {
     uint64_t count = 0;  ///< events; 0: any number
     double seconds = 0;  ///< 0: until told to stop
     std::string output;
-    bool json = false;
     EventFilter filter;  ///< others are neither shown, nor counted, nor kept
     bool draw = false;   ///< strokes
 
     bool isLimited() const { return count != 0 || seconds > 0; }
 };
 
-void addWatchOptions(CLI::App& command, WatchOptions& options);
+void addWatchOptions(Command& command, WatchOptions& options);
 
 // Which of the events are wanted, for managers that report such.
 
-void addGestureOptions(CLI::App& command, WatchOptions& options);
-void addFeatureOption(CLI::App& command, WatchOptions& options);
-void addHandEventOption(CLI::App& command, WatchOptions& options);
+void addGestureOptions(Command& command, WatchOptions& options);
+void addFeatureOption(Command& command, WatchOptions& options);
+void addHandEventOption(Command& command, WatchOptions& options);
 
 /// A command that watches, and has no options but these and those that `addMore` adds.
 void addWatchCommand(CLI::App& app, Action& action, const char* name, const char* help,
-                     const std::function<void(CLI::App&, WatchOptions&)>& addMore,
+                     const std::function<void(Command&, WatchOptions&)>& addMore,
                      std::function<int(const WatchOptions&)> run);
 
 /// What is watched: a manager's name, and its client.
@@ -43,13 +42,18 @@ struct Watched {
     /// Run once, when the client is connected for the first time; may be null.
     std::function<int()> begin;
     const char* beginName;
+    /// Ends what begin() began, when the watch ends before it; may be null.
+    std::function<int()> end;
+    const char* endName;
+    /// Why no events are to be expected, or the empty string; may be null.
+    std::function<std::string()> silence;
 };
 
 /// Makes the client whose events go to the receiver.
 using MakeWatched = std::function<Watched(EventReceiver*)>;
 
-/// Prints events until there are enough or SIGINT or SIGTERM comes; returns the exit status. When
-/// the service dies, the client is disconnected, waits for a new service, and connects again.
+/// Prints events until there are enough or the command is asked to stop; returns the exit status.
+/// When the service dies, the client is disconnected, waits for a new service, and connects again.
 int watch(const WatchOptions& options, const MakeWatched& make);
 
 }  // namespace pemaro::zelkctl

@@ -18,7 +18,9 @@ struct FileResult {
 /// Reads a file whole; one of more than `limit` bytes is refused.
 FileResult readConfigFile(const std::string& path, size_t limit, std::string& bytes);
 
-/// Replaces a file by one with these bytes, or, when that fails, leaves the old one as it was.
+/// Replaces a file by one with these bytes, or, when that fails, leaves the old one as it was. What
+/// a link leads to is replaced and not the link; what is no file is written to; "-" is the standard
+/// output.
 FileResult writeConfigFile(const std::string& path, const std::string& bytes);
 
 }  // namespace pemaro::zelkctl

@@ -6,27 +6,34 @@
 #include <memory>
 
 #include "pemaro/ITouchCompanionFacade.h"
+#include "pemaro/ITouchCompanionService.h"
 #include "pemaro/TouchCompanionClient.h"
 #include "tools/zelkctl/services/ServiceWatch.h"
 
 namespace pemaro::zelkctl {
 
 /// The way to the touch service: that it is there and alive, found out at once and not after the
-/// platform's own patience, and the clients that talk to it. The functions that return a pointer
-/// have told the user what is wrong when it is null.
+/// platform's own patience, and the clients that talk to it. When one of the functions that take an
+/// exit status returns null, the user has been told why, and the status is set.
 class Connection {
   public:
-    static std::unique_ptr<Connection> open();
+    static constexpr const char* kService = "pemaro.TouchService";
+
+    static std::unique_ptr<Connection> open(int& exitStatus);
 
     /// Whether the service's process ended since open().
     bool serviceDied() const { return mService->died(); }
 
+    /// The interface itself, for what the clients lack.
+    android::sp<ITouchCompanionService> service() const;
+
     /// An initialised facade from the exported factory, as a program outside the tree gets it.
     static std::unique_ptr<ITouchCompanionFacade> openFacade(
-            TouchCompanionClient::DataCallback callback = nullptr, void* context = nullptr);
+            int& exitStatus, TouchCompanionClient::DataCallback callback = nullptr,
+            void* context = nullptr);
 
     /// An initialised client, for what the facade lacks.
-    static android::sp<TouchCompanionClient> openClient();
+    static android::sp<TouchCompanionClient> openClient(int& exitStatus);
 
   private:
     explicit Connection(std::unique_ptr<ServiceWatch> service);

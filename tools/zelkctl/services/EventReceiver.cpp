@@ -3,10 +3,9 @@
 
 #include <fmt/chrono.h>
 
-#include <cstdio>
-
 #include "frames/Checksum.h"
 #include "tools/zelkctl/terminal/Json.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/TerminalTraits.h"
 
 namespace pemaro::zelkctl {
@@ -41,11 +40,6 @@ std::string plainLine(Clock::time_point when, const void* record, size_t size,
     return fmt::format("{}  {}", timeOfDay(when), words);
 }
 
-void printLine(const std::string& line) {
-    fmt::print("{}\n", line);
-    fflush(stdout);
-}
-
 }  // namespace
 
 std::string eventLine(Clock::time_point when, const void* record, size_t size, bool json) {
@@ -73,7 +67,7 @@ std::string serviceLine(Clock::time_point when, const char* what, bool json) {
 
 void EventReceiver::tellOfService(const char* what) {
     std::lock_guard<std::mutex> guard(mLock);
-    printLine(serviceLine(Clock::now(), what, mJson));
+    say(serviceLine(Clock::now(), what, mJson));
 }
 
 bool EventReceiver::waitUntilDone(std::chrono::milliseconds patience) {
@@ -100,8 +94,8 @@ void EventReceiver::take(const void* record, size_t size) {
     if (mFile != nullptr && present != 0 && !mFile->write(record, present)) {
         mDone = true;
     } else {
-        printLine(mDraw ? eventText(Clock::now(), record, present, mJson, terminalTraits().unicode)
-                        : eventLine(Clock::now(), record, present, mJson));
+        say(mDraw ? eventText(Clock::now(), record, present, mJson, terminalTraits().unicode)
+                  : eventLine(Clock::now(), record, present, mJson));
         mTaken += 1;
         mDone = mTaken == mLimit;
     }

@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <cctype>
 
-#include "tools/zelkctl/terminal/Number.h"
+#include "tools/common/Number.h"
 #include "tools/zelkctl/terminal/Printable.h"
 #include "tools/zelkctl/terminal/StrokeDrawing.h"
 
@@ -46,7 +46,7 @@ std::optional<int> numberOf(const std::string& text, const std::vector<std::stri
     if (found != words.end()) {
         return static_cast<int>(found - words.begin()) + 1;
     }
-    const auto number = parseNumber(text, {1, INT32_MAX});
+    const auto number = tools::parseNumber(text, {1, INT32_MAX});
     return number ? std::optional<int>(static_cast<int>(*number)) : std::nullopt;
 }
 

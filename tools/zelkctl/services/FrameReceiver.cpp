@@ -2,6 +2,8 @@
 #include "tools/zelkctl/services/FrameReceiver.h"
 
 #include <fmt/core.h>
+#include <sys/uio.h>
+#include <unistd.h>
 
 #include "frames/Frame.h"
 
@@ -33,19 +35,34 @@ bool FrameReceiver::waitUntilDone(std::chrono::milliseconds patience) {
     return mChanged.wait_for(guard, patience, [this] { return mDone; });
 }
 
+bool FrameReceiver::tryStats(FrameStats& stats) const {
+    const std::unique_lock<std::mutex> guard(mLock, std::try_to_lock);
+    if (guard.owns_lock()) {
+        stats = mStats;
+    }
+    return guard.owns_lock();
+}
+
+/// Frames come from one thread; a file may keep it waiting, and nobody else.
 void FrameReceiver::take(const void* frame, size_t length) {
-    std::lock_guard<std::mutex> guard(mLock);
+    std::unique_lock<std::mutex> guard(mLock);
     if (mDone) {
         return;
     }
-    const std::string fault = check(frame, length);
+    std::string fault = fetch(frame, length);
+    if (fault.empty()) {
+        fault = check();
+    }
     if (!fault.empty()) {
         if (mStats.corrupt++ == 0) {
             mStats.firstCorrupt = fault;
         }
         return;
     }
-    if (mFile != nullptr && !mFile->write(frame, length)) {
+    guard.unlock();
+    const bool isKept = mFile == nullptr || mFile->write(mFrame.data(), length);
+    guard.lock();
+    if (!isKept) {
         mDone = true;
     } else {
         mStats.frames += 1;
@@ -57,20 +74,33 @@ void FrameReceiver::take(const void* frame, size_t length) {
     }
 }
 
-/// What is wrong with a frame, or nothing. A frame of another kind has only its length to check.
-std::string FrameReceiver::check(const void* frame, size_t length) {
-    const uint64_t number = mStats.frames + mStats.corrupt;
+/// Copies a frame out of the shared memory, in which it may still change; what is wrong with it, or
+/// nothing.
+std::string FrameReceiver::fetch(const void* frame, size_t length) {
     if (length < kMinFrame || length > mPacketSize) {
-        return fmt::format("frame {} tells a length of {} bytes, with packets of {}", number,
+        return fmt::format("frame {} tells a length of {} bytes, with packets of {}", number(),
                            length, mPacketSize);
     }
+    mFrame.resize(length);
+    // The kernel stops where a plain copy would crash: the packet size is what the service says,
+    // and the memory may end before.
+    const iovec to{mFrame.data(), length};
+    const iovec from{const_cast<void*>(frame), length};
+    if (process_vm_readv(getpid(), &to, 1, &from, 1, 0) != static_cast<ssize_t>(length)) {
+        return fmt::format("frame {} of {} bytes ends outside the shared memory", number(), length);
+    }
+    return "";
+}
+
+/// A frame of another kind has only its length to check.
+std::string FrameReceiver::check() {
     frames::FrameHeader header;
-    if (!frames::readFrameHeader(frame, length, &header)) {
+    if (!frames::readFrameHeader(mFrame.data(), mFrame.size(), &header)) {
         return "";
     }
-    const char* fault = frames::frameFault(frame, length);
+    const char* fault = frames::frameFault(mFrame.data(), mFrame.size());
     if (fault != nullptr) {
-        return fmt::format("frame {}: {}", number, fault);
+        return fmt::format("frame {}: {}", number(), fault);
     }
     follow(header.sequence);
     return "";

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <mutex>
 #include <string>
+#include <vector>
 
 #include "frames/FrameFile.h"
 #include "frames/Sequence.h"
@@ -26,7 +27,9 @@ struct FrameStats {
 /// What is missing, in words.
 std::string describeLosses(const FrameStats& stats);
 
-/// Takes the frames of a recording: checks, counts and writes them.
+/// Takes the frames of a recording: checks, counts and writes them. What a frame tells of itself is
+/// the service's word: of one that tells more bytes than a packet has nothing is touched, and of
+/// one that ends outside the shared memory nothing is kept.
 class FrameReceiver {
   public:
     /// `file` may be null; `limit` frames are taken, all if 0.
@@ -39,6 +42,8 @@ class FrameReceiver {
     static void onFrame(int, void* frame, unsigned long length, void* context);
 
     FrameStats stats() const;
+    /// The same from a thread that must not wait; what was known a moment ago, at least.
+    bool tryStats(FrameStats& stats) const;
 
     /// Waits until the receiver takes no more frames, having enough of them or nowhere to write
     /// them; false when that did not happen in time.
@@ -46,7 +51,9 @@ class FrameReceiver {
 
   private:
     void take(const void* frame, size_t length);
-    std::string check(const void* frame, size_t length);
+    std::string fetch(const void* frame, size_t length);
+    std::string check();
+    uint64_t number() const { return mStats.frames + mStats.corrupt; }
     void follow(uint32_t sequence);
 
     frames::FrameFile* const mFile;
@@ -57,6 +64,7 @@ class FrameReceiver {
     std::condition_variable mChanged;
     FrameStats mStats;
     bool mDone = false;
+    std::vector<uint8_t> mFrame;
     frames::Sequence mSequence;
 };
 

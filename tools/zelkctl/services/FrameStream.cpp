@@ -4,6 +4,7 @@
 #include "frames/Frame.h"
 #include "pemaro/Status.h"
 #include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -13,7 +14,7 @@ constexpr int kOutputMemory = 1;
 }  // namespace
 
 int preparePackets(ITouchCompanionFacade& facade, FrameReceiver& receiver) {
-    const int packetSize = facade.getPacketSize();
+    const int packetSize = call("getPacketSize", [&] { return facade.getPacketSize(); });
     if (packetSize >= STATUS_UNKNOWN_ERROR) {
         return failStatus("getPacketSize", packetSize);
     }
@@ -25,14 +26,14 @@ int preparePackets(ITouchCompanionFacade& facade, FrameReceiver& receiver) {
 }
 
 int startStream(ITouchCompanionFacade& facade) {
-    int status = facade.setRecordOutput(kOutputMemory);
+    int status = call("setRecordOutput", [&] { return facade.setRecordOutput(kOutputMemory); });
     if (status != STATUS_NO_ERROR) {
         return failStatus("setRecordOutput", status);
     }
-    status = facade.startRecord();
+    status = call("startRecord", [&] { return facade.startRecord(); });
     if (status != STATUS_NO_ERROR) {
         // The recording thread may be at work already.
-        facade.stopRecord();
+        call("stopRecord", [&] { return facade.stopRecord(); });
         return failStatus("startRecord", status);
     }
     return tools::kExitSuccess;

@@ -11,8 +11,9 @@
 #include "pemaro/TouchManagerClient.h"
 #include "tools/zelkctl/services/EventReceiver.h"
 #include "tools/zelkctl/services/ServiceWatch.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
-#include "tools/zelkctl/terminal/StopSignal.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 
@@ -42,34 +43,36 @@ struct HandManager {
 /// `body` when the connection was made.
 template <typename Manager, typename Body>
 int withManager(Body body) {
-    if (!startBinder()) {
-        return tools::kExitFailure;
+    const int exitStatus = startBinder();
+    if (exitStatus != tools::kExitSuccess) {
+        return exitStatus;
     }
-    const StopSignal stopSignal;
-    const auto service = ServiceWatch::await(Manager::kService, ServiceWatch::kPatience,
-                                             [&] { return stopSignal.caught(); });
+    const auto service = ServiceWatch::await(Manager::kService, ServiceWatch::kPatience);
     if (service == nullptr) {
-        return failAbsent(Manager::kService);
+        return failMissing(Manager::kService);
     }
     const android::sp<typename Manager::Client> client = Manager::create(nullptr);
-    const int status = client->init();
+    const int status = call("init", [&] { return client->init(); });
     if (status != STATUS_NO_ERROR) {
         return failStatus("init", status);
     }
     const int result = body(*client);
+    const Calling calling("deinit");
     client->deinit();
     return result;
 }
 
-/// The same for one operation and what it prints when it succeeded.
+/// The same for one operation and what it prints when it succeeded; `about` is told with its
+/// failure.
 template <typename Manager, typename Operation>
-int operate(const char* name, Operation operation, const std::string& done) {
+int operate(const char* name, Operation operation, const std::string& done, JsonObject& object,
+            const std::string& about = "") {
     return withManager<Manager>([&](typename Manager::Client& client) {
-        const int status = operation(client);
+        const int status = call(name, [&] { return operation(client); });
         if (status != STATUS_NO_ERROR) {
-            return failStatus(name, status);
+            return failStatus(name, status, about);
         }
-        fmt::print("{}\n", done);
+        sayResult(done, object);
         return tools::kExitSuccess;
     });
 }

@@ -8,7 +8,9 @@
 #include <thread>
 
 #include "tools/common/BinderDriver.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 using android::IBinder;
 using android::sp;
@@ -37,13 +39,13 @@ std::unique_ptr<ServiceWatch> ServiceWatch::await(const char* name,
     const Clock::time_point start = Clock::now();
     bool told = false;
     std::unique_ptr<ServiceWatch> watch = find(name);
-    while (watch == nullptr && !giveUp()) {
+    while (watch == nullptr && !mustStop() && !(giveUp && giveUp())) {
         const Clock::duration waited = Clock::now() - start;
         if (patience && waited >= *patience) {
             break;
         }
         if (waited >= kQuietFor && !told) {
-            fail(fmt::format("waiting for the service {}", name));
+            note(fmt::format("waiting for the service {}", name));
             told = true;
         }
         std::this_thread::sleep_for(kLookupPeriod);
@@ -54,6 +56,7 @@ std::unique_ptr<ServiceWatch> ServiceWatch::await(const char* name,
 
 /// Null as well for one that died a moment ago, which the service manager may still know.
 std::unique_ptr<ServiceWatch> ServiceWatch::find(const char* name) {
+    const Calling calling("the service manager's checkService");
     const sp<IBinder> service =
             android::defaultServiceManager()->checkService(android::String16(name));
     const sp<DeathNotice> notice = new DeathNotice();
@@ -74,15 +77,19 @@ bool ServiceWatch::died() const {
     return mNotice->died();
 }
 
-bool startBinder() {
-    const std::string problem = tools::binderProblem();
+int failMissing(const char* name) {
+    return mustStop() ? failStopped() : failAbsent(name);
+}
+
+int startBinder() {
+    const std::string problem =
+            call("the service manager's ping", [] { return tools::binderProblem(); });
     if (!problem.empty()) {
-        fail(problem);
-        return false;
+        return fail(problem, tools::kExitAbsent);
     }
     // Events and death notices arrive on Binder threads.
     android::ProcessState::self()->startThreadPool();
-    return true;
+    return tools::kExitSuccess;
 }
 
 }  // namespace pemaro::zelkctl

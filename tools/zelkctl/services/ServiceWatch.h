@@ -18,15 +18,21 @@ class ServiceWatch {
     /// How long a command waits for a service that is not there, as the clients do.
     static constexpr std::chrono::seconds kPatience{5};
 
-    /// Waits for the service called `name`; for ever without a `patience`, and no longer once
-    /// `giveUp` returns true. What takes long is told on stderr. Null when it did not appear.
+    /// Waits for the service called `name`; for ever without a `patience`, no longer once the
+    /// command has to stop or `giveUp` returns true. What takes long is told on stderr. Null when
+    /// it did not appear.
     static std::unique_ptr<ServiceWatch> await(const char* name,
                                                std::optional<std::chrono::seconds> patience,
-                                               const std::function<bool()>& giveUp);
+                                               const std::function<bool()>& giveUp = nullptr);
+
+    /// The same at once, and in silence.
+    static std::unique_ptr<ServiceWatch> find(const char* name);
 
     ~ServiceWatch();
 
     bool died() const;
+
+    const android::sp<android::IBinder>& binder() const { return mService; }
 
   private:
     class DeathNotice;
@@ -34,14 +40,15 @@ class ServiceWatch {
     ServiceWatch(const android::sp<android::IBinder>& service,
                  const android::sp<DeathNotice>& notice);
 
-    static std::unique_ptr<ServiceWatch> find(const char* name);
-
     const android::sp<android::IBinder> mService;
     const android::sp<DeathNotice> mNotice;
 };
 
-/// False, and the user has been told why, when this process cannot use Binder.
-/// Starts its threads otherwise.
-bool startBinder();
+/// Tells that the service did not appear, or that the command was stopped before; the exit status.
+int failMissing(const char* name);
+
+/// kExitSuccess once Binder's threads run, or kExitAbsent when this process cannot use Binder; the
+/// user has been told why.
+int startBinder();
 
 }  // namespace pemaro::zelkctl

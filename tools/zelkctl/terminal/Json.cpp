@@ -4,6 +4,7 @@
 #include <fmt/core.h>
 #include <rapidjson/encodings.h>
 #include <rapidjson/memorystream.h>
+#include <rapidjson/reader.h>
 
 #include <cmath>
 
@@ -28,6 +29,16 @@ std::string asUtf8(const std::string& bytes) {
 }
 
 }  // namespace
+
+bool isJson(const std::string& text) {
+    // Read step by step: a text from elsewhere may be nested deeper than the stack.
+    constexpr unsigned kFlags =
+            rapidjson::kParseIterativeFlag | rapidjson::kParseValidateEncodingFlag;
+    rapidjson::Reader reader;
+    rapidjson::MemoryStream stream(text.data(), text.size());
+    rapidjson::BaseReaderHandler<> nobody;
+    return !reader.Parse<kFlags>(stream, nobody).IsError();
+}
 
 void JsonObject::addName(const std::string& name) {
     const std::string text = asUtf8(name);
@@ -83,6 +94,15 @@ JsonObject& JsonObject::add(const std::string& name, JsonArray& array) {
 JsonObject& JsonObject::addReal(const std::string& name, double value) {
     addName(name);
     mWriter.Double(std::round(value * 1e6) / 1e6);
+    return *this;
+}
+
+JsonObject& JsonObject::addParsed(const std::string& name, const std::string& text) {
+    if (!isJson(text)) {
+        return add(name, text);
+    }
+    addName(name);
+    mWriter.RawValue(text.data(), text.size(), rapidjson::kObjectType);
     return *this;
 }
 

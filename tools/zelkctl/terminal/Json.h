@@ -13,6 +13,9 @@ namespace pemaro::zelkctl {
 
 class JsonArray;
 
+/// Whether a text is a JSON value and nothing else.
+bool isJson(const std::string& text);
+
 /// A JSON object on one line, its members in the order in which they are added.
 ///
 ///     JsonObject().add("session", 3).text()    // {"session":3}
@@ -30,6 +33,8 @@ class JsonObject {
     JsonObject& add(const std::string& name, JsonArray& array);
     /// To the sixth decimal place. REQUIRES: it is finite.
     JsonObject& addReal(const std::string& name, double value);
+    /// A text that is JSON itself as what it is; any other as a text.
+    JsonObject& addParsed(const std::string& name, const std::string& text);
     JsonObject& addFlag(const std::string& name, bool value);
     /// Seconds since 1970, to the millisecond.
     JsonObject& addTime(const std::string& name, std::chrono::system_clock::time_point when);

@@ -1,26 +1,41 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/terminal/LiveLine.h"
 
-#include <fmt/core.h>
 #include <unistd.h>
 
-#include <cstdio>
+#include "tools/common/StandardOutput.h"
+#include "tools/zelkctl/terminal/Output.h"
 
 namespace pemaro::zelkctl {
+namespace {
 
-LiveLine::LiveLine() : mTerminal(isatty(STDOUT_FILENO) != 0) {}
+void draw(const std::string& text) {
+    if (wordsDescriptor() == STDOUT_FILENO) {
+        tools::writeOutput(text);
+    } else {
+        // Not worth a word when it fails.
+        [[maybe_unused]] const ssize_t written = write(STDERR_FILENO, text.data(), text.size());
+    }
+}
+
+}  // namespace
+
+LiveLine::LiveLine() : mTerminal(isatty(wordsDescriptor()) != 0) {}
 
 LiveLine::~LiveLine() {
+    end();
+}
+
+void LiveLine::end() {
     if (mTerminal && mShown) {
-        fmt::print("\n");
+        draw("\n");
     }
-    fflush(stdout);
+    mShown = false;
 }
 
 void LiveLine::show(const std::string& text) {
     // Back to the first column, and away with what stood there.
-    fmt::print(mTerminal ? "\r{}\x1b[K" : "{}\n", text);
-    fflush(stdout);
+    draw(mTerminal ? "\r" + text + "\x1b[K" : text + "\n");
     mShown = true;
 }
 

@@ -5,8 +5,8 @@
 
 namespace pemaro::zelkctl {
 
-/// A line on stdout that tells how far a command is: on a terminal redrawn in place, and otherwise a
-/// line of its own each time.
+/// A line among a command's words that tells how far it is: on a terminal redrawn in place, and
+/// otherwise a line of its own each time.
 class LiveLine {
   public:
     LiveLine();
@@ -15,6 +15,8 @@ class LiveLine {
 
     bool isTerminal() const { return mTerminal; }
     void show(const std::string& text);
+    /// The same as destroying it; it can be shown again.
+    void end();
 
   private:
     const bool mTerminal;

@@ -12,4 +12,12 @@ std::string printable(std::string name) {
     return name;
 }
 
+std::string joined(const std::vector<std::string>& words) {
+    std::string list;
+    for (const std::string& word : words) {
+        list += (list.empty() ? "" : ", ") + word;
+    }
+    return list;
+}
+
 }  // namespace pemaro::zelkctl

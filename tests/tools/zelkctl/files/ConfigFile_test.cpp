@@ -83,6 +83,30 @@ TEST_F(ConfigFileTest, IsReplacedByTheBytesGiven) {
     EXPECT_EQ(2u, files());
 }
 
+TEST_F(ConfigFileTest, IsReplacedWhereALinkLeadsAndKeepsWhoMayReadIt) {
+    const std::string file = write("config", "old");
+    fs::permissions(file, fs::perms::owner_read | fs::perms::owner_write);
+    fs::create_symlink(file, path("link"));
+    EXPECT_TRUE(writeConfigFile(path("link"), "new").isGood());
+    EXPECT_TRUE(fs::is_symlink(path("link")));
+    EXPECT_EQ("new", contents(file));
+    EXPECT_EQ(fs::perms::owner_read | fs::perms::owner_write, fs::status(file).permissions());
+
+    fs::create_symlink(path("nothing"), path("dangling"));
+    const FileResult result = writeConfigFile(path("dangling"), "new");
+    EXPECT_EQ(STATUS_ERROR_OPENING_FILE, result.status);
+    EXPECT_EQ(path("dangling") + " is a link to nothing", result.detail);
+}
+
+TEST_F(ConfigFileTest, IsNeverPutInADevicesPlace) {
+    EXPECT_TRUE(writeConfigFile("/dev/null", "bytes").isGood());
+    EXPECT_TRUE(fs::is_character_file("/dev/null"));
+    const FileResult full = writeConfigFile("/dev/full", "bytes");
+    EXPECT_EQ(STATUS_ERROR_WRITING_TO_FILE, full.status);
+    EXPECT_EQ("/dev/full: No space left on device", full.detail);
+    EXPECT_TRUE(fs::is_character_file("/dev/full"));
+}
+
 TEST_F(ConfigFileTest, LeavesNothingBehindWhenItCannotBeWritten) {
     const struct {
         std::string path;
@@ -90,7 +114,7 @@ TEST_F(ConfigFileTest, LeavesNothingBehindWhenItCannotBeWritten) {
         std::string detail;
     } rows[] = {
             {path("none/config"), STATUS_ERROR_OPENING_FILE, ": No such file or directory"},
-            {folder, STATUS_ERROR_WRITING_TO_FILE, ": Is a directory"},
+            {folder, STATUS_ERROR_OPENING_FILE, ": Is a directory"},
     };
     for (const auto& row : rows) {
         const FileResult result = writeConfigFile(row.path, "bytes");

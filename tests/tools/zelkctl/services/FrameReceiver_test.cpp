@@ -2,6 +2,8 @@
 #include "tools/zelkctl/services/FrameReceiver.h"
 
 #include <gtest/gtest.h>
+#include <sys/mman.h>
+#include <unistd.h>
 
 #include <chrono>
 #include <vector>
@@ -82,6 +84,22 @@ TEST_F(FrameReceiverTest, ReadsNothingOfAFrameWithAnImpossibleLength) {
     EXPECT_EQ(0u, stats.frames);
     EXPECT_EQ(4u, stats.corrupt);
     EXPECT_EQ("frame 0 tells a length of 0 bytes, with packets of 300", stats.firstCorrupt);
+}
+
+// What a service tells of its packets is its word; the memory may end before.
+TEST_F(FrameReceiverTest, KeepsNothingOfAFrameThatEndsOutsideTheMemory) {
+    const auto page = static_cast<size_t>(sysconf(_SC_PAGESIZE));
+    void* memory =
+            mmap(nullptr, 2 * page, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+    ASSERT_NE(MAP_FAILED, memory);
+    ASSERT_EQ(0, munmap(static_cast<uint8_t*>(memory) + page, page));
+    uint8_t* last = static_cast<uint8_t*>(memory) + page - 100;
+    FrameReceiver::onFrame(0, last, 100, &receiver);
+    EXPECT_EQ(0u, receiver.stats().corrupt);
+    FrameReceiver::onFrame(0, last, 101, &receiver);
+    EXPECT_EQ(1u, receiver.stats().corrupt);
+    EXPECT_EQ("frame 1 of 101 bytes ends outside the shared memory", receiver.stats().firstCorrupt);
+    munmap(memory, page);
 }
 
 TEST_F(FrameReceiverTest, SeesATornFrame) {

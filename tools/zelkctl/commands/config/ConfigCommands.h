@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <string>
+#include <vector>
 
 #include "pemaro/TouchCompanionClient.h"
 #include "tools/zelkctl/commands/Commands.h"
@@ -14,7 +15,9 @@ namespace pemaro::zelkctl {
 
 // The commands behind "config".
 
+void addConfigListCommand(CLI::App& config, Action& action);
 void addConfigGetCommand(CLI::App& config, Action& action);
+void addConfigSetCommand(CLI::App& config, Action& action);
 void addConfigDumpCommand(CLI::App& config, Action& action);
 void addConfigLoadCommand(CLI::App& config, Action& action);
 void addConfigReloadCommand(CLI::App& config, Action& action);
@@ -28,9 +31,9 @@ inline int fail(const std::string& command, const FileResult& result) {
     return failStatus(command, result.status, result.detail);
 }
 
-/// A command about a file of ours.
-void addFileCommand(CLI::App& config, Action& action, const char* name, const char* help,
-                    int (*run)(const std::string& path));
+/// Reads the values of some keys, and tells which are not there; the exit status.
+int readConfiguration(TouchCompanionClient& client, const std::vector<std::string>& keys,
+                      SerializableMap& values);
 
 /// A command about a file of the service's.
 void addServiceFileCommand(CLI::App& config, Action& action, const char* name, const char* help,

@@ -1,13 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
+#include <memory>
+
 #include "tools/zelkctl/commands/config/ConfigCommands.h"
 #include "tools/zelkctl/services/Companion.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
-int readConfiguration(ITouchCompanionFacade& facade, std::string& bytes) {
+int readBinary(ITouchCompanionFacade& facade, std::string& bytes) {
     unsigned long length = 0;
-    int status = facade.getConfigParams(nullptr, &length);
+    int status = call("getConfigParams", [&] { return facade.getConfigParams(nullptr, &length); });
     if (status == STATUS_NO_ERROR && length > kMaxConfigBytes) {
         return failStatus("config dump", STATUS_DATA_EXCEEDS_BUFFER,
                           fmt::format("the service tells {} bytes, and a transaction carries {}",
@@ -15,7 +17,8 @@ int readConfiguration(ITouchCompanionFacade& facade, std::string& bytes) {
     }
     if (status == STATUS_NO_ERROR) {
         bytes.resize(length);
-        status = facade.getConfigParams(&bytes[0], &length);
+        status =
+                call("getConfigParams", [&] { return facade.getConfigParams(&bytes[0], &length); });
     }
     if (status != STATUS_NO_ERROR) {
         return failStatus("getConfigParams", status);
@@ -25,16 +28,23 @@ int readConfiguration(ITouchCompanionFacade& facade, std::string& bytes) {
 }
 
 int dump(const std::string& path) {
+    if (path == kStandardOutput) {
+        giveOutputToData();
+    }
     return withFacade([&](ITouchCompanionFacade& facade) {
         std::string bytes;
-        if (readConfiguration(facade, bytes) != tools::kExitSuccess) {
-            return tools::kExitFailure;
+        const int result = readBinary(facade, bytes);
+        if (result != tools::kExitSuccess) {
+            return result;
         }
+        const Waiting waiting("while writing " + path);
         const FileResult written = writeConfigFile(path, bytes);
         if (!written.isGood()) {
             return fail("config dump", written);
         }
-        fmt::print("configuration of {} bytes written to {}\n", bytes.size(), path);
+        sayResult(fmt::format("configuration of {} bytes written to {}", bytes.size(),
+                              path == kStandardOutput ? "the standard output" : path),
+                  JsonObject().add("bytes", static_cast<int64_t>(bytes.size())).add("path", path));
         return tools::kExitSuccess;
     });
 }
@@ -42,7 +52,13 @@ int dump(const std::string& path) {
 }  // namespace
 
 void addConfigDumpCommand(CLI::App& config, Action& action) {
-    addFileCommand(config, action, "dump", "Write the binary configuration to a file", dump);
+    auto path = std::make_shared<std::string>();
+    Command(config, action, "dump", "Write the binary configuration to a file")
+            .operand("FILE", *path, "The file; - is the standard output")
+            .details(
+                    "A file is replaced once all of it is there; a device, a FIFO, or what a link "
+                    "leads to is written to.")
+            .runs([path] { return dump(*path); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -11,6 +11,7 @@
 
 #include "frames/FrameContent.h"
 #include "frames/RecordingFile.h"
+#include "tools/zelkctl/commands/CommonOptions.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
 #include "tools/zelkctl/files/FramePicture.h"
 #include "tools/zelkctl/files/FrameSummary.h"
@@ -163,7 +164,8 @@ void addFramesExportCommand(CLI::App& frames, Action& action) {
             ->required()
             ->check(CLI::IsMember({"png", "csv", "cells", "json"}));
     command->add_option("-o,--output", options->output,
-                        "Folder for the pictures, or file for all else (standard output)");
+                        "Folder for the pictures, or file for all else (standard output)")
+            ->type_name("FILE");
     command->add_option("--first", options->first, "First frame, counted from 0")
             ->check(CLI::Range(uint64_t{0}, kMaxNumber));
     command->add_option("--last", options->last, "Last frame")
@@ -173,6 +175,7 @@ void addFramesExportCommand(CLI::App& frames, Action& action) {
     command->add_option("--scale", options->scale, "Pixels of a cell of a picture")
             ->check(CLI::Range(1u, kMaxScale))
             ->capture_default_str();
+    addCommonOptions(*command);
     command->callback([options, &action] {
         check(*options);
         action = [options] { return exportFrames(*options); };

@@ -4,6 +4,7 @@
 #include <string>
 
 #include "frames/RecordingFile.h"
+#include "tools/zelkctl/commands/CommonOptions.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
 #include "tools/zelkctl/files/FrameReport.h"
 #include "tools/zelkctl/files/OutputFile.h"
@@ -47,9 +48,12 @@ void addFramesReportCommand(CLI::App& frames, Action& action) {
     CLI::App* command =
             frames.add_subcommand("report", "Make a page for a browser that plays a recording");
     command->add_option("FILE", options->path, "The recording")->required();
-    command->add_option("-o,--output", options->output, "File to write the page to")->required();
+    command->add_option("-o,--output", options->output, "File to write the page to")
+            ->type_name("FILE")
+            ->required();
     command->add_option("--every", options->every, "Only every so many frames")
             ->check(CLI::Range(uint64_t{1}, uint64_t{1000000}));
+    addCommonOptions(*command);
     command->callback([options, &action] { action = [options] { return makeReport(*options); }; });
 }
 

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <chrono>
 #include <deque>
@@ -16,9 +15,11 @@
 #include "tools/zelkctl/services/FrameStream.h"
 #include "tools/zelkctl/terminal/HeatMap.h"
 #include "tools/zelkctl/terminal/Json.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
 #include "tools/zelkctl/terminal/Screen.h"
-#include "tools/zelkctl/terminal/StopSignal.h"
+#include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -39,7 +40,6 @@ constexpr int kMaxFingerLines = 3;
 
 struct WatchFramesOptions {
     double seconds = 0;
-    bool json = false;
 };
 
 /// Frames a second, over the last second.
@@ -170,14 +170,14 @@ class StreamWatch {
             : mLatest(latest), mOptions(options), mStart(Clock::now()), mLastFrame(mStart) {}
 
     void run(const Connection& connection) {
-        const bool draws = !mOptions.json && terminalTraits().isTerminal;
+        const bool draws = !settings().json && terminalTraits().isTerminal;
         std::optional<Screen> screen;
         if (draws) {
             screen.emplace();
         }
         const milliseconds period = draws ? kDrawPeriod : kLinePeriod;
         Clock::time_point due = mStart + period;
-        while (!mStopSignal.caught() && !connection.serviceDied() && !isOver()) {
+        while (!mustStop() && !connection.serviceDied() && !isOver()) {
             std::this_thread::sleep_for(std::min<Clock::duration>(kDrawPeriod, kWatchPeriod));
             update();
             if (Clock::now() < due) {
@@ -211,11 +211,10 @@ class StreamWatch {
     }
 
     bool printLine() const {
-        fmt::print("{}\n", mOptions.json ? lineJson(mView) : lineText(mView));
-        return fflush(stdout) == 0;
+        say(settings().json ? lineJson(mView) : lineText(mView));
+        return !mustStop();
     }
 
-    const StopSignal mStopSignal;
     LatestFrame& mLatest;
     const WatchFramesOptions& mOptions;
     const Clock::time_point mStart;
@@ -225,28 +224,37 @@ class StreamWatch {
 };
 
 int watchFrames(const WatchFramesOptions& options) {
-    const std::unique_ptr<Connection> connection = Connection::open();
+    int exitStatus = tools::kExitSuccess;
+    const std::unique_ptr<Connection> connection = Connection::open(exitStatus);
     if (connection == nullptr) {
-        return tools::kExitFailure;
+        return exitStatus;
     }
     LatestFrame latest;
-    const auto facade = Connection::openFacade(&LatestFrame::onFrame, &latest);
-    if (facade == nullptr || preparePackets(*facade, latest.receiver()) != tools::kExitSuccess ||
-        startStream(*facade) != tools::kExitSuccess) {
-        return tools::kExitFailure;
+    const auto facade = Connection::openFacade(exitStatus, &LatestFrame::onFrame, &latest);
+    if (facade == nullptr) {
+        return exitStatus;
     }
+    exitStatus = preparePackets(*facade, latest.receiver());
+    if (exitStatus == tools::kExitSuccess) {
+        exitStatus = startStream(*facade);
+    }
+    if (exitStatus != tools::kExitSuccess) {
+        return exitStatus;
+    }
+    const LastWords lastWords([] { note("the service was not told that the recording ends"); });
     StreamWatch(latest, options).run(*connection);
-    const int status = facade->stopRecord();
+    const int status = call("stopRecord", [&] { return facade->stopRecord(); });
     const FrameStats stats = latest.receiver().stats();
     if (connection->serviceDied()) {
-        return fail(fmt::format("the service died after {} frames", stats.frames));
+        return fail(fmt::format("the service died after {} frames", stats.frames),
+                    tools::kExitAbsent);
     }
     if (status != STATUS_NO_ERROR) {
         return failStatus("stopRecord", status);
     }
-    if (!options.json) {
-        fmt::print("watched {} frames, {}, {} corrupt\n", stats.frames, describeLosses(stats),
-                   stats.corrupt);
+    if (!settings().json) {
+        say(fmt::format("watched {} frames, {}, {} corrupt", stats.frames, describeLosses(stats),
+                        stats.corrupt));
     }
     return tools::kExitSuccess;
 }
@@ -255,11 +263,11 @@ int watchFrames(const WatchFramesOptions& options) {
 
 void addFramesWatchCommand(CLI::App& frames, Action& action) {
     auto options = std::make_shared<WatchFramesOptions>();
-    CLI::App* command = frames.add_subcommand(
-            "watch", "Show the frames as they come, as a heat map in the terminal");
-    addSecondsOption(*command, options->seconds);
-    command->add_flag("--json", options->json, "Print a line of JSON each second instead");
-    command->callback([options, &action] { action = [options] { return watchFrames(*options); }; });
+    Command command(frames, action, "watch",
+                    "Show the frames as they come, as a heat map in the terminal");
+    addSecondsOption(command, options->seconds);
+    command.details("With --json, or where there is no terminal, a line is printed each second.")
+            .runs([options] { return watchFrames(*options); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
 #include <memory>
 #include <string>
 #include <vector>
@@ -8,6 +7,7 @@
 #include "tools/zelkctl/files/GestureFile.h"
 #include "tools/zelkctl/services/Managers.h"
 #include "tools/zelkctl/services/Transaction.h"
+#include "tools/zelkctl/terminal/Printable.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -22,6 +22,7 @@ constexpr size_t kMaxRecords = 256;
 int addGesture(const Files& files) {
     std::vector<Gesture> records;
     for (const std::string& file : files) {
+        const Waiting waiting("while reading " + file);
         const std::string problem = readGestures(file, kMaxRecords, records);
         if (!problem.empty()) {
             return fail(problem);
@@ -29,19 +30,22 @@ int addGesture(const Files& files) {
     }
     return withManager<GestureManager>([&](Client& client) {
         int number = 0;
-        const int status =
-                client.addGesture(static_cast<int>(records.size()), records.data(), number);
+        const int status = call("addGesture", [&] {
+            return client.addGesture(static_cast<int>(records.size()), records.data(), number);
+        });
         const size_t bytes = records.size() * sizeof(Gesture);
         if (status == STATUS_UNKNOWN_ERROR && bytes > kTransactionBytes) {
-            return fail(fmt::format(
-                    "addGesture: {} ({} records are {} bytes, and a transaction "
-                    "carries {} records at most; nothing was added)",
-                    errStr(status), records.size(), bytes, kTransactionBytes / sizeof(Gesture)));
+            return failStatus(
+                    "addGesture", status,
+                    fmt::format("{} records are {} bytes, and a transaction carries {} "
+                                "records at most; nothing was added",
+                                records.size(), bytes, kTransactionBytes / sizeof(Gesture)));
         }
         if (status != STATUS_NO_ERROR) {
-            return failStatus("addGesture", status);
+            return failStatus("addGesture", status, joined(files));
         }
-        fmt::print("gesture {} added\n", number);
+        sayResult(fmt::format("gesture {} added", number),
+                  JsonObject().add("gesture", number).addFlag("added", true));
         return tools::kExitSuccess;
     });
 }
@@ -50,12 +54,9 @@ int addGesture(const Files& files) {
 
 void addGestureAddCommand(CLI::App& gesture, Action& action) {
     auto files = std::make_shared<Files>();
-    CLI::App* command =
-            gesture.add_subcommand("add",
-                                   "Define a gesture by one or more samples, and tell its "
-                                   "number");
-    command->add_option("FILE", *files, "Files of samples, records of 72,144 bytes")->required();
-    command->callback([files, &action] { action = [files] { return addGesture(*files); }; });
+    Command(gesture, action, "add", "Define a gesture by one or more samples, and tell its number")
+            .operands("FILE", *files, "Files of samples, records of 72,144 bytes")
+            .runs([files] { return addGesture(*files); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -12,6 +12,7 @@ void addGestureCommands(CLI::App& app, Action& action) {
     addGestureEnableCommand(gesture, action);
     addGestureDisableCommand(gesture, action);
     addGestureVerifyCommand(gesture, action);
+    addGestureListCommand(gesture, action);
     addGestureLimitsCommand(gesture, action);
     addGestureWatchCommand(gesture, action);
 }

@@ -14,6 +14,7 @@ void addGestureDeleteCommand(CLI::App& gesture, Action& action);
 void addGestureEnableCommand(CLI::App& gesture, Action& action);
 void addGestureDisableCommand(CLI::App& gesture, Action& action);
 void addGestureVerifyCommand(CLI::App& gesture, Action& action);
+void addGestureListCommand(CLI::App& gesture, Action& action);
 void addGestureLimitsCommand(CLI::App& gesture, Action& action);
 void addGestureWatchCommand(CLI::App& gesture, Action& action);
 

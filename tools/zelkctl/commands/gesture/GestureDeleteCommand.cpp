@@ -6,7 +6,7 @@ namespace pemaro::zelkctl {
 
 void addGestureDeleteCommand(CLI::App& gesture, Action& action) {
     addManagerNumberCommand<GestureManager>(gesture, action, "delete", "Forget a defined gesture",
-                                            "gesture", "deleteGesture",
+                                            "GESTURE", "gesture", "deleteGesture",
                                             &GestureManagerClient::deleteGesture);
 }
 

@@ -6,8 +6,8 @@ namespace pemaro::zelkctl {
 
 void addGestureDisableCommand(CLI::App& gesture, Action& action) {
     addManagerNumberCommand<GestureManager>(
-            gesture, action, "disable", "Keep a gesture, but do not look for it", "gesture",
-            "disableGesture", &GestureManagerClient::disableGesture);
+            gesture, action, "disable", "Keep a gesture, but do not look for it", "GESTURE",
+            "gesture", "disableGesture", &GestureManagerClient::disableGesture);
 }
 
 }  // namespace pemaro::zelkctl

@@ -6,7 +6,7 @@ namespace pemaro::zelkctl {
 
 void addGestureEnableCommand(CLI::App& gesture, Action& action) {
     addManagerNumberCommand<GestureManager>(gesture, action, "enable", "Look for a gesture again",
-                                            "gesture", "enableGesture",
+                                            "GESTURE", "gesture", "enableGesture",
                                             &GestureManagerClient::enableGesture);
 }
 

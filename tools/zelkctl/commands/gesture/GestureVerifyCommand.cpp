@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
+#include <memory>
+
 #include "tools/zelkctl/commands/gesture/GestureCommands.h"
 #include "tools/zelkctl/files/GestureFile.h"
 #include "tools/zelkctl/services/Managers.h"
@@ -11,17 +13,21 @@ using Gesture = IGestureManagerClient::GestureData;
 
 int verifyGesture(const std::string& file) {
     std::vector<Gesture> records;
-    const std::string problem = readGestures(file, 1, records);
-    if (!problem.empty()) {
-        return fail(problem);
+    {
+        const Waiting waiting("while reading " + file);
+        const std::string problem = readGestures(file, 1, records);
+        if (!problem.empty()) {
+            return fail(problem);
+        }
     }
     return withManager<GestureManager>([&](Client& client) {
         int number = 0;
-        const int status = client.verifyGesture(records.data(), number);
+        const int status =
+                call("verifyGesture", [&] { return client.verifyGesture(records.data(), number); });
         if (status != STATUS_NO_ERROR) {
-            return failStatus("verifyGesture", status);
+            return failStatus("verifyGesture", status, file);
         }
-        fmt::print("gesture {}\n", number);
+        sayResult(fmt::format("gesture {}", number), JsonObject().add("gesture", number));
         return tools::kExitSuccess;
     });
 }
@@ -29,9 +35,12 @@ int verifyGesture(const std::string& file) {
 }  // namespace
 
 void addGestureVerifyCommand(CLI::App& gesture, Action& action) {
-    addTextCommand(gesture, action, "verify",
-                   "Compare a drawn gesture with the defined ones, and tell its number", "FILE",
-                   "File of one record of 72,144 bytes", verifyGesture);
+    auto file = std::make_shared<std::string>();
+    Command(gesture, action, "verify",
+            "Compare a drawn gesture with the defined ones, and tell the number of the one that it "
+            "is like")
+            .operand("FILE", *file, "File of one record of 72,144 bytes")
+            .runs([file] { return verifyGesture(*file); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -8,13 +8,13 @@ namespace {
 int cancel() {
     return operate<HandManager>(
             "cancelScan", [](HandBiometricManagerClient& client) { return client.cancelScan(); },
-            "cancelled");
+            "cancelled", JsonObject().addFlag("cancelled", true));
 }
 
 }  // namespace
 
 void addHandCancelCommand(CLI::App& hand, Action& action) {
-    addPlainCommand(hand, action, "cancel", "Give up what is going on", cancel);
+    Command(hand, action, "cancel", "Give up what is going on").runs(cancel);
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
 #include <memory>
 #include <string>
 
@@ -18,48 +17,60 @@ struct ActivityOptions {
 };
 
 int act(const HandActivity& activity, const ActivityOptions& options) {
-    if (options.stop) {
+    const auto operateOnce = [&](const char* name, int (Client::*operation)(), const char* state) {
         return operate<HandManager>(
-                activity.stopName, [&](Client& client) { return (client.*activity.stop)(); },
-                fmt::format("{} stopped", activity.done));
+                name, [&](Client& client) { return (client.*operation)(); },
+                fmt::format("{} {}", activity.done, state),
+                JsonObject().add(activity.done, std::string(state)));
+    };
+    if (options.stop) {
+        return operateOnce(activity.stopName, activity.stop, "stopped");
     }
     if (options.watch.isLimited()) {
-        return watchManager<HandManager>(options.watch, activity.start, activity.startName);
+        WatchSteps<Client> steps;
+        steps.beginName = activity.startName;
+        steps.begin = activity.start;
+        steps.endName = activity.endName;
+        steps.end = activity.end;
+        return watchManager<HandManager>(options.watch, steps);
     }
-    return operate<HandManager>(
-            activity.startName, [&](Client& client) { return (client.*activity.start)(); },
-            fmt::format("{} started", activity.done));
+    return operateOnce(activity.startName, activity.start, "started");
 }
 
 }  // namespace
 
 void addHandActivityCommand(CLI::App& hand, Action& action, const HandActivity& activity) {
     auto options = std::make_shared<ActivityOptions>();
-    CLI::App* command = hand.add_subcommand(
-            activity.name,
-            std::string(activity.help) + "; with --count or --seconds, watch the events");
-    addWatchOptions(*command, options->watch);
-    addHandEventOption(*command, options->watch);
+    Command command(hand, action, activity.name, activity.help);
+    addWatchOptions(command, options->watch);
+    addHandEventOption(command, options->watch);
     if (activity.stop != nullptr) {
-        command->add_flag("--stop", options->stop, "End it instead")
-                ->excludes("--count")
-                ->excludes("--seconds");
+        command.flag("--stop", options->stop, "End it instead")
+                .excludes("--count", "--stop")
+                .excludes("--seconds", "--stop");
     }
-    command->callback([options, activity, &action] {
-        action = [options, activity] { return act(activity, *options); };
-    });
+    command.details(
+                   "With --count or --seconds the events are watched, and what still goes on then "
+                   "is ended.")
+            .check([options] {
+                return options->watch.output.empty() || options->watch.isLimited()
+                               ? ""
+                               : "--output needs --count or --seconds";
+            })
+            .runs([options, activity] { return act(activity, *options); });
 }
 
 void addHandProfileCommand(CLI::App& hand, Action& action, const char* name, const char* help,
-                           const char* operationName, int (Client::*operation)(const char*),
-                           const char* done) {
-    addTextCommand(hand, action, name, help, "NAME", "The profile's name",
-                   [=](const std::string& profile) {
-                       return operate<HandManager>(
-                               operationName,
-                               [&](Client& client) { return (client.*operation)(profile.c_str()); },
-                               fmt::format("profile {} {}", printable(profile), done));
-                   });
+                           const char* operand, const char* operationName,
+                           int (Client::*operation)(const char*), const char* done) {
+    auto profile = std::make_shared<std::string>();
+    Command(hand, action, name, help).operand(operand, *profile, "The profile's name").runs([=] {
+        return operate<HandManager>(
+                operationName,
+                [&](Client& client) { return (client.*operation)(profile->c_str()); },
+                fmt::format("profile {} {}", printable(*profile), done),
+                JsonObject().add("profile", *profile).addFlag(done, true), printable(*profile));
+    });
 }
 
 void addHandCommands(CLI::App& app, Action& action) {

@@ -20,7 +20,8 @@ void addHandDeleteCommand(CLI::App& hand, Action& action);
 void addHandWakeupCommand(CLI::App& hand, Action& action);
 void addHandWatchCommand(CLI::App& hand, Action& action);
 
-/// An activity of the service: how it is started, and how ended where it can be.
+/// An activity of the service: how it is started, how ended on request where it can be, and how
+/// when the watch of it ends before it.
 struct HandActivity {
     const char* name;
     const char* help;
@@ -29,6 +30,8 @@ struct HandActivity {
     int (HandBiometricManagerClient::*start)();
     const char* stopName;
     int (HandBiometricManagerClient::*stop)();
+    const char* endName;
+    int (HandBiometricManagerClient::*end)();
 };
 
 /// A command that starts an activity, watches what comes of it, or stops it.
@@ -36,7 +39,7 @@ void addHandActivityCommand(CLI::App& hand, Action& action, const HandActivity& 
 
 /// A command about one profile by its name.
 void addHandProfileCommand(CLI::App& hand, Action& action, const char* name, const char* help,
-                           const char* operationName,
+                           const char* operand, const char* operationName,
                            int (HandBiometricManagerClient::*operation)(const char*),
                            const char* done);
 

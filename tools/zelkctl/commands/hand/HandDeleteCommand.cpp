@@ -4,7 +4,7 @@
 namespace pemaro::zelkctl {
 
 void addHandDeleteCommand(CLI::App& hand, Action& action) {
-    addHandProfileCommand(hand, action, "delete", "Forget a profile", "deleteProfile",
+    addHandProfileCommand(hand, action, "delete", "Forget a profile", "PROFILE", "deleteProfile",
                           &HandBiometricManagerClient::deleteProfile, "deleted");
 }
 

@@ -5,10 +5,10 @@ namespace pemaro::zelkctl {
 
 void addHandEnrollCommand(CLI::App& hand, Action& action) {
     using Client = HandBiometricManagerClient;
-    addHandActivityCommand(
-            hand, action,
-            {"enroll", "Enroll a hand as a new profile", "enrollment", "startEnrollment",
-             &Client::startEnrollment, "stopEnrollment", &Client::stopEnrollment});
+    addHandActivityCommand(hand, action,
+                           {"enroll", "Enroll a hand as a new profile", "enrollment",
+                            "startEnrollment", &Client::startEnrollment, "stopEnrollment",
+                            &Client::stopEnrollment, "stopEnrollment", &Client::stopEnrollment});
 }
 
 }  // namespace pemaro::zelkctl

@@ -4,7 +4,7 @@
 namespace pemaro::zelkctl {
 
 void addHandNameCommand(CLI::App& hand, Action& action) {
-    addHandProfileCommand(hand, action, "name", "Name the profile that was enrolled last",
+    addHandProfileCommand(hand, action, "name", "Name the profile that was enrolled last", "NAME",
                           "setProfileName", &HandBiometricManagerClient::setProfileName, "named");
 }
 

@@ -4,7 +4,6 @@
 
 #include "tools/zelkctl/commands/hand/HandCommands.h"
 #include "tools/zelkctl/services/Managers.h"
-#include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Printable.h"
 
 namespace pemaro::zelkctl {
@@ -12,30 +11,27 @@ namespace {
 
 using Client = HandBiometricManagerClient;
 
-void printProfiles(const std::vector<std::string>& names, unsigned int most, bool json) {
-    if (!json) {
-        for (const std::string& name : names) {
-            fmt::print("{}\n", printable(name));
-        }
-        fmt::print("{} of {} profiles\n", names.size(), most);
-        return;
+std::string listOf(const std::vector<std::string>& names, unsigned int most) {
+    std::string lines;
+    for (const std::string& name : names) {
+        lines += printable(name) + "\n";
     }
-    fmt::print("{}\n", JsonObject().add("profiles", names).add("max", most).text());
+    return lines + fmt::format("{} of {} profiles", names.size(), most);
 }
 
-int showProfiles(bool json) {
-    return withManager<HandManager>([json](Client& client) {
+int showProfiles() {
+    return withManager<HandManager>([](Client& client) {
         unsigned int most = 0;
         std::vector<std::string> names;
-        int status = client.getMaxUser(most);
+        int status = call("getMaxUser", [&] { return client.getMaxUser(most); });
         if (status != STATUS_NO_ERROR) {
             return failStatus("getMaxUser", status);
         }
-        status = client.getProfileList(names);
+        status = call("getProfileList", [&] { return client.getProfileList(names); });
         if (status != STATUS_NO_ERROR) {
             return failStatus("getProfileList", status);
         }
-        printProfiles(names, most, json);
+        sayResult(listOf(names, most), JsonObject().add("profiles", names).add("max", most));
         return tools::kExitSuccess;
     });
 }
@@ -43,7 +39,8 @@ int showProfiles(bool json) {
 }  // namespace
 
 void addHandProfilesCommand(CLI::App& hand, Action& action) {
-    addQueryCommand(hand, action, "profiles", "List the enrolled profiles", showProfiles);
+    Command(hand, action, "profiles", "List the enrolled profiles, and how many there can be")
+            .runs(showProfiles);
 }
 
 }  // namespace pemaro::zelkctl

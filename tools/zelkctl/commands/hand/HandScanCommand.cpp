@@ -5,8 +5,9 @@ namespace pemaro::zelkctl {
 
 void addHandScanCommand(CLI::App& hand, Action& action) {
     using Client = HandBiometricManagerClient;
-    addHandActivityCommand(
-            hand, action, {"scan", "Scan a hand", "scan", "scan", &Client::scan, nullptr, nullptr});
+    addHandActivityCommand(hand, action,
+                           {"scan", "Scan a hand", "scan", "scan", &Client::scan, nullptr, nullptr,
+                            "cancelScan", &Client::cancelScan});
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
+#include <memory>
+
 #include "tools/zelkctl/commands/hand/HandCommands.h"
 #include "tools/zelkctl/services/Managers.h"
 
@@ -6,17 +8,23 @@ namespace pemaro::zelkctl {
 namespace {
 
 int setSecurity(int level) {
+    const std::string words = fmt::format("security level {}", level);
     return operate<HandManager>(
             "setSecurity",
-            [=](HandBiometricManagerClient& client) { return client.setSecurity(level); },
-            fmt::format("security level {}", level));
+            [=](HandBiometricManagerClient& client) { return client.setSecurity(level); }, words,
+            JsonObject().add("security", level), words);
 }
 
 }  // namespace
 
 void addHandSecurityCommand(CLI::App& hand, Action& action) {
-    addNumberCommand(hand, action, "security", "Set the security level", "LEVEL",
-                     "A number that the service defines", setSecurity);
+    auto level = std::make_shared<int>(0);
+    Command(hand, action, "security", "Set the security level")
+            .number("LEVEL", *level, "A number that the service defines")
+            .details(
+                    "No interface tells the level in force; the events of the simulated stack "
+                    "do.")
+            .runs([level] { return setSecurity(*level); });
 }
 
 }  // namespace pemaro::zelkctl

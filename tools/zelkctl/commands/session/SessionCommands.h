@@ -8,6 +8,7 @@ namespace pemaro::zelkctl {
 // The commands behind "session".
 
 void addSessionSaveCommand(CLI::App& session, Action& action);
+void addSessionListCommand(CLI::App& session, Action& action);
 void addSessionRestoreCommand(CLI::App& session, Action& action);
 
 }  // namespace pemaro::zelkctl

@@ -1,29 +1,27 @@
 // SPDX-License-Identifier: Apache-2.0
+#include <memory>
+
 #include "tools/zelkctl/commands/session/SessionCommands.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/Number.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
-int restore(const std::string& text) {
-    const auto session = readNumber("session restore", "ID", text, kSigned32);
-    if (!session) {
-        return tools::kExitFailure;
-    }
+int restore(int session) {
     return operateClient(
             "restoreSession",
-            [&](TouchCompanionClient& client) {
-                return client.restoreSession(static_cast<int>(*session));
-            },
-            fmt::format("session {} restored", *session), std::to_string(*session));
+            [&](TouchCompanionClient& client) { return client.restoreSession(session); },
+            fmt::format("session {} restored", session), JsonObject().add("session", session),
+            fmt::format("session {}", session));
 }
 
 }  // namespace
 
 void addSessionRestoreCommand(CLI::App& session, Action& action) {
-    addTextCommand(session, action, "restore", "Go back to the settings of a session", "ID",
-                   "The session's number", restore);
+    auto number = std::make_shared<int>(0);
+    Command(session, action, "restore", "Go back to the settings of a session")
+            .number("SESSION", *number, "The session's number")
+            .runs([number] { return restore(*number); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,20 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/commands/session/SessionCommands.h"
 #include "tools/zelkctl/services/Companion.h"
-#include "tools/zelkctl/terminal/Json.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
-int save(bool json) {
-    return withClient([json](TouchCompanionClient& client) {
+int save() {
+    return withClient([](TouchCompanionClient& client) {
         int session = 0;
-        const int status = client.saveSession(session);
+        const int status = call("saveSession", [&] { return client.saveSession(session); });
         if (status != STATUS_NO_ERROR) {
             return failStatus("saveSession", status);
         }
-        fmt::print("{}\n", json ? JsonObject().add("session", session).text()
-                                : fmt::format("session {}", session));
+        sayResult(fmt::format("session {}", session), JsonObject().add("session", session));
         return tools::kExitSuccess;
     });
 }
@@ -22,8 +20,7 @@ int save(bool json) {
 }  // namespace
 
 void addSessionSaveCommand(CLI::App& session, Action& action) {
-    addQueryCommand(session, action, "save", "Save the settings of now, and print the session",
-                    save);
+    Command(session, action, "save", "Save the settings of now, and print the session").runs(save);
 }
 
 }  // namespace pemaro::zelkctl

@@ -6,7 +6,8 @@ namespace pemaro::zelkctl {
 
 void addTouchDisableCommand(CLI::App& touch, Action& action) {
     addManagerNumberCommand<TouchManager>(touch, action, "disable", "Switch a feature off",
-                                          "feature", "disable", &TouchManagerClient::disable);
+                                          "FEATURE", "feature", "disable",
+                                          &TouchManagerClient::disable);
 }
 
 }  // namespace pemaro::zelkctl

@@ -5,8 +5,8 @@
 namespace pemaro::zelkctl {
 
 void addTouchEnableCommand(CLI::App& touch, Action& action) {
-    addManagerNumberCommand<TouchManager>(touch, action, "enable", "Switch a feature on", "feature",
-                                          "enable", &TouchManagerClient::enable);
+    addManagerNumberCommand<TouchManager>(touch, action, "enable", "Switch a feature on", "FEATURE",
+                                          "feature", "enable", &TouchManagerClient::enable);
 }
 
 }  // namespace pemaro::zelkctl

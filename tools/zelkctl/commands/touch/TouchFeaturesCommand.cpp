@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
+#include <algorithm>
 #include <memory>
 #include <vector>
 
 #include "tools/zelkctl/commands/touch/TouchCommands.h"
 #include "tools/zelkctl/services/Managers.h"
-#include "tools/zelkctl/terminal/Json.h"
+#include "tools/zelkctl/terminal/Settings.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -15,29 +15,31 @@ using Client = TouchManagerClient;
 /// The service has no list of its features: each number has to be asked for.
 constexpr int kLastFeature = 31;
 
-struct Feature {
-    int number;
-    bool enabled;
-};
-
 struct FeaturesOptions {
     int first = 0;
     int last = kLastFeature;
-    bool json = false;
 };
+
+/// Whether a feature is supported, and then whether it is enabled; a status.
+int askFor(Client& client, int number, bool& supported, bool& enabled) {
+    const int status = call("isSupported", [&] { return client.isSupported(number, supported); });
+    return status == STATUS_NO_ERROR && supported
+                   ? call("isEnabled", [&] { return client.isEnabled(number, enabled); })
+                   : status;
+}
 
 /// The supported ones of the features that were asked for.
 int collectFeatures(Client& client, const FeaturesOptions& options,
                     std::vector<Feature>& features) {
     for (int64_t number = options.first; number <= options.last; ++number) {
+        if (mustStop()) {
+            return failStopped();
+        }
         Feature feature{static_cast<int>(number), false};
         bool supported = false;
-        int status = client.isSupported(feature.number, supported);
-        if (status == STATUS_NO_ERROR && supported) {
-            status = client.isEnabled(feature.number, feature.enabled);
-        }
+        const int status = askFor(client, feature.number, supported, feature.enabled);
         if (status != STATUS_NO_ERROR) {
-            return failStatus(fmt::format("feature {}", number), status);
+            return failStatus("touch features", status, fmt::format("feature {}", number));
         }
         if (supported) {
             features.push_back(feature);
@@ -46,31 +48,19 @@ int collectFeatures(Client& client, const FeaturesOptions& options,
     return tools::kExitSuccess;
 }
 
-void printFeatures(const FeaturesOptions& options, const std::vector<Feature>& features) {
-    if (options.json) {
-        JsonArray array;
-        for (const Feature& feature : features) {
-            array.add(JsonObject()
-                              .add("feature", feature.number)
-                              .addFlag("enabled", feature.enabled));
-        }
-        fmt::print("{}\n", array.text());
-        return;
-    }
-    if (features.empty()) {
-        fmt::print("no feature from {} to {} is supported\n", options.first, options.last);
-    }
-    for (const Feature& feature : features) {
-        fmt::print("{:10}  {}\n", feature.number, feature.enabled ? "enabled" : "disabled");
-    }
-}
-
 int showFeatures(const FeaturesOptions& options) {
     return withManager<TouchManager>([&](Client& client) {
         std::vector<Feature> features;
         const int result = collectFeatures(client, options, features);
-        if (result == tools::kExitSuccess) {
-            printFeatures(options, features);
+        for (const Feature& feature : features) {
+            sayResult(fmt::format("{:10}  {}", feature.number,
+                                  feature.enabled ? "enabled" : "disabled"),
+                      JsonObject()
+                              .add("feature", feature.number)
+                              .addFlag("enabled", feature.enabled));
+        }
+        if (features.empty() && result == tools::kExitSuccess && !settings().json) {
+            say(fmt::format("no feature from {} to {} is supported", options.first, options.last));
         }
         return result;
     });
@@ -78,15 +68,44 @@ int showFeatures(const FeaturesOptions& options) {
 
 }  // namespace
 
+std::vector<Feature> supportedFeatures(Client& client) {
+    std::vector<Feature> features;
+    for (int number = 0; number <= kLastFeature && !mustStop(); ++number) {
+        bool supported = false;
+        bool enabled = false;
+        if (askFor(client, number, supported, enabled) != STATUS_NO_ERROR) {
+            return {};
+        }
+        if (supported) {
+            features.push_back({number, enabled});
+        }
+    }
+    return features;
+}
+
+std::string silenceOfTouch(Client& client) {
+    const std::vector<Feature> features = supportedFeatures(client);
+    const bool any = std::any_of(features.begin(), features.end(),
+                                 [](const Feature& feature) { return feature.enabled; });
+    return features.empty() || any
+                   ? ""
+                   : "no feature is enabled, and nothing will be reported (zelkctl touch enable "
+                     "FEATURE)";
+}
+
 void addTouchFeaturesCommand(CLI::App& touch, Action& action) {
     auto options = std::make_shared<FeaturesOptions>();
-    CLI::App* command = touch.add_subcommand("features", "List the features that are supported");
-    command->add_option("--first", options->first, "First number to ask for")
-            ->capture_default_str();
-    command->add_option("--last", options->last, "Last number to ask for")->capture_default_str();
-    command->add_flag("--json", options->json, "Print a JSON array");
-    command->callback(
-            [options, &action] { action = [options] { return showFeatures(*options); }; });
+    Command(touch, action, "features", "List the features that are supported")
+            .number("--first", options->first, "First number to ask for (0)")
+            .number("--last", options->last,
+                    fmt::format("Last number to ask for ({})", kLastFeature))
+            .check([options] {
+                return options->first > options->last
+                               ? fmt::format("--first: {} is behind --last, {}", options->first,
+                                             options->last)
+                               : "";
+            })
+            .runs([options] { return showFeatures(*options); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -5,11 +5,13 @@
 namespace pemaro::zelkctl {
 
 void addTouchWatchCommand(CLI::App& touch, Action& action) {
-    addManagerWatchCommand<TouchManager>(touch, action, "Print each gesture that is reported",
-                                         [](CLI::App& command, WatchOptions& options) {
-                                             addGestureOptions(command, options);
-                                             addFeatureOption(command, options);
-                                         });
+    addManagerWatchCommand<TouchManager>(
+            touch, action, "Print each gesture that is reported",
+            [](Command& command, WatchOptions& options) {
+                addGestureOptions(command, options);
+                addFeatureOption(command, options);
+            },
+            silenceOfTouch);
 }
 
 }  // namespace pemaro::zelkctl

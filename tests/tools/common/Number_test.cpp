@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tools/zelkctl/terminal/Number.h"
+#include "tools/common/Number.h"
 
 #include <gtest/gtest.h>
 
 #include <optional>
 
-#include "pemaro/Status.h"
-
-namespace pemaro::zelkctl {
+namespace pemaro::tools {
 
 TEST(Number, IsReadAsCWritesIt) {
     const struct {
@@ -49,12 +47,41 @@ TEST(Number, IsReadAsCWritesIt) {
 }
 
 TEST(Number, ThatIsNoneIsNamed) {
-    testing::internal::CaptureStderr();
-    EXPECT_FALSE(readNumber("filter", "MASK", "0x1g", kUnsigned32));
-    EXPECT_EQ(
-            "zelkctl: filter: Error parsing parameter (MASK: '0x1g' is no number from 0 to "
-            "4294967295)\n",
-            testing::internal::GetCapturedStderr());
+    EXPECT_EQ("", numberProblem("7", kUnsigned32));
+    EXPECT_EQ("'0x1g' is no number from 0 to 4294967295", numberProblem("0x1g", kUnsigned32));
+    EXPECT_EQ("", decimalProblem("0.5", {0, 1}));
+    EXPECT_EQ("'nan' is no number from 0.001 to 1000000", decimalProblem("nan", {0.001, 1e6}));
+}
+
+TEST(Number, WithAFractionIsOneThatIsThere) {
+    const struct {
+        const char* text;
+        std::optional<double> number;
+    } rows[] = {
+            {"0", 0.0},
+            {"0.25", 0.25},
+            {"1e2", 100.0},
+            {"-1.5", -1.5},
+            {"100", 100.0},
+            {"100.1", std::nullopt},
+            {"-2.1", std::nullopt},
+            {"nan", std::nullopt},
+            {"-nan", std::nullopt},
+            {"inf", std::nullopt},
+            {"-inf", std::nullopt},
+            {"infinity", std::nullopt},
+            {"1e999", std::nullopt},
+            {"", std::nullopt},
+            {"-", std::nullopt},
+            {" 1", std::nullopt},
+            {"+1", std::nullopt},
+            {"1 ", std::nullopt},
+            {"0x10", std::nullopt},
+            {"1.5s", std::nullopt},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ(row.number, parseDecimal(row.text, {-2, 100})) << "'" << row.text << "'";
+    }
 }
 
 TEST(Number, ListsHaveSingleSpaces) {
@@ -66,15 +93,12 @@ TEST(Number, ListsHaveSingleSpaces) {
             {"1 ", ""},     {"1  2", ""},           {"1 x 2", "x"},
     };
     for (const auto& row : rows) {
-        testing::internal::CaptureStderr();
-        EXPECT_EQ(row.refused == nullptr, checkNumbers("command", row.list)) << row.list;
-        EXPECT_EQ(row.refused == nullptr
-                          ? ""
-                          : "zelkctl: command: Error parsing parameter (number: '" +
-                                    std::string(row.refused) +
-                                    "' is no number from -2147483648 to 4294967295)\n",
-                  testing::internal::GetCapturedStderr());
+        EXPECT_EQ(row.refused == nullptr ? ""
+                                         : "'" + std::string(row.refused) +
+                                                   "' is no number from -2147483648 to 4294967295",
+                  numberListProblem(row.list))
+                << row.list;
     }
 }
 
-}  // namespace pemaro::zelkctl
+}  // namespace pemaro::tools

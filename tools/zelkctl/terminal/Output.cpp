@@ -1,0 +1,42 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/terminal/Output.h"
+
+#include <unistd.h>
+
+#include <atomic>
+
+#include "tools/common/StandardOutput.h"
+#include "tools/zelkctl/terminal/Settings.h"
+
+namespace pemaro::zelkctl {
+namespace {
+
+std::atomic<bool> gDataOnOutput{false};
+
+}  // namespace
+
+void giveOutputToData() {
+    gDataOnOutput = true;
+}
+
+int wordsDescriptor() {
+    return gDataOnOutput ? STDERR_FILENO : STDOUT_FILENO;
+}
+
+void say(const std::string& line) {
+    if (gDataOnOutput) {
+        tools::writeError(line);
+    } else {
+        tools::writeOutput(line + "\n");
+    }
+}
+
+void sayResult(const std::string& text, JsonObject& object) {
+    say(settings().json ? object.text() : text);
+}
+
+void note(const std::string& text) {
+    tools::writeError(settings().json ? JsonObject().add("note", text).text() : "zelkctl: " + text);
+}
+
+}  // namespace pemaro::zelkctl

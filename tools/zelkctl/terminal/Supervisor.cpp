@@ -1,0 +1,232 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/zelkctl/terminal/Supervisor.h"
+
+#include <android-base/unique_fd.h>
+#include <poll.h>
+#include <signal.h>
+#include <sys/eventfd.h>
+#include <sys/signalfd.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <atomic>
+#include <chrono>
+#include <mutex>
+#include <optional>
+#include <thread>
+#include <utility>
+#include <vector>
+
+#include "tools/common/StandardOutput.h"
+#include "tools/zelkctl/terminal/Report.h"
+
+namespace pemaro::zelkctl {
+namespace {
+
+using android::base::unique_fd;
+using Clock = std::chrono::steady_clock;
+using std::chrono::milliseconds;
+
+/// How long a command that was asked to stop may take.
+constexpr milliseconds kGrace(800);
+/// How often calls are looked at, when they have a time.
+constexpr milliseconds kCallPeriod(20);
+
+struct Wait {
+    std::string what;
+    bool isCall;
+    Clock::time_point since;
+};
+
+std::mutex gLock;
+std::vector<Wait> gWaits;
+std::vector<std::function<void()>> gLastWords;
+
+std::atomic<bool> gMustStop{false};
+/// The signal that asked to stop; 0 for the standard output.
+std::atomic<int> gSignal{0};
+
+int stopStatus() {
+    return gSignal == 0 ? tools::kExitFailure : tools::kExitSignal + gSignal;
+}
+
+std::string stopReason() {
+    return gSignal == 0 ? tools::outputProblem() : "interrupted";
+}
+
+/// Ends the process while the command hangs.
+[[noreturn]] void abandon(const std::string& reason, int status) {
+    // The command cannot go on in what the last words look at.
+    const std::lock_guard<std::mutex> guard(gLock);
+    for (auto words = gLastWords.rbegin(); words != gLastWords.rend(); ++words) {
+        (*words)();
+    }
+    fail(reason, status);
+    _exit(status);
+}
+
+[[noreturn]] void abandonStopped() {
+    std::string reason = stopReason();
+    {
+        const std::lock_guard<std::mutex> guard(gLock);
+        if (!gWaits.empty()) {
+            const Wait& wait = gWaits.back();
+            reason += wait.isCall ? ": " + wait.what +
+                                            " was not answered, and may have been done or not"
+                                  : " " + wait.what;
+        }
+    }
+    abandon(reason, stopStatus());
+}
+
+/// Ends the process when a call takes too long.
+void checkCalls(double timeout) {
+    std::string late;
+    {
+        const std::lock_guard<std::mutex> guard(gLock);
+        for (const Wait& wait : gWaits) {
+            if (wait.isCall &&
+                Clock::now() - wait.since >= std::chrono::duration<double>(timeout)) {
+                late = wait.what;
+            }
+        }
+    }
+    if (!late.empty()) {
+        abandon(fmt::format("{}: no answer within {:g} s", late, timeout), tools::kExitTimeout);
+    }
+}
+
+/// The signals that ask to stop, which from now on are read and not handled. The threads that are
+/// made later inherit that.
+unique_fd takeSignals() {
+    sigset_t signals;
+    sigemptyset(&signals);
+    for (const int number : {SIGINT, SIGTERM}) {
+        // A shell may have them ignored for what it runs in the background.
+        signal(number, SIG_DFL);
+        sigaddset(&signals, number);
+    }
+    sigaddset(&signals, SIGHUP);
+    pthread_sigmask(SIG_BLOCK, &signals, nullptr);
+    return unique_fd(signalfd(-1, &signals, SFD_CLOEXEC));
+}
+
+/// The watch over one command.
+class Watch {
+  public:
+    Watch(double callTimeout, int done) : mTimeout(callTimeout), mDone(done) {}
+
+    /// Returns when the command has ended.
+    void run() {
+        pollfd entries[] = {{mDone, POLLIN, 0},
+                            {mSignals.get(), POLLIN, 0},
+                            // Its reader's end is told without being asked for.
+                            {STDOUT_FILENO, 0, 0}};
+        while (true) {
+            const bool any = poll(entries, 3, patience()) > 0;
+            if (any && entries[0].revents != 0) {
+                return;
+            }
+            if (any && entries[1].revents != 0) {
+                takeSignal();
+            }
+            if (any && entries[2].revents != 0) {
+                entries[2].fd = -1;
+                tools::noteOutputClosed();
+                stop(0);
+            }
+            if (mDeadline && Clock::now() >= *mDeadline) {
+                abandonStopped();
+            }
+            if (mTimeout > 0) {
+                checkCalls(mTimeout);
+            }
+        }
+    }
+
+  private:
+    int patience() const {
+        if (mTimeout > 0) {
+            return static_cast<int>(kCallPeriod.count());
+        }
+        if (!mDeadline) {
+            return -1;
+        }
+        const auto left = std::chrono::ceil<milliseconds>(*mDeadline - Clock::now());
+        return static_cast<int>(std::max<int64_t>(left.count(), 0));
+    }
+
+    void takeSignal() {
+        signalfd_siginfo info{};
+        if (read(mSignals.get(), &info, sizeof(info)) != sizeof(info)) {
+            return;
+        }
+        const bool again = gSignal != 0;
+        stop(static_cast<int>(info.ssi_signo));
+        if (again) {
+            abandonStopped();
+        }
+    }
+
+    void stop(int signal) {
+        gSignal = signal;
+        gMustStop = true;
+        if (!mDeadline) {
+            mDeadline = Clock::now() + kGrace;
+        }
+    }
+
+    const double mTimeout;
+    const int mDone;
+    const unique_fd mSignals = takeSignals();
+    std::optional<Clock::time_point> mDeadline;
+};
+
+}  // namespace
+
+int supervise(const std::function<int()>& command, double callTimeout) {
+    const unique_fd done(eventfd(0, EFD_CLOEXEC));
+    Watch watch(callTimeout, done.get());
+    int status = 0;
+    std::thread thread([&] {
+        status = command();
+        eventfd_write(done.get(), 1);
+    });
+    watch.run();
+    thread.join();
+    const std::string problem = tools::outputProblem();
+    if (!problem.empty() && status != stopStatus()) {
+        fail(problem);
+    }
+    return problem.empty() || status != tools::kExitSuccess ? status : tools::kExitFailure;
+}
+
+bool mustStop() {
+    return gMustStop || !tools::outputProblem().empty();
+}
+
+int failStopped() {
+    return fail(stopReason(), stopStatus());
+}
+
+Waiting::Waiting(const std::string& what, bool isCall) {
+    const std::lock_guard<std::mutex> guard(gLock);
+    gWaits.push_back({what, isCall, Clock::now()});
+}
+
+Waiting::~Waiting() {
+    const std::lock_guard<std::mutex> guard(gLock);
+    gWaits.pop_back();
+}
+
+LastWords::LastWords(std::function<void()> speak) {
+    const std::lock_guard<std::mutex> guard(gLock);
+    gLastWords.push_back(std::move(speak));
+}
+
+LastWords::~LastWords() {
+    const std::lock_guard<std::mutex> guard(gLock);
+    gLastWords.pop_back();
+}
+
+}  // namespace pemaro::zelkctl
