@@ -392,7 +392,7 @@ TEST(Signals, EndACommandThatWaitsForAFile) {
     ASSERT_EQ(0, mkfifo(fifo.c_str(), 0600));
     for (const int number : {SIGINT, SIGTERM}) {
         ChildProcess load({ZELK_BIN_DIR "/zelkctl", "config", "load", fifo});
-        std::this_thread::sleep_for(std::chrono::milliseconds(300));
+        std::this_thread::sleep_for(std::chrono::milliseconds(1000));
         const auto begin = std::chrono::steady_clock::now();
         load.signal(number);
         EXPECT_EQ(128 + number, load.wait());
