@@ -12,7 +12,6 @@
 #include <atomic>
 #include <chrono>
 #include <mutex>
-#include <optional>
 #include <thread>
 #include <utility>
 #include <vector>
@@ -135,7 +134,7 @@ class Watch {
                 tools::noteOutputClosed();
                 stop(0);
             }
-            if (mDeadline && Clock::now() >= *mDeadline) {
+            if (Clock::now() >= mDeadline) {
                 abandonStopped();
             }
             if (mTimeout > 0) {
@@ -149,10 +148,10 @@ class Watch {
         if (mTimeout > 0) {
             return static_cast<int>(kCallPeriod.count());
         }
-        if (!mDeadline) {
+        if (mDeadline == kNever) {
             return -1;
         }
-        const auto left = std::chrono::ceil<milliseconds>(*mDeadline - Clock::now());
+        const auto left = std::chrono::ceil<milliseconds>(mDeadline - Clock::now());
         return static_cast<int>(std::max<int64_t>(left.count(), 0));
     }
 
@@ -171,15 +170,17 @@ class Watch {
     void stop(int signal) {
         gSignal = signal;
         gMustStop = true;
-        if (!mDeadline) {
+        if (mDeadline == kNever) {
             mDeadline = Clock::now() + kGrace;
         }
     }
 
+    static constexpr Clock::time_point kNever = Clock::time_point::max();
+
     const double mTimeout;
     const int mDone;
     const unique_fd mSignals = takeSignals();
-    std::optional<Clock::time_point> mDeadline;
+    Clock::time_point mDeadline = kNever;
 };
 
 }  // namespace
