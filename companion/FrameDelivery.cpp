@@ -24,7 +24,7 @@ void countFrame(FrameStatistics& statistics) {
     }
     statistics.frames += 1;
     const uint32_t second = static_cast<uint32_t>((now - statistics.startTime) / kNanosPerSecond);
-    if (second == statistics.lastSecond + 1) {
+    if (second != 0 && second == statistics.lastSecond + 1) {
         statistics.lastSecond = second;
         ALOGD("frameRate = %u, total = %u, sec = %u", statistics.frames / second, statistics.frames,
               second);

@@ -96,9 +96,12 @@ int RingReader::acquire(const RingFields& fields, FrameBuffer* buffer) {
 
     // In 32 bits, and a number until it is used: the other side can write anything into the block.
     const uint32_t slot = read - fields.bufferFrames * fields.readWrap;
-    buffer->data = reinterpret_cast<void*>(fields.data + slot * fields.frameSize);
+    const uint32_t offset = slot * fields.frameSize;
+    const uint32_t bytes = fields.frameSize * frames;
+    // NOLINTNEXTLINE(performance-no-int-to-ptr): nothing is gained by a pointer into the unknown
+    buffer->data = reinterpret_cast<void*>(fields.data + offset);
     buffer->frameCount = frames;
-    buffer->size = fields.frameSize * frames;
+    buffer->size = bytes;
     ALOGD("acquireBuffer: data = %p, size = %zu, frameCount = %u", buffer->data, buffer->size,
           buffer->frameCount);
     mPace = empty                                            ? Pace::Waited

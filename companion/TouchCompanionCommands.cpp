@@ -82,6 +82,8 @@ int copyResultText(const std::string& source, char** result, void* (*allocate)(s
     return STATUS_NO_ERROR;
 }
 
+// The signatures that callers are compiled against take the key by value.
+// NOLINTBEGIN(performance-unnecessary-value-param)
 int TouchCompanionClient::getResultFromResponseCmd(SerializableMap& response, int& result,
                                                    std::string key) {
     return readResults(response, result, key);
@@ -96,6 +98,7 @@ int TouchCompanionClient::getResultFromResponseCmd(SerializableMap& response,
                                                    SerializableMapArray& result, std::string key) {
     return readResults(response, result, key);
 }
+// NOLINTEND(performance-unnecessary-value-param)
 
 // The first character is part of the first token whatever it is. Each later token begins with the
 // space that ended the one before, so two spaces in a row, or one at the end, make a token without

@@ -28,8 +28,8 @@ PACKAGES_BENCH=(python3 binutils)
 PACKAGES_DOCS=(doxygen)
 # Terminals of a desk, and what makes them good to work at.
 PACKAGES_SHELL=(bash-completion dropbear-bin man-db openssh-client)
-# What formats the sources.
-PACKAGES_LINT=(clang-format)
+# What formats the sources and looks for mistakes in them.
+PACKAGES_LINT=(clang-format clang-tidy cppcheck shellcheck)
 # The machine that runs a kernel with the Binder driver.
 PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
 

@@ -70,6 +70,7 @@ void mergeAbsent(SerializableMap& to, SerializableMap& from, Absents& absents) {
     fillEntries(
             merged, ValueAccess::size(to) + absents.size(),
             [&](size_t) {
+                // NOLINTNEXTLINE(clang-analyzer-cplusplus.Move): each entry is taken once
                 return isIncoming() ? incoming.takeKey(absent->incoming) : own.takeKey(next);
             },
             [&](size_t) {

@@ -11,6 +11,7 @@ TEST_STAGES=(
     'tsan|thread|the native tests with ThreadSanitizer'
     'driver|vm|over the real Binder driver (release build; see ./dev vm)'
     'dev|vm|of ./dev itself'
+    'lint|lint|what ./dev lint looks at'
 )
 
 # The slowest that the tests over the driver may be, in seconds, on a busy machine.
@@ -109,6 +110,10 @@ stage_driver() {
     build_preset release
     ctest_arguments release driver "$1"
     "$ROOT/dev" vm --timeout "$DRIVER_TESTS_TIMEOUT" ctest "${CTEST_ARGUMENTS[@]}"
+}
+
+stage_lint() {
+    "$ROOT/dev" lint
 }
 
 run_ctest() {

@@ -1,0 +1,82 @@
+# SPDX-License-Identifier: Apache-2.0
+#: lint | look for mistakes: format, shellcheck, cppcheck, clang-tidy
+# shellcheck shell=bash
+
+usage_lint() {
+    cat <<'TEXT'
+usage: ./dev lint
+
+Looks at the sources without running them, and fails for every finding:
+  - format: C++ sources that ./dev format would change;
+  - shellcheck: all shell scripts;
+  - cppcheck: the library, frames/, simulator/, tools/ and testkit/;
+  - clang-tidy: the library, as .clang-tidy says. It is not repeated for sources that it found clean.
+What is overlooked is named with its reason: in cmake/cppcheck-suppressions, in .clang-tidy, or as NOLINT.
+TEXT
+}
+
+LINT_STEPS=(format shellcheck cppcheck clang_tidy)
+LINT_LIBRARY=(values binder companion managers)
+
+command_lint() {
+    (($# == 0)) || die_usage "lint takes no argument"
+    begin all lint -- "${LINT_STEPS[@]}"
+    run_lint
+}
+
+# All of them, so that one run tells everything.
+run_lint() {
+    local step failed=''
+    cd -- "$ROOT" || exit
+    for step in "${LINT_STEPS[@]}"; do
+        say_step "$step" "${step/_/-}"
+        "lint_$step" || failed+=" ${step/_/-}"
+    done
+    [[ -z $failed ]] || die "lint: findings (above) of$failed"
+}
+
+lint_format() {
+    cpp_sources | xargs -d '\n' clang-format --dry-run --Werror --
+}
+
+# Templates, *.in, are no scripts yet.
+shell_sources() {
+    git ls-files --cached --others --exclude-standard --deduplicate |
+        while read -r file; do
+            if [[ -f $file && $file != *.in ]] && head -n 3 -- "$file" | grep -E '^#!/bin/(ba)?sh|^# shellcheck shell=' >/dev/null; then
+                printf '%s\n' "$file"
+            fi
+        done
+}
+
+lint_shellcheck() {
+    shell_sources | xargs -d '\n' shellcheck --
+}
+
+# The macros that it would have to find in the platform's headers and in ours.
+lint_cppcheck() {
+    cppcheck --quiet --error-exitcode=1 --std=c++17 --enable=warning,performance,portability \
+        --suppressions-list=cmake/cppcheck-suppressions -I include -I . \
+        -D'DECLARE_META_INTERFACE(name)=' -D'IMPLEMENT_META_INTERFACE(name, text)=' \
+        -D'IMPLEMENT_STUB(name, rows)=' -D'IMPLEMENT_SUBSCRIPTION(name, client)=' \
+        -D'IMPLEMENT_MANAGER_CALLBACK(name, text, operation, record, texts)=' -DZELK_API= -DZELK_LOCAL= \
+        "${LINT_LIBRARY[@]}" frames simulator tools testkit
+}
+
+lint_clang_tidy() {
+    local clean
+    build_preset release zelkclient >/dev/null || return
+    clean=$ROOT/build/lint/$(
+        {
+            cat .clang-tidy build/release/compile_commands.json
+            git ls-files --cached --others --exclude-standard -- include "${LINT_LIBRARY[@]}" | xargs -d '\n' cat --
+        } | sha256sum | cut -c 1-16
+    )
+    if [[ ! -e $clean ]]; then
+        printf '%s\n' "${LINT_LIBRARY[@]/%//*.cpp}" | xargs -I '{}' bash -c 'printf "%s\n" {}' |
+            xargs -d '\n' -n 1 -P "$(nproc)" \
+                clang-tidy -p build/release --quiet --warnings-as-errors='*' 2>/dev/null || return
+        mkdir -p -- "${clean%/*}"
+        : >"$clean"
+    fi
+}
