@@ -5,30 +5,13 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <functional>
-#include <thread>
-#include <vector>
-
 #include "tests/companion/TouchCompanionClientTest.h"
+#include "tests/support/RunAtOnce.h"
 
 namespace pemaro::test {
 namespace {
 
 using android::sp;
-
-void runAtOnce(int rounds, const std::vector<std::function<void()>>& functions) {
-    std::vector<std::thread> threads;
-    for (const auto& function : functions) {
-        threads.emplace_back([rounds, &function] {
-            for (int round = 0; round < rounds; ++round) {
-                function();
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
-}
 
 TEST_F(TouchCompanionClientTest, UsesNothingThatWasLetGoWhileOthersInit) {
     const sp<TouchCompanionClient> client = new TouchCompanionClient;

@@ -5,10 +5,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <functional>
 #include <string>
-#include <thread>
-#include <vector>
 
 #include "pemaro/GestureManagerClient.h"
 #include "pemaro/HandBiometricManagerClient.h"
@@ -18,6 +15,7 @@
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"
+#include "tests/support/RunAtOnce.h"
 
 namespace pemaro::test {
 namespace {
@@ -25,21 +23,6 @@ namespace {
 using android::sp;
 
 constexpr int kRounds = 300;
-
-// Runs each function in rounds on a thread of its own.
-void runAtOnce(const std::vector<std::function<void()>>& functions) {
-    std::vector<std::thread> threads;
-    for (const auto& function : functions) {
-        threads.emplace_back([&function] {
-            for (int round = 0; round < kRounds; ++round) {
-                function();
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
-}
 
 void ignoreTouchGesture(ITouchManagerClient::GestureData*, void*) {}
 void ignoreGesture(IGestureManagerClient::GestureData*, void*) {}
@@ -94,18 +77,18 @@ class ManagerClientAtOnce : public ::testing::Test {
     // With a null context every event makes the client unsubscribe, from Binder's thread.
     void runWith(void* context) {
         const sp<typename Case::Client> client = Case::make(context);
-        runAtOnce({
-                [&] { client->init(); },
-                [&] { client->deinit(); },
-                [&] { Case::operate(*client); },
-                [&] { Case::operate(*client); },
-                [&] { Case::event(*client); },
-                [&] {
-                    Case::die(*client);
-                    clearLog();
-                    mRemote->clearTransactions();
-                },
-        });
+        runAtOnce(kRounds, {
+                                   [&] { client->init(); },
+                                   [&] { client->deinit(); },
+                                   [&] { Case::operate(*client); },
+                                   [&] { Case::operate(*client); },
+                                   [&] { Case::event(*client); },
+                                   [&] {
+                                       Case::die(*client);
+                                       clearLog();
+                                       mRemote->clearTransactions();
+                                   },
+                           });
         client->init();
         client->deinit();
         clearLog();
