@@ -14,8 +14,6 @@ namespace pemaro {
 
 namespace {
 
-constexpr int64_t kNanosPerSecond = 1000000000;
-
 // The rate is logged once a second, and only while every second is reached in turn.
 void countFrame(FrameStatistics& statistics) {
     const int64_t now = systemTime(SYSTEM_TIME_MONOTONIC);
@@ -23,7 +21,7 @@ void countFrame(FrameStatistics& statistics) {
         statistics.startTime = now;
     }
     statistics.frames += 1;
-    const uint32_t second = static_cast<uint32_t>((now - statistics.startTime) / kNanosPerSecond);
+    const uint32_t second = static_cast<uint32_t>(ns2s(now - statistics.startTime));
     if (second != 0 && second == statistics.lastSecond + 1) {
         statistics.lastSecond = second;
         ALOGD("frameRate = %u, total = %u, sec = %u", statistics.frames / second, statistics.frames,

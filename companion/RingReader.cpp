@@ -6,6 +6,7 @@
 #include <errno.h>
 #include <log/log.h>
 #include <time.h>
+#include <utils/Timers.h>
 
 #include <algorithm>
 
@@ -25,32 +26,28 @@ constexpr int kRingTimeoutMs = 1000;
 // writer may send one late, a condition that was written over may send them without end.
 constexpr int kMaxWakesWithoutNews = 8;
 
-constexpr int64_t kNanosPerSecond = 1000000000;
-constexpr int64_t kNanosPerMs = 1000000;
-constexpr int64_t kNanosPerMicro = 1000;
-
-int64_t nanosOf(const timespec& time) {
-    return time.tv_sec * kNanosPerSecond + time.tv_nsec;
+nsecs_t nanosOf(const timespec& time) {
+    return s2ns(time.tv_sec) + time.tv_nsec;
 }
 
-int64_t nowNanos() {
+nsecs_t nowNanos() {
     timespec now;
     clock_gettime(CLOCK_REALTIME, &now);
     return nanosOf(now);
 }
 
 timespec deadlineIn(int milliseconds) {
-    const int64_t nanos = nowNanos() + milliseconds * kNanosPerMs;
+    const nsecs_t nanos = nowNanos() + ms2ns(milliseconds);
     timespec deadline;
-    deadline.tv_sec = static_cast<time_t>(nanos / kNanosPerSecond);
-    deadline.tv_nsec = static_cast<long>(nanos % kNanosPerSecond);
+    deadline.tv_sec = static_cast<time_t>(ns2s(nanos));
+    deadline.tv_nsec = static_cast<long>(nanos % s2ns(1));
     return deadline;
 }
 
 void sleepUntil(const timespec& deadline) {
-    const int64_t left = std::min(nanosOf(deadline) - nowNanos(), kRingWaitMs * kNanosPerMs);
+    const nsecs_t left = std::min(nanosOf(deadline) - nowNanos(), ms2ns(kRingWaitMs));
     if (left > 0) {
-        waitHooks().sleepMicros(static_cast<useconds_t>(left / kNanosPerMicro + 1));
+        waitHooks().sleepMicros(static_cast<useconds_t>(ns2us(left) + 1));
     }
 }
 

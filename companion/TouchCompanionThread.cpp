@@ -4,28 +4,20 @@
 #include "companion/TouchCompanionThread.h"
 
 #include <log/log.h>
-#include <time.h>
+#include <utils/Timers.h>
 
 namespace pemaro {
 
 namespace {
 
-constexpr nsecs_t kMillisecond = 1000000;
-
 // A wait takes 16 ms. One that takes so much longer waits for somebody who is dead.
-constexpr nsecs_t kOverdue = 1000 * kMillisecond;
+constexpr nsecs_t kOverdue = ms2ns(1000);
 
 // How often end() looks whether the thread still runs where nothing tells it.
-constexpr nsecs_t kLook = 10 * kMillisecond;
+constexpr nsecs_t kLook = ms2ns(10);
 
 // Between passes over a ring that paces nothing by itself.
-constexpr nsecs_t kPause = 16 * kMillisecond;
-
-int64_t now() {
-    timespec time;
-    clock_gettime(CLOCK_MONOTONIC, &time);
-    return time.tv_sec * int64_t{1000000000} + time.tv_nsec;
-}
+constexpr nsecs_t kPause = ms2ns(16);
 
 }  // namespace
 
@@ -47,7 +39,8 @@ void TouchCompanionThread::end() {
             return;
         }
         while (isRunning()) {
-            if (mWaitingSince != 0 && now() - mWaitingSince > kOverdue) {
+            if (mWaitingSince != 0 &&
+                systemTime(SYSTEM_TIME_MONOTONIC) - mWaitingSince > kOverdue) {
                 mLeftBehind = true;
                 ALOGE("the recording thread is left behind: a wait in the shared memory does not "
                       "end");
@@ -75,7 +68,7 @@ bool TouchCompanionThread::threadLoop() {
 
 void TouchCompanionThread::waitBegins() {
     android::AutoMutex lock(mStateLock);
-    mWaitingSince = now();
+    mWaitingSince = systemTime(SYSTEM_TIME_MONOTONIC);
 }
 
 bool TouchCompanionThread::waitEnded() {
