@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 
 // What zelkctl and the simulated stack read from users, files and frames: numbers and lists of them, orders of
-// faults, configurations, files of gestures and recorded frames.
+// faults, configurations, files of gestures, recorded frames and recordings.
 
 #include <fcntl.h>
 #include <fuzzer/FuzzedDataProvider.h>
@@ -18,11 +18,14 @@
 #include <vector>
 
 #include "frames/Frame.h"
+#include "frames/FrameGenerator.h"
+#include "frames/RecordingFile.h"
 #include "fuzz/support/ParcelInput.h"
 #include "simulator/companion/Configuration.h"
 #include "simulator/faults/Fault.h"
 #include "tools/common/Number.h"
 #include "tools/zelkctl/files/ConfigFile.h"
+#include "tools/zelkctl/files/FrameSummary.h"
 #include "tools/zelkctl/files/GestureFile.h"
 #include "tools/zelkctl/services/FrameReceiver.h"
 #include "tools/zelkctl/terminal/Json.h"
@@ -67,10 +70,12 @@ void checkJson(const std::string& name, const std::string& value) {
             .add("list", std::vector<std::string>{value, name})
             .addParsed("parsed", value)
             .add("number", 3);
+    const std::string text = object.text();
     rapidjson::Document read;
-    read.Parse(object.text().c_str());
+    read.Parse(text.c_str());
     fuzz::expect(!read.HasParseError() && read.IsObject() && read["number"].GetInt() == 3,
                  "what was written is no JSON");
+    fuzz::expect(text.find('\n') == std::string::npos, "an object on two lines");
 }
 
 void checkFault(const std::string& text) {
@@ -130,11 +135,64 @@ void checkFrame(const std::string& bytes, uint32_t packet) {
     fuzz::expect(receiver.stats().frames + receiver.stats().corrupt == 1, "a frame is missing");
 }
 
+/// Frames, some of them damaged, with anything before, between and behind them.
+std::string recording(FuzzedDataProvider& input) {
+    static auto& generator = *new frames::FrameGenerator(96, 1);
+    std::string bytes;
+    for (uint32_t left = input.ConsumeIntegralInRange<uint32_t>(0, 6); left > 0; --left) {
+        if (input.ConsumeBool()) {
+            bytes += input.ConsumeRandomLengthString(64);
+            continue;
+        }
+        const auto& frame =
+                generator.draw(input.ConsumeIntegral<uint8_t>(), input.ConsumeIntegral<uint64_t>(),
+                               frames::kFilterDefault);
+        bytes.append(frame.begin(), frame.end());
+        if (input.ConsumeBool()) {
+            const auto place = input.ConsumeIntegralInRange<size_t>(0, frame.size() - 1);
+            bytes[bytes.size() - 1 - place] = input.ConsumeIntegral<char>();
+        }
+    }
+    bytes.resize(bytes.size() - input.ConsumeIntegralInRange<size_t>(0, bytes.size()));
+    return bytes;
+}
+
+void checkRecording(const std::string& bytes) {
+    const File file(bytes);
+    std::string problem;
+    const auto read = frames::RecordingFile::open(file.path(), &problem);
+    fuzz::expect((read == nullptr) == !problem.empty(), "a refusal without a reason");
+    if (read == nullptr) {
+        return;
+    }
+    uint64_t end = 0;
+    uint64_t intact = 0;
+    for (const auto& part : read->parts()) {
+        fuzz::expect(part.offset == end && part.length > 0, "parts with a gap between them");
+        end += part.length;
+        const bool isFrame = part.kind == frames::RecordingFile::Kind::kFrame;
+        fuzz::expect(isFrame == (part.problem == nullptr), "damage without a word about it");
+        fuzz::expect(!isFrame || frames::frameFault(read->bytes(part), part.length) == nullptr,
+                     "a damaged frame taken for an intact one");
+        intact += isFrame ? 1 : 0;
+    }
+    fuzz::expect(end == bytes.size(), "parts that are not the whole file");
+    const zelkctl::FrameSummary summary = zelkctl::summarize(*read);
+    fuzz::expect(summary.frames == intact, "another number of frames");
+    fuzz::expect(zelkctl::isJson(zelkctl::summaryJson(*read, summary)),
+                 "a summary that is no JSON");
+    fuzz::expect(!zelkctl::summaryText(*read, summary).empty(), "nothing to say");
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     FuzzedDataProvider input(data, size);
-    const int reader = input.ConsumeIntegralInRange(0, 6);
+    const int reader = input.ConsumeIntegralInRange(0, 7);
+    if (reader == 7) {
+        checkRecording(recording(input));
+        return 0;
+    }
     const auto number = input.ConsumeIntegralInRange<uint32_t>(0, 4096);
     const std::string first = input.ConsumeRandomLengthString(64);
     const std::string rest = input.ConsumeRemainingBytesAsString();

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <complex>
 #include <numeric>
 #include <random>
 
@@ -15,22 +16,35 @@ constexpr double kDeviation = 40;
 
 using Plane = std::array<double, kHandColumns * kHandRows>;
 
+/// Where a wave stands in each cell of a line, as cosine and sine.
+template <size_t kCells>
+std::array<std::complex<double>, kCells> turns(double perCell, double phase) {
+    std::array<std::complex<double>, kCells> all;
+    for (size_t i = 0; i < kCells; ++i) {
+        all[i] = std::polar(1.0, static_cast<double>(i) * perCell + phase);
+    }
+    return all;
+}
+
 /// The sum of a few waves in directions of the person's own, with mean square 1 or about.
 Plane veins(uint32_t person) {
     std::minstd_rand random(2654435761u * (person + 1));
     const auto upTo = [&random](double high) {
         return std::uniform_real_distribution<double>(0, high)(random);
     };
+    const double amplitude = std::sqrt(2.0 / kWaves);
     Plane plane{};
     for (int wave = 0; wave < kWaves; ++wave) {
         const double direction = upTo(2 * M_PI);
         const double perCell = 0.15 + upTo(0.35);
         const double phase = upTo(2 * M_PI);
+        // The sine of a sum, so that one of each column and row is enough.
+        const auto columns = turns<kHandColumns>(perCell * std::cos(direction), phase);
+        const auto rows = turns<kHandRows>(perCell * std::sin(direction), 0);
         for (size_t i = 0; i < plane.size(); ++i) {
-            const double x = static_cast<double>(i % kHandColumns);
-            const double y = static_cast<double>(i / kHandColumns);
-            const double along = x * std::cos(direction) + y * std::sin(direction);
-            plane[i] += std::sin(along * perCell + phase) * std::sqrt(2.0 / kWaves);
+            const std::complex<double>& column = columns[i % kHandColumns];
+            const std::complex<double>& row = rows[i / kHandColumns];
+            plane[i] += (column.imag() * row.real() + column.real() * row.imag()) * amplitude;
         }
     }
     return plane;

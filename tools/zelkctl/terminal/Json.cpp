@@ -6,6 +6,7 @@
 #include <rapidjson/memorystream.h>
 #include <rapidjson/reader.h>
 
+#include <algorithm>
 #include <cmath>
 
 namespace pemaro::zelkctl {
@@ -31,6 +32,10 @@ std::string asUtf8(const std::string& bytes) {
 }  // namespace
 
 bool isJson(const std::string& text) {
+    // The reader takes a NUL for the text's end and would look at nothing behind it.
+    if (text.find('\0') != std::string::npos) {
+        return false;
+    }
     // Read step by step: a text from elsewhere may be nested deeper than the stack.
     constexpr unsigned kFlags =
             rapidjson::kParseIterativeFlag | rapidjson::kParseValidateEncodingFlag;
@@ -101,8 +106,12 @@ JsonObject& JsonObject::addParsed(const std::string& name, const std::string& te
     if (!isJson(text)) {
         return add(name, text);
     }
+    // An end of line stands between tokens only, where a blank is as good and keeps the object on one line.
+    std::string line = text;
+    std::replace_if(
+            line.begin(), line.end(), [](char c) { return c == '\n' || c == '\r'; }, ' ');
     addName(name);
-    mWriter.RawValue(text.data(), text.size(), rapidjson::kObjectType);
+    mWriter.RawValue(line.data(), line.size(), rapidjson::kObjectType);
     return *this;
 }
 

@@ -33,7 +33,7 @@ class JsonObject {
     JsonObject& add(const std::string& name, JsonArray& array);
     /// To the sixth decimal place. REQUIRES: it is finite.
     JsonObject& addReal(const std::string& name, double value);
-    /// A text that is JSON itself as what it is; any other as a text.
+    /// A text that is JSON itself as what it is, on one line; any other as a text.
     JsonObject& addParsed(const std::string& name, const std::string& text);
     JsonObject& addFlag(const std::string& name, bool value);
     /// Seconds since 1970, to the millisecond.

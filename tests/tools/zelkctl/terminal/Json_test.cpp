@@ -44,6 +44,31 @@ TEST(JsonObject, QuotesNames) {
     EXPECT_EQ("{\"a\\\"b\":1}", JsonObject().add("a\"b", 1).text());
 }
 
+TEST(JsonObject, TakesATextThatIsJsonAsWhatItIs) {
+    using namespace std::string_literals;
+    const struct {
+        std::string text;
+        const char* member;
+    } rows[] = {
+            {"51", "51"},
+            {"-2.5e3", "-2.5e3"},
+            {"\"a\"", "\"a\""},
+            {"{\"a\":[1,null]}", "{\"a\":[1,null]}"},
+            {" [1,\r\n 2]\n", " [1,   2] "},
+            // No JSON: a text.
+            {"", "\"\""},
+            {"5 1", "\"5 1\""},
+            {"{a:1}", "\"{a:1}\""},
+            {"51\0"s, "\"51\\u0000\""},
+            {"51\0\"rest"s, "\"51\\u0000\\\"rest\""},
+            {"\0"s, "\"\\u0000\""},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ("{\"x\":" + std::string(row.member) + "}",
+                  JsonObject().addParsed("x", row.text).text());
+    }
+}
+
 TEST(JsonObject, WritesFlagsAndTimes) {
     const std::chrono::system_clock::time_point when{std::chrono::milliseconds(1795202045067)};
     EXPECT_EQ("{\"on\":true,\"off\":false,\"time\":1795202045.067}",
