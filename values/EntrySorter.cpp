@@ -7,69 +7,59 @@
 
 namespace pemaro {
 
-inline uint64_t EntrySorter::prefixOf(std::string_view key) const {
+EntrySorter::EntrySorter(const ReadEntry* entries, size_t count, const char* textEnd)
+        : mEntries(entries), mCount(count), mTextEnd(textEnd), mRecords(new KeyRecord[count]) {}
+
+/// The eight bytes of a key behind those that all keys begin with, as a number in the same order. Keys
+/// have no NUL, so that what is missing of eight counts as less.
+inline uint64_t EntrySorter::beginningOf(const ReadEntry& entry) const {
+    std::string_view key = entry.key.text();
     key.remove_prefix(mCommon);
-    uint64_t prefix = 0;
-    if (mTextEnd - key.data() >= static_cast<ptrdiff_t>(sizeof(prefix))) {
-        memcpy(&prefix, key.data(), sizeof(prefix));
-        prefix = __builtin_bswap64(prefix);
-        if (key.size() < sizeof(prefix)) prefix &= ~(~uint64_t{0} >> 8 * key.size());
+    uint64_t beginning = 0;
+    if (mTextEnd - key.data() >= static_cast<ptrdiff_t>(sizeof(beginning))) {
+        memcpy(&beginning, key.data(), sizeof(beginning));
+        beginning = __builtin_bswap64(beginning);
+        if (key.size() < sizeof(beginning)) beginning &= ~(~uint64_t{0} >> 8 * key.size());
     } else {
-        for (size_t i = 0; i < sizeof(prefix); ++i) {
-            prefix = prefix << 8 | (i < key.size() ? static_cast<unsigned char>(key[i]) : 0);
+        for (size_t i = 0; i < sizeof(beginning); ++i) {
+            beginning = beginning << 8 | (i < key.size() ? static_cast<unsigned char>(key[i]) : 0);
         }
     }
-    return prefix;
+    return beginning;
 }
-static_assert(__BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__, "prefixes are read as such numbers");
+static_assert(__BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__, "beginnings are read as such numbers");
 
-EntrySorter::EntrySorter(const ReadEntry* entries, size_t count, const char* textEnd)
-        : mEntries(entries),
-          mCount(count),
-          mTextEnd(textEnd),
-          mCommon(commonPrefix()),
-          mRecords(new KeyRecord[count]) {
-    const uint64_t first = prefixOf(entries[0].key.text());
-    for (size_t i = 0; i < count; ++i) {
-        mRecords[i] = {prefixOf(entries[i].key.text()), i};
-        mDiffering |= mRecords[i].prefix ^ first;
-    }
-}
-
-size_t EntrySorter::commonPrefix() const {
+/// Finds with which bytes all keys begin, and returns the bits in which their beginnings differ.
+uint64_t EntrySorter::compareBeginnings() {
     const std::string_view first = mEntries[0].key.text();
-    size_t common = first.size();
-    for (size_t i = 1; i < mCount && common != 0; ++i) {
+    mCommon = first.size();
+    uint64_t firstBeginning = 0;
+    uint64_t differing = 0;
+    for (size_t i = 1; i < mCount; ++i) {
         const std::string_view key = mEntries[i].key.text();
-        common = std::min(common, key.size());
-        if (memcmp(key.data(), first.data(), common) == 0) continue;
-        common = static_cast<size_t>(
-                std::mismatch(key.begin(), key.begin() + common, first.begin()).first -
-                key.begin());
+        size_t common = std::min(mCommon, key.size());
+        if (memcmp(key.data(), first.data(), common) != 0) {
+            common = static_cast<size_t>(
+                    std::mismatch(key.begin(), key.begin() + common, first.begin()).first -
+                    key.begin());
+        }
+        if (common != mCommon) {
+            // The keys before share what now belongs to the beginnings, and differ that much later.
+            const size_t less = mCommon - common;
+            differing = less < sizeof(differing) ? differing >> 8 * less : 0;
+            mCommon = common;
+            firstBeginning = beginningOf(mEntries[0]);
+        }
+        differing |= beginningOf(mEntries[i]) ^ firstBeginning;
     }
-    return common;
+    return differing;
 }
 
-std::string_view EntrySorter::restOf(const KeyRecord& record) const {
-    const std::string_view key = keyOf(record);
-    return key.substr(std::min(key.size(), mCommon + sizeof(record.prefix)));
-}
-
-bool EntrySorter::less(const KeyRecord& a, const KeyRecord& b) const {
-    if (a.prefix != b.prefix) return a.prefix < b.prefix;
-    const int order = restOf(a).compare(restOf(b));
-    return order != 0 ? order < 0 : a.index < b.index;
-}
-
-void EntrySorter::sort(KeyRecord* from, KeyRecord* to) const {
-    const auto inOrder = [this](const KeyRecord& a, const KeyRecord& b) { return less(a, b); };
-    // What is in order already, as many times the same key, is not sorted again.
-    if (!std::is_sorted(from, to, inOrder)) std::sort(from, to, inOrder);
-}
-
-/// Leaves out of each byte of the prefixes the upper bits that are the same in all of them, which
-/// changes nothing in their order, and returns how many bits remain.
-unsigned EntrySorter::packPrefixes() {
+/// Leaves out of each byte of the beginnings the upper bits that are the same in all of them, which
+/// changes nothing in their order, and returns how many bits remain. What does not fit into a record
+/// is left to the comparison of the keys.
+unsigned EntrySorter::fillRecords() {
+    const uint64_t differing = compareBeginnings();
     struct Piece {
         unsigned shift;
         unsigned bits;
@@ -78,80 +68,99 @@ unsigned EntrySorter::packPrefixes() {
     Piece pieces[sizeof(uint64_t)];
     size_t count = 0;
     unsigned total = 0;
-    for (unsigned shift = 64; shift != 0;) {
-        shift -= 8;
+    constexpr unsigned kPrefixBits = 8 * sizeof(KeyRecord::prefix);
+    for (unsigned byte = sizeof(uint64_t); byte-- != 0 && total != kPrefixBits;) {
+        unsigned shift = 8 * byte;
         unsigned bits = 0;
-        while (mDiffering >> shift & 0xff & ~uint64_t{0} << bits) ++bits;
+        while (differing >> shift & 0xff & ~uint64_t{0} << bits) ++bits;
         if (bits == 0) continue;
+        const unsigned over = total + bits > kPrefixBits ? total + bits - kPrefixBits : 0;
+        shift += over;
+        bits -= over;
         pieces[count++] = {shift, bits, (uint64_t{1} << bits) - 1};
         total += bits;
     }
-    KeyRecord* const end = mRecords.get() + mCount;
-    for (KeyRecord* record = mRecords.get(); record != end; ++record) {
+    for (size_t i = 0; i < mCount; ++i) {
+        const uint64_t beginning = beginningOf(mEntries[i]);
         uint64_t packed = 0;
         for (size_t p = 0; p < count; ++p) {
-            packed =
-                    packed << pieces[p].bits | (record->prefix >> pieces[p].shift & pieces[p].mask);
+            packed = packed << pieces[p].bits | (beginning >> pieces[p].shift & pieces[p].mask);
         }
-        record->prefix = packed;
+        mRecords[i] = {static_cast<uint32_t>(packed), static_cast<uint32_t>(i)};
     }
     return total;
 }
 
-/// Sorts the records by their prefixes and leaves those of equal ones in the order of the text.
-void EntrySorter::sortByPrefix() {
-    const unsigned bits = packPrefixes();
+/// Sorts the records by the `bits` lower bits of their prefixes and leaves those of equal ones in the
+/// order of the text.
+void EntrySorter::sortByPrefix(unsigned bits) {
+    const unsigned digits = (bits + kMostDigitBits - 1) / kMostDigitBits;
+    if (digits == 0) return;
+    const unsigned digitBits = (bits + digits - 1) / digits;
+    const uint32_t mask = (uint32_t{1} << digitBits) - 1;
     std::unique_ptr<KeyRecord[]> sorted(new KeyRecord[mCount]);
-    for (unsigned shift = 0; shift < bits; shift += kDigitBits) {
-        constexpr size_t kMask = (size_t{1} << kDigitBits) - 1;
-        size_t places[kMask + 1] = {};
+    for (unsigned digit = 0; digit < digits; ++digit) {
+        const unsigned shift = digit * digitBits;
+        uint32_t places[size_t{1} << kMostDigitBits];
+        std::fill_n(places, mask + size_t{1}, 0);
         const KeyRecord* const begin = mRecords.get();
         const KeyRecord* const end = begin + mCount;
         for (const KeyRecord* from = begin; from != end; ++from) {
-            ++places[from->prefix >> shift & kMask];
+            ++places[from->prefix >> shift & mask];
         }
-        size_t sum = 0;
-        for (size_t& place : places) sum += std::exchange(place, sum);
+        uint32_t sum = 0;
+        for (size_t value = 0; value <= mask; ++value) sum += std::exchange(places[value], sum);
         KeyRecord* const to = sorted.get();
         for (const KeyRecord* from = begin; from != end; ++from) {
-            to[places[from->prefix >> shift & kMask]++] = *from;
+            to[places[from->prefix >> shift & mask]++] = *from;
         }
         mRecords.swap(sorted);
     }
 }
 
-void EntrySorter::sortEqualPrefixes() {
-    KeyRecord* const end = mRecords.get() + mCount;
-    for (KeyRecord* from = mRecords.get(); from != end;) {
-        KeyRecord* to = from + 1;
-        while (to != end && to->prefix == from->prefix) ++to;
-        if (to - from > 1) sort(from, to);
-        from = to;
-    }
+/// Sorts records of equal prefixes, those of equal keys in the order of the text.
+void EntrySorter::sortByKey(KeyRecord* from, KeyRecord* to) const {
+    const auto inOrder = [this](const KeyRecord& a, const KeyRecord& b) {
+        const int order = restOf(a).compare(restOf(b));
+        return order != 0 ? order < 0 : a.index < b.index;
+    };
+    // What is in order already, as many times the same key, is not sorted again.
+    if (!std::is_sorted(from, to, inOrder)) std::sort(from, to, inOrder);
 }
 
-size_t EntrySorter::sortInto(ReadEntry* to) {
-    if (mCount < kFewRecords) {
-        sort(mRecords.get(), mRecords.get() + mCount);
-    } else {
-        sortByPrefix();
-        sortEqualPrefixes();
-    }
-    const KeyRecord* const records = mRecords.get();
-    const bool fetch = mCount >= kManyEntries;
-    size_t kept = 0;
-    for (size_t i = 0; i < mCount; ++i) {
-        if (fetch)
-            __builtin_prefetch(&mEntries[records[std::min(i + kFetchAhead, mCount - 1)].index]);
-        const ReadEntry& entry = mEntries[records[i].index];
-        if (i + 1 < mCount && records[i].prefix == records[i + 1].prefix &&
-            restOf(records[i]) == restOf(records[i + 1])) {
-            entry.value.destroyContainer();
-        } else {
-            to[kept++] = entry;
+/// Sorts what the prefixes leave open, and keeps of equal keys the last.
+size_t EntrySorter::sortEqualPrefixes() {
+    KeyRecord* const end = mRecords.get() + mCount;
+    KeyRecord* kept = mRecords.get();
+    for (KeyRecord* from = mRecords.get(); from != end;) {
+        KeyRecord* to = from + 1;
+        if (to == end || to->prefix != from->prefix) {
+            *kept++ = *from;
+            from = to;
+            continue;
+        }
+        while (to != end && to->prefix == from->prefix) ++to;
+        sortByKey(from, to);
+        for (; from != to; ++from) {
+            if (from + 1 != to && restOf(from[0]) == restOf(from[1])) {
+                mEntries[from->index].value.destroyContainer();
+            } else {
+                *kept++ = *from;
+            }
         }
     }
-    return kept;
+    return static_cast<size_t>(kept - mRecords.get());
+}
+
+size_t EntrySorter::sort() {
+    const unsigned bits = fillRecords();
+    if (mCount < kFewRecords) {
+        std::sort(mRecords.get(), mRecords.get() + mCount,
+                  [](const KeyRecord& a, const KeyRecord& b) { return a.prefix < b.prefix; });
+    } else {
+        sortByPrefix(bits);
+    }
+    return sortEqualPrefixes();
 }
 
 }  // namespace pemaro

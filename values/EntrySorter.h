@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <memory>
 
@@ -8,46 +9,56 @@
 
 namespace pemaro {
 
-/// Sorts many entries by moving small records of them: by the prefixes, digit by digit, and where
-/// these are equal by the keys themselves.
+/// Puts many entries in order without moving them: what is sorted are small records of them, by the
+/// beginnings of the keys, digit by digit, and where these are equal by the keys themselves.
 class EntrySorter {
   public:
+    /// REQUIRES: at least one entry, and fewer than 2^32.
     EntrySorter(const ReadEntry* entries, size_t count, const char* textEnd);
 
-    /// Copies the entries to `to` in the order of their keys, of equal keys only the last, and
-    /// returns how many these are. Destroys the containers of those that it leaves out.
-    size_t sortInto(ReadEntry* to);
+    /// Orders the entries by their keys, of equal keys only the last, and returns how many these are.
+    /// Destroys the containers of those that it leaves out.
+    size_t sort();
+
+    /// The entry at a place of the order.
+    const ReadEntry& operator[](size_t place) const { return mEntries[mRecords[place].index]; }
+
+    /// Fetches into the cache what a walk that is at `place` comes to soon.
+    void fetchBehind(size_t place, size_t count) const {
+        constexpr size_t kAhead = 8;
+        const size_t last = count - 1;
+        __builtin_prefetch(&(*this)[std::min(place + 2 * kAhead, last)]);
+        const ReadEntry& entry = (*this)[std::min(place + kAhead, last)];
+        __builtin_prefetch(entry.key.address());
+        __builtin_prefetch(entry.value.address());
+    }
 
   private:
-    /// The eight bytes of a key behind those that all keys begin with, as a number in the same
-    /// order, and which of the entries has that key. Keys have no NUL, so that what is missing of
-    /// eight counts as less.
+    /// What of a key's beginning differs among the keys, as a number in the same order, and which of
+    /// the entries has that key.
     struct KeyRecord {
-        uint64_t prefix;
-        size_t index;
+        uint32_t prefix;
+        uint32_t index;
     };
 
-    static constexpr size_t kFewRecords = 128;
-    static constexpr unsigned kDigitBits = 10;
+    static constexpr size_t kFewRecords = 64;
+    static constexpr unsigned kMostDigitBits = 11;
 
-    std::string_view keyOf(const KeyRecord& record) const {
-        return mEntries[record.index].key.text();
+    std::string_view restOf(const KeyRecord& record) const {
+        return mEntries[record.index].key.text().substr(mCommon);
     }
-    size_t commonPrefix() const;
-    uint64_t prefixOf(std::string_view key) const;
-    std::string_view restOf(const KeyRecord& record) const;
-    bool less(const KeyRecord& a, const KeyRecord& b) const;
-    void sort(KeyRecord* from, KeyRecord* to) const;
-    unsigned packPrefixes();
-    void sortByPrefix();
-    void sortEqualPrefixes();
+    uint64_t beginningOf(const ReadEntry& entry) const;
+    uint64_t compareBeginnings();
+    unsigned fillRecords();
+    void sortByPrefix(unsigned bits);
+    void sortByKey(KeyRecord* from, KeyRecord* to) const;
+    size_t sortEqualPrefixes();
 
     const ReadEntry* const mEntries;
     const size_t mCount;
     const char* const mTextEnd;
-    const size_t mCommon;  ///< bytes with which all keys begin
     std::unique_ptr<KeyRecord[]> mRecords;
-    uint64_t mDiffering = 0;  ///< bits in which the prefixes differ
+    size_t mCommon = 0;  ///< bytes with which all keys begin
 };
 
 }  // namespace pemaro

@@ -61,9 +61,7 @@ struct ReadEntry {
     ReadItem value;
 };
 
-/// Where so many entries are gone through that they do not stay in the cache, and in another order than
-/// that of their memory, the memory is fetched this many entries beforehand.
+/// So many do not stay in the cache.
 constexpr size_t kManyEntries = 4096;
-constexpr size_t kFetchAhead = 12;
 
 }  // namespace pemaro

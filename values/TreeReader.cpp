@@ -275,27 +275,31 @@ void TreeReader::fill(SerializableMap& map, size_t firstItem) {
     while (ascending < count && ascends(entries[ascending - 1].key, entries[ascending].key)) {
         ++ascending;
     }
-    std::unique_ptr<ReadEntry[]> sorted;
-    if (ascending < count) {
-        sorted.reset(new ReadEntry[count]);
-        count = EntrySorter(entries, count, mTextEnd).sortInto(sorted.get());
-        entries = sorted.get();
-        mItems.shrinkToFit(firstItem);
+    if (ascending >= count) {
+        fillFrom(map, entries, count, [](size_t) {});
+    } else {
+        EntrySorter sorted(entries, count, mTextEnd);
+        count = sorted.sort();
+        // Where they do not stay in the cache, each is taken from another place of the memory.
+        const bool fetch = count >= kManyEntries;
+        fillFrom(map, sorted, count, [&](size_t i) {
+            if (fetch) sorted.fetchBehind(i, count);
+        });
     }
-    const bool fetch = sorted != nullptr && count >= kManyEntries;
+    mItems.shrink(firstItem);
+}
+
+/// Fills a map with entries[0] and so on; before each, `announce` is told its place.
+template <typename Entries, typename Announce>
+void TreeReader::fillFrom(SerializableMap& map, const Entries& entries, size_t count,
+                          Announce announce) {
     fillEntries(
             ValueAccess::entries(map), count,
             [&](size_t i) {
-                if (fetch) {
-                    // These texts are taken from all over what is read.
-                    const ReadEntry& next = entries[std::min(i + kFetchAhead, count - 1)];
-                    __builtin_prefetch(next.key.address());
-                    __builtin_prefetch(next.value.address());
-                }
+                announce(i);
                 return entries[i].key.text();
             },
             [&](size_t i) { return entries[i].value.value(); });
-    mItems.shrink(firstItem);
 }
 
 void TreeReader::fill(SerializableMapArray& array, size_t firstItem) {

@@ -50,6 +50,8 @@ class TreeReader {
     bool readingAt(const char* at);
 
     void fill(SerializableMap& map, size_t firstItem);
+    template <typename Entries, typename Announce>
+    void fillFrom(SerializableMap& map, const Entries& entries, size_t count, Announce announce);
     void fill(SerializableMapArray& array, size_t firstItem);
 
     const char* const mText;
