@@ -43,11 +43,11 @@ bool FrameReceiver::tryStats(FrameStats& stats) const {
     return guard.owns_lock();
 }
 
-/// Frames come from one thread; a file may keep it waiting, and nobody else.
-void FrameReceiver::take(const void* frame, size_t length) {
+/// A file may keep the thread that brings the frames waiting, and nobody else.
+const std::vector<uint8_t>* FrameReceiver::take(const void* frame, size_t length) {
     std::unique_lock<std::mutex> guard(mLock);
     if (mDone) {
-        return;
+        return nullptr;
     }
     std::string fault = fetch(frame, length);
     if (fault.empty()) {
@@ -57,7 +57,7 @@ void FrameReceiver::take(const void* frame, size_t length) {
         if (mStats.corrupt++ == 0) {
             mStats.firstCorrupt = fault;
         }
-        return;
+        return nullptr;
     }
     guard.unlock();
     const bool isKept = mFile == nullptr || mFile->write(mFrame.data(), length);
@@ -72,6 +72,7 @@ void FrameReceiver::take(const void* frame, size_t length) {
     if (mDone) {
         mChanged.notify_all();
     }
+    return isKept ? &mFrame : nullptr;
 }
 
 /// Copies a frame out of the shared memory, in which it may still change; what is wrong with it, or

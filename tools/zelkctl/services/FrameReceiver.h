@@ -41,6 +41,11 @@ class FrameReceiver {
     /// The data callback of the client; `context` is the receiver.
     static void onFrame(int, void* frame, unsigned long length, void* context);
 
+    /// The same; returns its own copy of a frame that it took, which is good until the next call, or
+    /// null. Who wants to look into a frame looks into the copy: where the frame came from, the
+    /// service can still change it. Frames come from one thread.
+    const std::vector<uint8_t>* take(const void* frame, size_t length);
+
     FrameStats stats() const;
     /// The same from a thread that must not wait; what was known a moment ago, at least.
     bool tryStats(FrameStats& stats) const;
@@ -50,7 +55,6 @@ class FrameReceiver {
     bool waitUntilDone(std::chrono::milliseconds patience);
 
   private:
-    void take(const void* frame, size_t length);
     std::string fetch(const void* frame, size_t length);
     std::string check();
     uint64_t number() const { return mStats.frames + mStats.corrupt; }

@@ -39,23 +39,22 @@ int startStream(ITouchCompanionFacade& facade) {
     return tools::kExitSuccess;
 }
 
-void LatestFrame::onFrame(int type, void* frame, unsigned long length, void* context) {
+void LatestFrame::onFrame(int, void* frame, unsigned long length, void* context) {
     auto* latest = static_cast<LatestFrame*>(context);
-    const uint64_t before = latest->mReceiver.stats().frames;
-    FrameReceiver::onFrame(type, frame, length, &latest->mReceiver);
-    // What the receiver did not believe is not looked at.
-    if (latest->mReceiver.stats().frames != before) {
-        latest->keep(frame, length);
+    const std::vector<uint8_t>* copy = latest->mReceiver.take(frame, length);
+    if (copy != nullptr) {
+        latest->keep(*copy);
     }
 }
 
-void LatestFrame::keep(const void* frame, size_t length) {
-    if (frames::frameFault(frame, length) != nullptr) {
+/// The receiver has checked the frame, if it is of a kind that can be checked.
+void LatestFrame::keep(const std::vector<uint8_t>& frame) {
+    frames::FrameHeader header;
+    if (!frames::readFrameHeader(frame.data(), frame.size(), &header)) {
         return;
     }
-    const auto* bytes = static_cast<const uint8_t*>(frame);
     std::lock_guard<std::mutex> guard(mLock);
-    mFrame.assign(bytes, bytes + length);
+    mFrame = frame;
     mIsNew = true;
 }
 

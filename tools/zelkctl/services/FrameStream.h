@@ -32,7 +32,7 @@ class LatestFrame {
     bool take(std::vector<uint8_t>* frame);
 
   private:
-    void keep(const void* frame, size_t length);
+    void keep(const std::vector<uint8_t>& frame);
 
     FrameReceiver mReceiver{nullptr, 0};
     std::mutex mLock;
