@@ -9,13 +9,9 @@
 #include <functional>
 
 #include "bench/Floor.h"
+#include "bench/Measured.h"
 #include "bench/Payloads.h"
 #include "pemaro/SerializableMap.h"
-
-/// What is measured. The name is for the counter to find.
-extern "C" __attribute__((noinline)) void zelk_measured(const std::function<void()>& operation) {
-    operation();
-}
 
 namespace pemaro::bench {
 namespace {

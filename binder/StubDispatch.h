@@ -3,7 +3,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <optional>
 
 #include "binder/Log.h"
 #include "pemaro/Binder.h"
@@ -41,9 +40,13 @@ android::status_t dispatch(const char* tag, const StubRow<Service> (&rows)[N],
     }
     const StubRow<Service>& row = rows[code - android::IBinder::FIRST_CALL_TRANSACTION];
     logText(ANDROID_LOG_DEBUG, tag, row.received);
-    std::optional<android::Parcel> unwanted;  // a local caller may pass no reply parcel
-    android::status_t result =
-            row.handle(service, data, reply != nullptr ? *reply : unwanted.emplace());
+    android::status_t result;
+    if (reply != nullptr) {
+        result = row.handle(service, data, *reply);
+    } else {  // a local caller may pass no reply parcel
+        android::Parcel unwanted;
+        result = row.handle(service, data, unwanted);
+    }
     logText(ANDROID_LOG_DEBUG, tag, row.finished);
     return result;
 }
