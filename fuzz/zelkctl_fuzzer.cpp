@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 
-// What zelkctl and the simulated stack read from users, files and frames: numbers and lists of them, orders of
-// faults, configurations, files of gestures, recorded frames and recordings.
+// What zelkctl and the simulated stack are told by users: numbers, orders of faults, configurations, command
+// lines, and answers to be shown as JSON.
 
 #include <fcntl.h>
 #include <fuzzer/FuzzedDataProvider.h>
@@ -9,6 +9,7 @@
 #include <sys/mman.h>
 #include <unistd.h>
 
+#include <CLI/CLI.hpp>
 #include <cctype>
 #include <cerrno>
 #include <cstdint>
@@ -17,17 +18,11 @@
 #include <string>
 #include <vector>
 
-#include "frames/Frame.h"
-#include "frames/FrameGenerator.h"
-#include "frames/RecordingFile.h"
 #include "fuzz/support/ParcelInput.h"
 #include "simulator/companion/Configuration.h"
 #include "simulator/faults/Fault.h"
+#include "tools/common/CommandLine.h"
 #include "tools/common/Number.h"
-#include "tools/zelkctl/files/ConfigFile.h"
-#include "tools/zelkctl/files/FrameSummary.h"
-#include "tools/zelkctl/files/GestureFile.h"
-#include "tools/zelkctl/services/FrameReceiver.h"
 #include "tools/zelkctl/terminal/Json.h"
 
 namespace {
@@ -96,92 +91,37 @@ void checkConfiguration(const std::string& bytes) {
     }
 }
 
-void checkFiles(const std::string& bytes, size_t limit) {
-    const File file(bytes);
-    std::string read;
-    const zelkctl::FileResult result = zelkctl::readConfigFile(file.path(), limit, read);
-    fuzz::expect(result.isGood() == (bytes.size() <= limit), "a size that was misjudged");
-    fuzz::expect(!result.isGood() || read == bytes, "a file was read as another");
-}
-
-// About as many bytes as a few records have.
-void checkGestures(uint32_t number) {
-    constexpr size_t kRecord = sizeof(IGestureManagerClient::GestureData);
-    constexpr size_t kMost = 3;
-    const size_t size = number % 6 * kRecord + number / 6 % 3;
-    std::vector<IGestureManagerClient::GestureData> records;
-    const std::string problem =
-            zelkctl::readGestures(File(std::string(size, 'r')).path(), kMost, records);
-    const bool good = size > 0 && size % kRecord == 0 && size / kRecord <= kMost;
-    fuzz::expect(problem.empty() == good, "records that were misjudged");
-    fuzz::expect(!good || records.size() == size / kRecord, "another number of records");
-}
-
-void checkFrame(const std::string& bytes, uint32_t packet) {
-    frames::FrameHeader header;
-    frames::readFrameHeader(bytes.data(), bytes.size(), &header);
-    const char* fault = frames::frameFault(bytes.data(), bytes.size());
-    fuzz::touch(fault, fault == nullptr ? 0 : 1);
-    // A packet's bytes are always there.
-    std::string frame = bytes;
-    frame.resize(packet);
-    zelkctl::FrameReceiver receiver(nullptr, 0);
-    receiver.setPacketSize(packet);
-    uint32_t length = 0;
-    if (packet >= 12) {
-        memcpy(&length, &frame[8], sizeof(length));
-    }
-    zelkctl::FrameReceiver::onFrame(0, frame.data(), length, &receiver);
-    fuzz::expect(receiver.stats().frames + receiver.stats().corrupt == 1, "a frame is missing");
-}
-
-/// Frames, some of them damaged, with anything before, between and behind them.
-std::string recording(FuzzedDataProvider& input) {
-    static auto& generator = *new frames::FrameGenerator(96, 1);
-    std::string bytes;
-    for (uint32_t left = input.ConsumeIntegralInRange<uint32_t>(0, 6); left > 0; --left) {
-        if (input.ConsumeBool()) {
-            bytes += input.ConsumeRandomLengthString(64);
-            continue;
-        }
-        const auto& frame =
-                generator.draw(input.ConsumeIntegral<uint8_t>(), input.ConsumeIntegral<uint64_t>(),
-                               frames::kFilterDefault);
-        bytes.append(frame.begin(), frame.end());
-        if (input.ConsumeBool()) {
-            const auto place = input.ConsumeIntegralInRange<size_t>(0, frame.size() - 1);
-            bytes[bytes.size() - 1 - place] = input.ConsumeIntegral<char>();
+/// A command line with one of each: what is refused has a reason, and what is taken arrived.
+void checkCommandLine(const std::string& text) {
+    std::vector<std::string> words{"program"};
+    for (const char c : text) {
+        if (c == ' ') {
+            words.emplace_back();
+        } else if (words.size() > 1) {
+            words.back() += c;
         }
     }
-    bytes.resize(bytes.size() - input.ConsumeIntegralInRange<size_t>(0, bytes.size()));
-    return bytes;
-}
+    std::vector<char*> arguments;
+    for (std::string& word : words) arguments.push_back(word.data());
 
-void checkRecording(const std::string& bytes) {
-    const File file(bytes);
+    CLI::App app;
+    app.set_help_flag("");
+    app.require_subcommand(1);
+    std::string name = "unset";
+    int count = 0;
+    CLI::App* const watch = app.add_subcommand("watch");
+    watch->add_option("-n,--name", name);
+    watch->add_flag("-v,--verbose");
+    watch->add_option("count", count)->required();
+    app.add_subcommand("list")->add_subcommand("all");
     std::string problem;
-    const auto read = frames::RecordingFile::open(file.path(), &problem);
-    fuzz::expect((read == nullptr) == !problem.empty(), "a refusal without a reason");
-    if (read == nullptr) {
-        return;
-    }
-    uint64_t end = 0;
-    uint64_t intact = 0;
-    for (const auto& part : read->parts()) {
-        fuzz::expect(part.offset == end && part.length > 0, "parts with a gap between them");
-        end += part.length;
-        const bool isFrame = part.kind == frames::RecordingFile::Kind::kFrame;
-        fuzz::expect(isFrame == (part.problem == nullptr), "damage without a word about it");
-        fuzz::expect(!isFrame || frames::frameFault(read->bytes(part), part.length) == nullptr,
-                     "a damaged frame taken for an intact one");
-        intact += isFrame ? 1 : 0;
-    }
-    fuzz::expect(end == bytes.size(), "parts that are not the whole file");
-    const zelkctl::FrameSummary summary = zelkctl::summarize(*read);
-    fuzz::expect(summary.frames == intact, "another number of frames");
-    fuzz::expect(zelkctl::isJson(zelkctl::summaryJson(*read, summary)),
-                 "a summary that is no JSON");
-    fuzz::expect(!zelkctl::summaryText(*read, summary).empty(), "nothing to say");
+    const auto status =
+            tools::parseCommandLine(app, static_cast<int>(arguments.size()), arguments.data(),
+                                    nullptr, [&](const std::string& told) { problem = told; });
+    fuzz::expect(status.has_value() == !problem.empty(), "a refusal without a reason");
+    fuzz::expect(status.has_value() || !name.empty(), "an empty argument was taken");
+    fuzz::expect(status.has_value() || watch->parsed() == (watch->count("count") == 1),
+                 "a command without what it requires");
 }
 
 }  // namespace
@@ -189,34 +129,26 @@ void checkRecording(const std::string& bytes) {
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     FuzzedDataProvider input(data, size);
     const int reader = input.ConsumeIntegralInRange(0, 7);
-    if (reader == 7) {
-        checkRecording(recording(input));
-        return 0;
-    }
-    const auto number = input.ConsumeIntegralInRange<uint32_t>(0, 4096);
     const std::string first = input.ConsumeRandomLengthString(64);
     const std::string rest = input.ConsumeRemainingBytesAsString();
     switch (reader) {
         case 0:
+        case 1:
             checkNumber(first.c_str());
             break;
-        case 1:
+        case 2:
+        case 3:
             checkJson(first.c_str(), rest);
             break;
-        case 2:
+        case 4:
+        case 5:
             checkFault(first);
             break;
-        case 3:
+        case 6:
             checkConfiguration(rest);
             break;
-        case 4:
-            checkFiles(rest, number);
-            break;
-        case 5:
-            checkGestures(number);
-            break;
         default:
-            checkFrame(rest, number);
+            checkCommandLine(first.c_str());
             break;
     }
     return 0;
