@@ -22,7 +22,7 @@ if(ZELK_SANITIZE)
   endif()
 endif()
 if(ZELK_COVERAGE)
-  target_compile_options(zelk_options INTERFACE --coverage)
+  target_compile_options(zelk_options INTERFACE --coverage -fprofile-update=atomic)
   target_link_options(zelk_options INTERFACE --coverage)
 endif()
 

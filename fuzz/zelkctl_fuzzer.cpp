@@ -51,7 +51,8 @@ void checkNumber(const std::string& text) {
     errno = 0;
     char* end = nullptr;
     const long long expected = strtoll(text.c_str(), &end, 0);
-    const bool whole = !text.empty() && isspace(static_cast<unsigned char>(text[0])) == 0 &&
+    const bool whole = !text.empty() && text[0] != '+' &&
+                       isspace(static_cast<unsigned char>(text[0])) == 0 &&
                        end == text.c_str() + text.size() && errno == 0 && expected >= INT32_MIN &&
                        expected <= UINT32_MAX;
     fuzz::expect(number.has_value() == whole && (!whole || *number == expected), "another number");
