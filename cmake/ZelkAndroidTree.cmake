@@ -17,9 +17,10 @@ set(ZELK_BP_LIBRARIES
   "zelk_fuzz_support=static_libs:libzelk_fuzz_support"
   "zelk::testkit=static_libs:libzelktestkit"
   "zelktestkit=static_libs:libzelktestkit")
-# Tests that start a service manager, the programs or the completions of a desk; what counts costs there.
+# Tests that start a service manager, the programs or the completions of a desk; what counts costs there; the
+# manual's programs, whose sources a build here takes out of the document.
 set(ZELK_BP_DESK_ONLY report_page_test tools_tests zelk_values_plain values_plain_test
-  values_plain_comparison_test values_allocations_test)
+  values_plain_comparison_test values_allocations_test manual_by_name manual_watch)
 
 set_property(GLOBAL PROPERTY ZELK_BP "")
 

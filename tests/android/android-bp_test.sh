@@ -1,0 +1,37 @@
+#!/bin/bash
+# SPDX-License-Identifier: Apache-2.0
+# android-bp takes what a build wrote, and refuses a module whose files the Android tree would not have.
+#
+#   android-bp_test.sh BUILD-FOLDER
+set -euo pipefail
+
+here=$(dirname -- "$(realpath -- "${BASH_SOURCE[0]}")")
+build=$(realpath -- "$1")
+folder=$(mktemp -d)
+# Stands for what a build writes: there, and ignored.
+generated=$(mktemp -p "$build" generated-XXXXXX.cpp)
+trap 'rm -rf -- "$folder" "$generated"' EXIT
+failures=0
+cp -t "$folder" -- "$build/TEST_MAPPING"
+
+# refuses TEXT MODULE-LINE: with the line in one more module.
+refuses() {
+    printf 'cc_test {\n    name: "zelk_more_test",\n    %s,\n}\n' "$2" |
+        cat "$build/Android.bp" - >"$folder/Android.bp"
+    if "$here/android-bp" "$folder" >"$folder/log" 2>&1; then
+        echo "taken: $2" >&2
+        failures=$((failures + 1))
+    elif ! grep -q -x -F "android-bp: $1" "$folder/log"; then
+        echo "not refused with '$1': $2: $(<"$folder/log")" >&2
+        failures=$((failures + 1))
+    fi
+}
+
+"$here/android-bp" "$build"
+root=$(realpath -- "$here/../..")
+refuses "values/Nowhere.cpp: not a file of the tree" 'srcs: ["values/Nowhere.cpp"]'
+refuses "${generated#"$root/"}: not a file of the tree" "srcs: [\"${generated#"$root/"}\"]"
+refuses "docs/doxygen/make-reference: no source of a compiler" 'srcs: ["docs/doxygen/make-reference"]'
+refuses "fuzz/corpus/nowhere/*: no such files" 'corpus: ["fuzz/corpus/nowhere/*"]'
+refuses "nowhere: not a folder of the tree" 'local_include_dirs: ["nowhere"]'
+((failures == 0))
