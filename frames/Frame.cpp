@@ -25,6 +25,15 @@ bool readFrameHeader(const void* frame, size_t length, FrameHeader* header) {
            header->headerBytes == sizeof(*header);
 }
 
+const char* frameHeaderFault(const FrameHeader& header, uint64_t length) {
+    if (header.length != length) {
+        return "another length than its header tells";
+    }
+    const uint64_t content = sizeof(header) + header.fingers * sizeof(FingerRecord) +
+                             sizeof(int16_t) * header.columns * header.rows;
+    return content == length ? nullptr : "another length than its contents";
+}
+
 const char* frameFault(const void* frame, size_t length) {
     FrameHeader header;
     if (length < sizeof(header)) {
@@ -33,13 +42,9 @@ const char* frameFault(const void* frame, size_t length) {
     if (!readFrameHeader(frame, length, &header)) {
         return "not a frame of this kind";
     }
-    if (header.length != length) {
-        return "another length than its header tells";
-    }
-    const size_t content = sizeof(header) + header.fingers * sizeof(FingerRecord) +
-                           sizeof(int16_t) * header.columns * header.rows;
-    if (content != length) {
-        return "another length than its contents";
+    const char* fault = frameHeaderFault(header, length);
+    if (fault != nullptr) {
+        return fault;
     }
     return frameChecksum(frame, length) == header.checksum ? nullptr : "wrong checksum";
 }

@@ -67,6 +67,9 @@ uint32_t frameChecksum(const void* frame, size_t length);
 /// Copies the header out. False when `length` bytes hold none or it is of another kind of frame.
 bool readFrameHeader(const void* frame, size_t length, FrameHeader* header);
 
+/// Null for a header that a frame of `length` bytes can have, else what is wrong with it.
+const char* frameHeaderFault(const FrameHeader& header, uint64_t length);
+
 /// Null for an intact frame of `length` bytes, else what is wrong with it.
 const char* frameFault(const void* frame, size_t length);
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <android-base/mapped_file.h>
+#include <android-base/unique_fd.h>
 
 #include <cstddef>
 #include <cstdint>
@@ -19,6 +19,9 @@ namespace pemaro::frames {
 ///
 /// What is damaged is told apart from what is intact. Behind damage the next frame is looked for that is
 /// intact from its magic to its checksum.
+///
+/// The file is read as it is needed, and may be larger than the memory; of what is no file, as a pipe,
+/// everything is kept. Who changes the file meanwhile is noticed. One thread at a time.
 class RecordingFile {
   public:
     enum class Kind {
@@ -37,33 +40,49 @@ class RecordingFile {
         const char* problem;  ///< null for an intact frame
     };
 
+    /// How much is taken of what is no file, and may have no end.
+    static constexpr size_t kMaxStreamBytes = size_t{1} << 30;
+
     /// Null, with a sentence about why, for a file that cannot be read or that does not begin as a
     /// recording does. An empty file is a recording without frames.
-    /// The file must not become shorter as long as the object lives.
-    static std::unique_ptr<RecordingFile> open(const std::string& path, std::string* problem);
+    static std::unique_ptr<RecordingFile> open(const std::string& path, std::string* problem,
+                                               size_t maxStreamBytes = kMaxStreamBytes);
 
     const std::string& path() const { return mPath; }
     uint64_t size() const { return mSize; }
 
     /// The whole file, from its beginning to its end.
     const std::vector<Part>& parts() const { return mParts; }
-    const uint8_t* bytes(const Part& part) const { return mBytes + part.offset; }
+    /// Good until the next call. Null, with the reason in problem(), when the file no longer has
+    /// them; those of an intact frame are intact.
+    const uint8_t* bytes(const Part& part) const;
+
+    /// Why parts could not be read any more; empty as long as all could.
+    const std::string& problem() const { return mProblem; }
 
   private:
     explicit RecordingFile(const std::string& path) : mPath(path) {}
 
-    bool load(std::string* problem);
+    bool load(size_t maxStreamBytes);
+    bool loadStream(size_t maxBytes);
     void split();
     Part partAt(uint64_t offset) const;
     uint64_t findIntact(uint64_t offset) const;
     bool isFrameAt(uint64_t offset, FrameHeader* header) const;
+    bool beginsAt(uint64_t offset) const;
+    const char* faultAt(uint64_t offset, const FrameHeader& header) const;
+    const uint8_t* at(uint64_t offset, uint64_t length) const;
+    bool fail(const std::string& reason) const;
 
     const std::string mPath;
-    std::unique_ptr<android::base::MappedFile> mMapping;
-    std::string mCopy;  ///< of what cannot be mapped
-    const uint8_t* mBytes = nullptr;
+    android::base::unique_fd mFd;
     uint64_t mSize = 0;
     std::vector<Part> mParts;
+
+    /// What was read last of the file, and where it stands there; all of what is no file.
+    mutable std::vector<uint8_t> mWindow;
+    mutable uint64_t mWindowOffset = 0;
+    mutable std::string mProblem;
 };
 
 }  // namespace pemaro::frames

@@ -16,11 +16,15 @@ constexpr nanoseconds kShortestPause = std::chrono::milliseconds(1);
 }  // namespace
 
 std::shared_ptr<const Replay> Replay::open(const std::string& path, std::string* problem) {
-    auto file = RecordingFile::open(path, problem);
+    const auto file = RecordingFile::open(path, problem);
     if (file == nullptr) {
         return nullptr;
     }
-    std::shared_ptr<Replay> replay(new Replay(std::move(file)));
+    std::shared_ptr<Replay> replay(new Replay);
+    if (!replay->load(*file)) {
+        *problem = file->problem();
+        return nullptr;
+    }
     if (replay->mFrames.empty()) {
         *problem = path + " has no frame that could be played";
         return nullptr;
@@ -28,10 +32,10 @@ std::shared_ptr<const Replay> Replay::open(const std::string& path, std::string*
     return replay;
 }
 
-Replay::Replay(std::unique_ptr<const RecordingFile> file) : mFile(std::move(file)) {
+bool Replay::load(const RecordingFile& file) {
     nanoseconds due{0};
     const RecordingFile::Part* before = nullptr;
-    for (const RecordingFile::Part& part : mFile->parts()) {
+    for (const RecordingFile::Part& part : file.parts()) {
         if (part.kind == RecordingFile::Kind::kTruncated || part.header.length != part.length) {
             mLeftOut += part.length;
             continue;
@@ -44,9 +48,14 @@ Replay::Replay(std::unique_ptr<const RecordingFile> file) : mFile(std::move(file
             }
             before = &part;
         }
-        mFrames.push_back({mFile->bytes(part), part.length, due});
+        const uint8_t* bytes = file.bytes(part);
+        if (bytes == nullptr) {
+            return false;
+        }
+        mFrames.push_back({{bytes, bytes + part.length}, due});
         mLongest = std::max(mLongest, part.length);
     }
+    return true;
 }
 
 ReplayedFrames::ReplayedFrames(std::shared_ptr<const Replay> replay, double speed, bool loop)
@@ -70,7 +79,7 @@ FrameSource::Frame ReplayedFrames::next(uint32_t, uint64_t, uint32_t) {
         mRoundStart += whole + std::max(whole / intervals, kShortestPause);
         mNext = 0;
     }
-    return {entry.bytes, entry.length};
+    return {entry.bytes.data(), entry.bytes.size()};
 }
 
 }  // namespace pemaro::simulator

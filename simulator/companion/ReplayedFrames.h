@@ -10,7 +10,8 @@
 
 namespace pemaro::simulator {
 
-/// A recording made ready to be played: its frames, and when each is due.
+/// A recording made ready to be played: its frames, and when each is due. They are kept in memory: the
+/// file may go on or away while they are played.
 class Replay {
   public:
     /// Null, with a sentence about why, when the file cannot be read or has no frame to play.
@@ -26,14 +27,13 @@ class Replay {
     friend class ReplayedFrames;
 
     struct Entry {
-        const uint8_t* bytes;
-        size_t length;
+        std::vector<uint8_t> bytes;
         std::chrono::nanoseconds due;  ///< after the first
     };
 
-    explicit Replay(std::unique_ptr<const frames::RecordingFile> file);
+    Replay() = default;
+    bool load(const frames::RecordingFile& file);
 
-    const std::unique_ptr<const frames::RecordingFile> mFile;
     std::vector<Entry> mFrames;
     size_t mLongest = 0;
     uint64_t mLeftOut = 0;

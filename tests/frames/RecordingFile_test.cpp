@@ -2,9 +2,11 @@
 #include "frames/RecordingFile.h"
 
 #include <gtest/gtest.h>
+#include <signal.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <cstring>
 #include <fstream>
 #include <string>
 #include <thread>
@@ -170,6 +172,66 @@ TEST_F(RecordingFileTest, CanBeReadFromAPipe) {
     writer.join();
     ASSERT_NE(nullptr, file) << problem;
     EXPECT_EQ(3u, file->parts().size());
+}
+
+TEST_F(RecordingFileTest, IsRefusedAtOnceWhenItIsForeignAndEndless) {
+    EXPECT_EQ(nullptr, RecordingFile::open("/dev/zero", &problem));
+    EXPECT_EQ("/dev/zero is no recording of touch frames: it does not begin with one", problem);
+}
+
+TEST_F(RecordingFileTest, IsRefusedWhenAPipeHasNoEnd) {
+    // The writer may be left alone within a frame.
+    signal(SIGPIPE, SIG_IGN);
+    ASSERT_EQ(0, mkfifo(path.c_str(), 0600));
+    std::thread writer([this] { std::ofstream(path, std::ios::binary) << framesTo(800); });
+    EXPECT_EQ(nullptr, RecordingFile::open(path, &problem, 700 * kLength));
+    writer.join();
+    EXPECT_EQ("cannot read " + path + ": there is no end within 89600 bytes", problem);
+}
+
+// Longer than what is read at once, and damaged where that ends.
+TEST_F(RecordingFileTest, MayBeLongerThanWhatIsReadAtOnce) {
+    constexpr uint32_t kFrames = 20000;
+    constexpr uint64_t kDamage = (uint64_t{1} << 20) - 64;
+    std::string bytes = framesTo(kFrames);
+    bytes.replace(kDamage, 200000, std::string(200000, '\0'));
+    const auto file = write(bytes);
+    ASSERT_NE(nullptr, file) << problem;
+    uint64_t end = 0;
+    uint64_t intact = 0;
+    for (const RecordingFile::Part& part : file->parts()) {
+        EXPECT_EQ(end, part.offset);
+        end += part.length;
+        if (part.kind == Kind::kFrame) {
+            EXPECT_EQ(part.offset / kLength, part.header.sequence);
+            ASSERT_NE(nullptr, file->bytes(part));
+            EXPECT_EQ(0, memcmp(bytes.data() + part.offset, file->bytes(part), part.length));
+            intact += 1;
+        }
+    }
+    EXPECT_EQ(bytes.size(), end);
+    // 8191 whole frames and half of one before the damage; it ends within another one.
+    EXPECT_EQ(8191u + (kFrames - 9754), intact);
+}
+
+TEST_F(RecordingFileTest, TellsWhenItBecameShorterMeanwhile) {
+    const auto file = write(framesTo(20000));
+    ASSERT_NE(nullptr, file) << problem;
+    ASSERT_NE(nullptr, file->bytes(file->parts()[9000]));
+    ASSERT_EQ(0, truncate(path.c_str(), 10 * kLength));
+    EXPECT_EQ(nullptr, file->bytes(file->parts()[15]));
+    EXPECT_EQ("cannot read " + path + ": it was changed meanwhile", file->problem());
+    EXPECT_NE(nullptr, file->bytes(file->parts()[5]));
+}
+
+TEST_F(RecordingFileTest, GivesOutNoFrameThatAnotherTookThePlaceOf) {
+    const auto file = write(framesTo(20000));
+    ASSERT_NE(nullptr, file) << problem;
+    std::ofstream(path, std::ios::binary) << frame(7) << frame(1) << std::string(kLength, 'x');
+    EXPECT_EQ(nullptr, file->bytes(file->parts()[0]));
+    EXPECT_EQ("cannot read " + path + ": it was changed meanwhile", file->problem());
+    EXPECT_NE(nullptr, file->bytes(file->parts()[1]));
+    EXPECT_EQ(nullptr, file->bytes(file->parts()[2]));
 }
 
 }  // namespace pemaro::frames

@@ -133,4 +133,18 @@ TEST_F(ReplayedFramesTest, AreRefusedWhereThereIsNothingToPlay) {
     EXPECT_EQ(path + " is no recording of touch frames: it does not begin with one", problem);
 }
 
+TEST_F(ReplayedFramesTest, GoOnWhenTheFileIsCutOrWrittenAnew) {
+    const std::vector<std::string> frames = {frame(0, milliseconds(0)), frame(1, milliseconds(10))};
+    const auto replay = open(frames[0] + frames[1]);
+    ASSERT_NE(nullptr, replay) << problem;
+    ReplayedFrames source(replay, 1, true);
+    EXPECT_EQ(frames[0], take(source).second);
+    ASSERT_EQ(0, truncate(path.c_str(), 0));
+    EXPECT_EQ(frames[1], take(source).second);
+    std::ofstream(path, std::ios::binary) << frame(9, milliseconds(0)) << frame(8, milliseconds(1));
+    EXPECT_EQ(frames[0], take(source).second);
+    unlink(path.c_str());
+    EXPECT_EQ(frames[1], take(source).second);
+}
+
 }  // namespace pemaro::simulator

@@ -42,8 +42,10 @@ void append(std::string& bytes, const Value* values, size_t size) {
 int hottestCell(const RecordingFile& file) {
     int hottest = 1;
     for (const RecordingFile::Part& part : file.parts()) {
-        if (part.kind == RecordingFile::Kind::kFrame) {
-            for (const int16_t cell : frames::readFrameContent(file.bytes(part)).image) {
+        const uint8_t* frame =
+                part.kind == RecordingFile::Kind::kFrame ? file.bytes(part) : nullptr;
+        if (frame != nullptr) {
+            for (const int16_t cell : frames::readFrameContent(frame).image) {
                 hottest = std::max<int>(hottest, cell);
             }
         }
@@ -122,7 +124,11 @@ std::string reportFrames(const RecordingFile& file, uint64_t every) {
         if (number++ % every != 0) {
             continue;
         }
-        const frames::FrameContent frame = frames::readFrameContent(file.bytes(part));
+        const uint8_t* found = file.bytes(part);
+        if (found == nullptr) {
+            break;
+        }
+        const frames::FrameContent frame = frames::readFrameContent(found);
         FrameHead head{};
         head.seconds =
                 static_cast<double>(static_cast<int64_t>(part.header.timeNs - firstTime)) / 1e9;
@@ -158,6 +164,10 @@ std::string reportPage(const RecordingFile& file, const FrameSummary& summary, u
     replaceOnce(page, "@SUMMARY@", withoutTags(summaryJson(file, summary)));
     replaceOnce(page, "@PALETTE@", palette());
     replaceOnce(page, "@FRAMES@", base64(deflated(reportFrames(file, every))));
+    if (!file.problem().empty()) {
+        *problem = file.problem();
+        return "";
+    }
     return page;
 }
 

@@ -50,8 +50,11 @@ uint64_t forEachFrame(const RecordingFile& file, const ExportOptions& options,
         }
         const bool isChosen = number >= options.first && number <= options.last &&
                               (number - options.first) % options.every == 0;
-        if (isChosen && !body(number, frames::readFrameContent(file.bytes(part)))) {
-            break;
+        if (isChosen) {
+            const uint8_t* frame = file.bytes(part);
+            if (frame == nullptr || !body(number, frames::readFrameContent(frame))) {
+                break;
+            }
         }
         number += 1;
     }
@@ -135,6 +138,9 @@ int exportFrames(const ExportOptions& options) {
     }
     const int result =
             options.format == "png" ? exportPictures(*file, options) : exportText(*file, options);
+    if (result == tools::kExitSuccess && !file->problem().empty()) {
+        return fail(printable(file->problem()));
+    }
     const std::string damage = damageText(summary);
     return result != tools::kExitSuccess || damage.empty()
                    ? result
