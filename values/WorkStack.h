@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <algorithm>
 #include <cstddef>
 #include <cstring>
 #include <new>
@@ -39,12 +38,6 @@ class WorkStack {
     /// Removes what was pushed last; `size` is not above size().
     void shrink(size_t size) { mEnd = mBegin + size; }
 
-    /// The same, and gives back the room that these had.
-    void shrinkToFit(size_t size) {
-        shrink(size);
-        if (mBegin != inlineRoom()) moveTo(std::max(size, kInline));
-    }
-
   private:
     static_assert(kInline >= 2);
     static constexpr size_t kFew = 1024;
@@ -57,15 +50,8 @@ class WorkStack {
 
     __attribute__((noinline)) void grow() {
         const size_t used = size();
-        moveTo(used < kFew ? 2 * used : used + used / 2);
-    }
-
-    /// Gives the records another room, which they fit into.
-    void moveTo(size_t capacity) {
-        const size_t used = size();
-        T* const begin = capacity <= kInline
-                                 ? inlineRoom()
-                                 : static_cast<T*>(::operator new(capacity * sizeof(T)));
+        const size_t capacity = used < kFew ? 2 * used : used + used / 2;
+        T* const begin = static_cast<T*>(::operator new(capacity * sizeof(T)));
         memcpy(static_cast<void*>(begin), mBegin, used * sizeof(T));
         release();
         mBegin = begin;
