@@ -50,6 +50,14 @@ Plane veins(uint32_t person) {
     return plane;
 }
 
+/// With mean 0 and mean square 1, nearly normal: the sum of three even ones.
+double disturbance(std::minstd_rand& random) {
+    constexpr double kUnit = 1.0 / std::minstd_rand::max();
+    const double sum = static_cast<double>(random()) + static_cast<double>(random()) +
+                       static_cast<double>(random());
+    return 2 * (sum * kUnit - 1.5);
+}
+
 double meanOf(const HandImage& image) {
     return std::accumulate(image.begin(), image.end(), 0.0) / image.size();
 }
@@ -58,7 +66,6 @@ double meanOf(const HandImage& image) {
 
 HandImage seeHand(uint32_t person, double noise, uint32_t variation) {
     std::minstd_rand random(variation + 1);
-    std::normal_distribution<double> disturbance(0, 1);
     const Plane plane = veins(person);
     HandImage image;
     for (size_t i = 0; i < image.size(); ++i) {
