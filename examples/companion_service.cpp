@@ -16,6 +16,7 @@
 #include <atomic>
 #include <chrono>
 #include <cstring>
+#include <memory>
 #include <mutex>
 #include <thread>
 
@@ -28,6 +29,23 @@ constexpr uint32_t kFrameBytes = 64;
 constexpr uint32_t kRingFrames = 64;
 constexpr int kOutputMemory = 1;
 constexpr char kConfiguration[] = "gain=2";
+
+// A recording belongs to its thread and the service. Nobody waits for the thread: what it writes once
+// the service has let go goes into memory that it keeps, and a client that died in its wait, or means
+// ill, can keep it in the signal of a frame for ever.
+struct Recording {
+    const std::unique_ptr<RingWriter> ring = RingWriter::create(kFrameBytes, kRingFrames);
+    bool started = false;
+    std::atomic<bool> stopped{false};
+
+    // A hundred frames a second; one that finds no room is lost. Byte 8 holds a frame's length.
+    void writeFrames() {
+        uint32_t frame[kFrameBytes / sizeof(uint32_t)] = {0, 0, kFrameBytes};
+        for (; !stopped; std::this_thread::sleep_for(std::chrono::milliseconds(10)), ++frame[0]) {
+            ring->put(frame, sizeof(frame));
+        }
+    }
+};
 
 class CompanionService : public BnTouchCompanionService {
   public:
@@ -43,24 +61,26 @@ class CompanionService : public BnTouchCompanionService {
     int prepareRecord() override {
         stopRecord();
         const std::lock_guard<std::mutex> guard(mLock);
-        mRing = RingWriter::create(kFrameBytes, kRingFrames);
-        return mRing != nullptr ? STATUS_NO_ERROR : STATUS_ERROR_ALLOCATING_MEMORY;
+        mRecording = std::make_shared<Recording>();
+        if (mRecording->ring != nullptr) return STATUS_NO_ERROR;
+        mRecording = nullptr;
+        return STATUS_ERROR_ALLOCATING_MEMORY;
     }
     sp<android::IMemory> getCblk() override {
         const std::lock_guard<std::mutex> guard(mLock);
-        return mRing != nullptr ? mRing->memory() : nullptr;
+        return mRecording != nullptr ? mRecording->ring->memory() : nullptr;
     }
     int startRecord() override {
         const std::lock_guard<std::mutex> guard(mLock);
-        if (mRing == nullptr || mWriter.joinable()) return STATUS_INVALID_STATE;
-        mRecording = true;
-        mWriter = std::thread([this] { writeFrames(); });
+        if (mRecording == nullptr || mRecording->started) return STATUS_INVALID_STATE;
+        mRecording->started = true;
+        std::thread([recording = mRecording] { recording->writeFrames(); }).detach();
         return STATUS_NO_ERROR;
     }
     int stopRecord() override {
         const std::lock_guard<std::mutex> guard(mLock);
-        mRecording = false;
-        if (mWriter.joinable()) mWriter.join();
+        if (mRecording != nullptr) mRecording->stopped = true;
+        mRecording = nullptr;
         return STATUS_NO_ERROR;
     }
     size_t getConfigParams(void* buffer, size_t size) override {
@@ -87,18 +107,8 @@ class CompanionService : public BnTouchCompanionService {
     int setAuth(const std::string&) override { return STATUS_UNSUPPORTED; }
 
   private:
-    // A hundred frames a second; one that finds no room is lost. Byte 8 holds a frame's length.
-    void writeFrames() {
-        uint32_t frame[kFrameBytes / sizeof(uint32_t)] = {0, 0, kFrameBytes};
-        for (; mRecording; std::this_thread::sleep_for(std::chrono::milliseconds(10)), ++frame[0]) {
-            mRing->put(frame, sizeof(frame));
-        }
-    }
-
     std::mutex mLock;  // operations come on several of Binder's threads
-    std::unique_ptr<RingWriter> mRing;
-    std::atomic<bool> mRecording{false};
-    std::thread mWriter;
+    std::shared_ptr<Recording> mRecording;
 };
 
 }  // namespace

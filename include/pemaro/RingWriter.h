@@ -30,8 +30,14 @@ namespace pemaro {
 ///
 /// The reader is a process that may die or misbehave at any moment. So nothing in the block is
 /// believed but `read`, and that only as a number; the writer keeps its own copies of the geometry
-/// and of its index. It never waits: it does not take the block's mutex, which a reader that was
-/// killed may hold for ever, and never destroys the mutex or the condition.
+/// and of its index. It does not wait for room, does not take the block's mutex, which a reader that
+/// was killed may hold for ever, and never destroys the mutex or the condition.
+///
+/// One thing it cannot avoid: with a C library that keeps a lock in a condition (glibc, not
+/// bionic), a reader that was killed in its wait may have taken that lock along, and a hostile one
+/// can write its word. Then put(), publish() or remind() never returns from the signal; the frame
+/// is published by then. So call them on a thread that nobody joins without a limit, with no lock
+/// held that others need, and let that thread share in what owns the writer.
 ///
 /// All but memory() is for one thread at a time, which need not be the thread that made the writer.
 /// The class is all in this header; libzelkclient exports nothing of it but the block's constructor.

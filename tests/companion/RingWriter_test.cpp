@@ -2,12 +2,16 @@
 #include "pemaro/RingWriter.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <atomic>
 #include <cstring>
 #include <memory>
 #include <string>
 #include <thread>
+
+#include "binder/PlatformShims.h"
+#include "tests/support/ConditionWords.h"
 
 namespace pemaro::test {
 
@@ -17,7 +21,7 @@ namespace {
 class Reader {
   public:
     explicit Reader(const RingWriter& writer)
-            : block(static_cast<TouchCompanionSharedCblk*>(writer.memory()->pointer())) {}
+            : block(static_cast<TouchCompanionSharedCblk*>(mappedAddress(writer.memory()))) {}
 
     std::string take() {
         const uint32_t slot = block->read - block->bufferFrames * block->readWrap;
@@ -119,7 +123,7 @@ TEST(RingWriter, OutlivedByItsMemory) {
     const android::sp<android::IMemory> memory = writer->memory();
     put(*writer, "a");
     writer.reset();
-    const auto* const block = static_cast<const TouchCompanionSharedCblk*>(memory->pointer());
+    const auto* const block = static_cast<const TouchCompanionSharedCblk*>(mappedAddress(memory));
     EXPECT_EQ(1u, block->write);
 }
 
@@ -181,5 +185,27 @@ TEST(RingWriter, WritesOnWhenTheReaderDiedWithTheMutex) {
     ASSERT_EQ(0, pthread_mutex_lock(&reader.block->mutex));
     EXPECT_TRUE(put(*writer, "a"));
 }
+
+#ifdef __GLIBC__
+// What the header warns of: a reader can keep the signal from ending, but not the frame from coming.
+TEST(RingWriter, WaitsInItsSignalForTheLockThatADeadReaderTookAlong) {
+    const std::unique_ptr<RingWriter> writer = RingWriter::create(16, 2);
+    Reader reader(*writer);
+    dieInWait(reader.block->cond);
+    std::atomic<bool> returned{false};
+    std::thread writing([&] {
+        EXPECT_TRUE(put(*writer, "a"));
+        returned = true;
+    });
+    while (TouchCompanionSharedCblk::acquireIndex(reader.block->write) == 0) {
+        usleep(1000);
+    }
+    EXPECT_EQ("a", reader.take());
+    usleep(50000);
+    EXPECT_FALSE(returned);
+    releaseConditionLock(reader.block->cond);
+    writing.join();
+}
+#endif
 
 }  // namespace pemaro::test

@@ -1,15 +1,28 @@
 // SPDX-License-Identifier: Apache-2.0
 // The example programs against the simulated touch stack.
 
+#include "pemaro/Binder.h"
+
+#include <binder/IServiceManager.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <unistd.h>
 
+#include <chrono>
+#include <future>
 #include <string>
+#include <thread>
+#include <utility>
 #include <vector>
 
+#include "binder/PlatformShims.h"
+#include "pemaro/BnTouchCompanionClient.h"
 #include "pemaro/GestureManagerClient.h"
+#include "pemaro/ITouchCompanionService.h"
 #include "pemaro/Status.h"
+#include "pemaro/TouchCompanionSharedCblk.h"
 #include "tests/driver/DriverSetting.h"
+#include "tests/support/ConditionWords.h"
 #include "tests/support/RecordCollector.h"
 
 using testing::MatchesRegex;
@@ -60,6 +73,48 @@ TEST(ExampleServices, RecordIntoTheRing) {
     const RunResult refused = run({binary("zelkctl"), "session", "save"});
     EXPECT_EQ(1, refused.status);
     EXPECT_THAT(refused.errors, testing::HasSubstr(errStr(STATUS_UNSUPPORTED)));
+}
+
+// Records from whatever companion serves, as a client does that is killed in its wait: the writer stays
+// in the signal of its first frame. True when the service stops that recording all the same.
+bool stopsWithoutItsWriter() {
+    android::sp<ITouchCompanionService> service;
+    EXPECT_EQ(android::OK, android::getService(android::String16("pemaro.TouchService"), &service));
+    service->registerClient(new BnTouchCompanionClient);
+    service->open();
+    service->setRecordParameter(1);
+    service->prepareRecord();
+    const android::sp<android::IMemory> memory = service->getCblk();
+    auto* const block = static_cast<TouchCompanionSharedCblk*>(mappedAddress(memory));
+    dieInWait(block->cond);
+    EXPECT_EQ(0, service->startRecord());
+    while (TouchCompanionSharedCblk::acquireIndex(block->write) == 0) {
+        usleep(1000);
+    }
+    // Should it not come through, the service's end sets the thread free.
+    std::promise<int> stopped;
+    std::future<int> status = stopped.get_future();
+    std::thread([service, stopped = std::move(stopped)]() mutable {
+        stopped.set_value(service->stopRecord());
+    }).detach();
+    const bool inTime = status.wait_for(std::chrono::seconds(15)) == std::future_status::ready;
+    EXPECT_EQ(1u, TouchCompanionSharedCblk::acquireIndex(block->write)) << "nothing held it up";
+    return inTime && status.get() == 0;
+}
+
+TEST(ExampleServices, OutliveAClientThatDiedWithTheConditionsLock) {
+    Service service("companion_service", {binary("zelkctl"), "ping"});
+    ASSERT_TRUE(stopsWithoutItsWriter());
+    const RunResult next = run({binary("client_linked")});
+    EXPECT_EQ(0, next.status) << next.errors;
+    EXPECT_THAT(next.output, testing::HasSubstr("\nrecorded "));
+}
+
+TEST(SimulatedStack, OutlivesAClientThatDiedWithTheConditionsLock) {
+    TouchStack stack;
+    ASSERT_TRUE(stopsWithoutItsWriter());
+    const RunResult next = run({binary("zelkctl"), "record", "--frames", "5"});
+    EXPECT_EQ(0, next.status) << next.errors;
 }
 
 TEST(ExampleServices, ReportGestures) {

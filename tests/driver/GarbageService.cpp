@@ -33,7 +33,9 @@
 #include <thread>
 #include <vector>
 
+#include "binder/PlatformShims.h"
 #include "pemaro/TouchCompanionSharedCblk.h"
+#include "tests/support/ConditionWords.h"
 #include "tools/common/BinderDriver.h"
 
 using android::BBinder;
@@ -107,7 +109,7 @@ class BlockReply : public GarbageService {
     }
 
     [[noreturn]] void moveOn() {
-        auto* block = static_cast<TouchCompanionSharedCblk*>(mMemory->pointer());
+        auto* block = static_cast<TouchCompanionSharedCblk*>(mappedAddress(mMemory));
         for (uint32_t write = 1;; ++write) {
             TouchCompanionSharedCblk::publishIndex(block->write, write);
             pthread_cond_signal(&block->cond);
@@ -117,13 +119,6 @@ class BlockReply : public GarbageService {
 
     const sp<IMemory> mMemory;
 };
-
-// Where glibc keeps in a condition the lock that a writer can take along when it dies, and which
-// clock a wait goes by.
-constexpr size_t kConditionLock = 32;
-constexpr uint32_t kConditionLocked = 1;
-constexpr size_t kConditionFlags = 36;
-constexpr uint32_t kConditionMonotonic = 2;
 
 class RuinedBlock : public GarbageService {
   public:
@@ -138,7 +133,7 @@ class RuinedBlock : public GarbageService {
         }
         reply->writeInt32(code == kGetPacketSize ? static_cast<int32_t>(kFrameBytes) : 0);
         if (code == kStartRecord) {
-            ruin(static_cast<TouchCompanionSharedCblk*>(mMemory->pointer()));
+            ruin(static_cast<TouchCompanionSharedCblk*>(mappedAddress(mMemory)));
         }
     }
 
@@ -146,17 +141,12 @@ class RuinedBlock : public GarbageService {
         if (mWhat == "held-mutex") {
             pthread_mutex_lock(&block->mutex);
         } else if (mWhat == "dead-signal") {
-            setBits(&block->cond, kConditionLock, kConditionLocked);
+            setConditionBits(block->cond, kConditionLock, kConditionLocked);
         } else if (mWhat == "clock") {
-            setBits(&block->cond, kConditionFlags, kConditionMonotonic);
+            setConditionBits(block->cond, kConditionFlags, kConditionMonotonic);
         } else {
             memset(&block->mutex, 0xff, sizeof(block->mutex));
         }
-    }
-
-    static void setBits(pthread_cond_t* condition, size_t offset, uint32_t bits) {
-        auto* word = reinterpret_cast<uint32_t*>(reinterpret_cast<char*>(condition) + offset);
-        __atomic_fetch_or(word, bits, __ATOMIC_SEQ_CST);
     }
 
     const sp<IMemory> mMemory;

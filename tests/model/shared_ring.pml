@@ -1,11 +1,13 @@
 /* SPDX-License-Identifier: Apache-2.0
  *
  * The shared ring of frames as a model for spin: a writer that may die before each of its steps, the
- * client's recording thread, and the caller who stops it.
+ * client's recording thread, the caller who stops it, and a client that dies with both at any moment, whose
+ * recording the service then ends.
  *
  * Each statement is one step, and so is each access to the shared block. That the steps of one side are
  * seen in order by the other is what publishIndex() and acquireIndex() are for. A writer that stands
- * still for ever (SIGSTOP) leaves the same block behind as one that dies, so death stands for both.
+ * still for ever (SIGSTOP) leaves the same block behind as one that dies, so death stands for both. With
+ * CLIENT_DIES it is the client that may die, and nobody stops it before.
  *
  * What is smaller than in the library:
  *   - rings of 1 to 4 frames, all in one run;
@@ -33,6 +35,8 @@
 #define JOINS_FOR_EVER 10     /* the caller waits for the thread without an end */
 #define UNMAPS_TOO_EARLY 11   /* the caller unmaps the block although the thread did not end */
 #define CALLS_AFTERWARDS 12   /* a thread that was left behind goes on delivering */
+#define WRITES_UNDER_MUTEX 13 /* the writer takes the shared mutex */
+#define JOINS_THE_WRITER 14   /* the service waits for the writer's thread without an end */
 
 #define MOST_FRAMES 4
 #define MOST_WAITS 3
@@ -49,7 +53,11 @@ bool mutexHeld;                   /* the shared mutex, held by the writer */
 bool innerHeld;                   /* the C library's lock in the condition, held by the writer in its signal */
 
 bool dead;                        /* the writer */
-bool stopAsked, stopped;          /* stopRecord(): entered, returned */
+bool clientDead;                  /* the recording thread and its caller */
+bool lockTaken, mutexTaken;       /* the client took along: the lock in the condition, the shared mutex */
+bool writerAsked, writerEnded;    /* the writer's thread: asked to end, ended */
+bool served;                      /* the service is done with the dead client */
+bool stopAsked, returned;          /* stopRecord(): entered, returned */
 bool exitPending, threadEnded;    /* the recording thread: asked to end, ended */
 bool waiting, leftBehind;         /* it is in a wait; its caller has given it up there */
 bool mapped = true;
@@ -62,7 +70,9 @@ proctype writer() {
     bool room, takesIt;
     {
         do
+        :: writerAsked -> break
         :: d_step {
+               !writerAsked ->
                held = MINUS(next, read);
                room = (MINUS(write, read) < frames);
                takesIt = (held < frames + (DEFECT == WRITES_INTO_FULL) - (DEFECT == REFUSES_EARLY));
@@ -84,20 +94,43 @@ proctype writer() {
                    next = WRAP(next + 1);
                    write = next       /* publishIndex() */
                }
-               mutexHeld = true;      /* not every service signals under the mutex; this one is the worse */
-               innerHeld = true;
+               /* Not every service signals under the mutex; one that died is the worse for having it. */
+               atomic { DEFECT != WRITES_UNDER_MUTEX || !mutexTaken -> mutexHeld = true };
+signals:       atomic { !lockTaken -> innerHeld = true };
                d_step { signalled = true; innerHeld = false; mutexHeld = false }
            fi
-        od
+        od;
+        writerEnded = true
     } unless { dead }
 }
 
+#ifndef CLIENT_DIES
 proctype killer() {
     if
     :: dead = true
     :: true
     fi
 }
+#else
+/* A client that dies in a wait may be in the C library's lock there, and not every client waits with a mutex of
+ * its own. Its recording the service ends: a writer whose signal does not end is left behind, with the memory. */
+proctype killer() {
+    atomic {
+        clientDead = true;
+        if
+        :: waiting && !innerHeld -> lockTaken = true
+        :: waiting -> mutexTaken = true
+        :: true
+        fi
+    };
+    writerAsked = true;
+    if
+    :: writerEnded
+    :: DEFECT != JOINS_THE_WRITER
+    fi;
+    served = true
+}
+#endif
 
 /* ---- the client ---- */
 
@@ -174,6 +207,7 @@ inline releaseBuffer(count) {
 proctype recordingThread() {
     byte seen, waits, available, untilEnd, taken, slot, i, first;
     bool timedOut;
+    {
     do
     :: exitPending -> break
     :: else ->
@@ -211,6 +245,7 @@ proctype recordingThread() {
         fi
     od;
     threadEnded = true
+    } unless { clientDead }
 }
 
 /* stopRecord(), at any time or never. A thread whose wait is overdue is left behind with all that it needs, and
@@ -225,7 +260,7 @@ proctype caller() {
        :: DEFECT == UNMAPS_TOO_EARLY -> mapped = false
        :: atomic { DEFECT != JOINS_FOR_EVER && waiting -> leftBehind = true }
        fi;
-       stopped = true
+       returned = true
     fi
 }
 
@@ -235,17 +270,25 @@ init {
         run writer();
         run killer();
         run recordingThread();
+#ifndef CLIENT_DIES
         run caller()
+#endif
     }
 }
 
 #define inSignal (dead && innerHeld)   /* the writer died there */
 
+#ifndef CLIENT_DIES
 /* Whatever became of the writer: stopRecord() returns, and the thread ends by itself unless its wait cannot. */
-ltl ends { [] (stopAsked -> (<> stopped && <> (threadEnded || inSignal))) }
+ltl ends { [] (stopAsked -> (<> returned && <> (threadEnded || inSignal))) }
 
 /* What a writer published before it died is delivered, unless it died in its signal. */
 ltl survives { [] (dead -> <> (delivered == write || stopAsked || inSignal)) }
 
 /* A frame in the ring does not wait without end; number 0 stands for all. */
 ltl arrives { [] ((delivered == 0 && write != 0) -> <> (delivered != 0 || stopAsked || inSignal)) }
+#else
+/* Whatever a client took along: the writer's thread ends, unless it is in its signal for the lock; and the service
+ * is done with the client in any case. */
+ltl serves { [] (clientDead -> (<> served && <> (writerEnded || (lockTaken && writer@signals)))) }
+#endif
