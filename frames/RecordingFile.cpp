@@ -17,6 +17,7 @@ constexpr uint64_t kWindowBytes = 1 << 20;
 constexpr uint64_t kSearchBytes = 1 << 16;
 
 constexpr const char* kChanged = "it was changed meanwhile";
+constexpr const char* kGivenUp = "that was given up";
 
 /// Whether these bytes, of which there may be none, begin as a frame does.
 bool beginsAsFrame(const uint8_t* bytes, size_t size) {
@@ -26,10 +27,11 @@ bool beginsAsFrame(const uint8_t* bytes, size_t size) {
 }  // namespace
 
 std::unique_ptr<RecordingFile> RecordingFile::open(const std::string& path, std::string* problem,
+                                                   const Progress& progress,
                                                    size_t maxStreamBytes) {
     std::unique_ptr<RecordingFile> file(new RecordingFile(path));
-    if (file->load(maxStreamBytes)) {
-        file->split();
+    if (file->load(maxStreamBytes, progress)) {
+        file->split(progress);
     }
     if (!file->mProblem.empty()) {
         *problem = file->mProblem;
@@ -38,7 +40,7 @@ std::unique_ptr<RecordingFile> RecordingFile::open(const std::string& path, std:
     return file;
 }
 
-bool RecordingFile::load(size_t maxStreamBytes) {
+bool RecordingFile::load(size_t maxStreamBytes, const Progress& progress) {
     mFd.reset(::open(mPath.c_str(), O_RDONLY | O_CLOEXEC));
     struct stat info {};
     if (!mFd.ok() || fstat(mFd.get(), &info) != 0) {
@@ -49,7 +51,7 @@ bool RecordingFile::load(size_t maxStreamBytes) {
     }
     if (S_ISREG(info.st_mode) && info.st_size != 0) {
         mSize = static_cast<uint64_t>(info.st_size);
-    } else if (!loadStream(maxStreamBytes)) {
+    } else if (!loadStream(maxStreamBytes, progress)) {
         return false;
     }
     if (mSize != 0 && !beginsAt(0) && mProblem.empty()) {
@@ -59,7 +61,7 @@ bool RecordingFile::load(size_t maxStreamBytes) {
 }
 
 /// What is foreign is left as soon as its first bytes are there: it may go on for ever.
-bool RecordingFile::loadStream(size_t maxBytes) {
+bool RecordingFile::loadStream(size_t maxBytes, const Progress& progress) {
     while (true) {
         mWindow.resize(mSize + kSearchBytes);
         const ssize_t got =
@@ -73,6 +75,9 @@ bool RecordingFile::loadStream(size_t maxBytes) {
         }
         if (mSize > maxBytes) {
             return fail("there is no end within " + std::to_string(maxBytes) + " bytes");
+        }
+        if (progress && !progress(mSize, 0)) {
+            return fail(kGivenUp);
         }
     }
     mWindow.resize(mSize);
@@ -116,9 +121,12 @@ const uint8_t* RecordingFile::at(uint64_t offset, uint64_t length) const {
     return mWindow.data();
 }
 
-void RecordingFile::split() {
+void RecordingFile::split(const Progress& progress) {
     for (uint64_t offset = 0; offset < mSize && mProblem.empty(); offset += mParts.back().length) {
         mParts.push_back(partAt(offset));
+        if (progress && !progress(offset, mSize)) {
+            fail(kGivenUp);
+        }
     }
 }
 

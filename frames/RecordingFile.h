@@ -5,6 +5,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -43,9 +44,14 @@ class RecordingFile {
     /// How much is taken of what is no file, and may have no end.
     static constexpr size_t kMaxStreamBytes = size_t{1} << 30;
 
+    /// Told now and then how many bytes were read of how many, which are 0 where that is not known;
+    /// false gives up.
+    using Progress = std::function<bool(uint64_t done, uint64_t total)>;
+
     /// Null, with a sentence about why, for a file that cannot be read or that does not begin as a
     /// recording does. An empty file is a recording without frames.
     static std::unique_ptr<RecordingFile> open(const std::string& path, std::string* problem,
+                                               const Progress& progress = nullptr,
                                                size_t maxStreamBytes = kMaxStreamBytes);
 
     const std::string& path() const { return mPath; }
@@ -63,9 +69,9 @@ class RecordingFile {
   private:
     explicit RecordingFile(const std::string& path) : mPath(path) {}
 
-    bool load(size_t maxStreamBytes);
-    bool loadStream(size_t maxBytes);
-    void split();
+    bool load(size_t maxStreamBytes, const Progress& progress);
+    bool loadStream(size_t maxBytes, const Progress& progress);
+    void split(const Progress& progress);
     Part partAt(uint64_t offset) const;
     uint64_t findIntact(uint64_t offset) const;
     bool isFrameAt(uint64_t offset, FrameHeader* header) const;

@@ -6,13 +6,11 @@
 #include <signal.h>
 
 #include <algorithm>
-#include <chrono>
-#include <functional>
 #include <string>
-#include <thread>
 
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
+#include "tests/support/Terminal.h"
 
 using testing::HasSubstr;
 using testing::MatchesRegex;
@@ -22,53 +20,12 @@ namespace pemaro::test {
 namespace {
 
 // A terminal in which zelkctl watches the frames, until it is let go.
-class Terminal {
+class WatchTerminal : public Terminal {
   public:
     // What the command's environment says, and how large the terminal is.
-    Terminal(const std::string& environment, int columns, int rows) {
-        const RunResult start = tmux({"new-session", "-d", "-x", std::to_string(columns), "-y",
-                                      std::to_string(rows),
-                                      "env " + environment + " " + binary("zelkctl") +
-                                              " frames watch; echo ended with $?; sleep 1000"});
-        EXPECT_EQ(0, start.status) << start.errors;
-    }
-    ~Terminal() { tmux({"kill-server"}); }
-
-    // What stands there, with the escape sequences of colours or without.
-    std::string text(bool withColors = false) {
-        Words words = {"capture-pane", "-p"};
-        if (withColors) {
-            words.emplace_back("-e");
-        }
-        return tmux(words).output;
-    }
-
-    bool await(const std::function<bool(const std::string&)>& shows) {
-        for (int i = 0; i < 600; ++i) {
-            if (shows(text())) {
-                return true;
-            }
-            std::this_thread::sleep_for(std::chrono::milliseconds(100));
-        }
-        return false;
-    }
-
-    bool awaitText(const std::string& part) {
-        return await(
-                [&part](const std::string& seen) { return seen.find(part) != std::string::npos; });
-    }
-
-    void resize(int columns, int rows) {
-        tmux({"resize-window", "-x", std::to_string(columns), "-y", std::to_string(rows)});
-    }
-
-    void interrupt() { tmux({"send-keys", "C-c"}); }
-
-  private:
-    static RunResult tmux(Words words) {
-        words.insert(words.begin(), {"tmux", "-f", "/dev/null", "-L", "frames-watch", "-u"});
-        return run(words);
-    }
+    WatchTerminal(const std::string& environment, int columns, int rows)
+            : Terminal("env " + environment + " " + binary("zelkctl") + " frames watch", columns,
+                       rows) {}
 };
 
 // Fingers and a map of 33 columns and 61 rows.
@@ -82,7 +39,7 @@ const char* const kDensities = ":-=+*#%@";
 
 TEST(FramesWatch, DrawsTheFramesAndLeavesTheTerminalAsItWas) {
     TouchStack touchStack(stackOptions());
-    Terminal terminal("TERM=vt100", 80, 40);
+    WatchTerminal terminal("TERM=vt100", 80, 40);
     ASSERT_TRUE(terminal.awaitText("finger 2 at ")) << terminal.text();
     const std::vector<std::string> lines = splitLines(terminal.text());
     ASSERT_EQ(40u, lines.size());
@@ -116,7 +73,7 @@ TEST(FramesWatch, UsesTheColoursThatThereAre) {
     } rows[] = {{"TERM=tmux-256color COLORTERM=truecolor LC_ALL=C.UTF-8", "\x1b[38;2;"},
                 {"TERM=tmux-256color COLORTERM= LC_ALL=C.UTF-8", "\x1b[38;5;"}};
     for (const auto& row : rows) {
-        Terminal terminal(row.environment, 80, 40);
+        WatchTerminal terminal(row.environment, 80, 40);
         ASSERT_TRUE(terminal.awaitText("▀")) << terminal.text();
         EXPECT_THAT(terminal.text(true), HasSubstr(row.color));
     }
@@ -124,7 +81,7 @@ TEST(FramesWatch, UsesTheColoursThatThereAre) {
 
 TEST(FramesWatch, FollowsTheSizeOfTheTerminal) {
     TouchStack touchStack(stackOptions());
-    Terminal terminal("TERM=vt100", 80, 40);
+    WatchTerminal terminal("TERM=vt100", 80, 40);
     ASSERT_TRUE(terminal.awaitText("finger 2 at "));
     terminal.resize(60, 12);
     // One column of fingers, three lines of them at the bottom; the map has eight lines.

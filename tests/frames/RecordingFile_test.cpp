@@ -10,6 +10,7 @@
 #include <fstream>
 #include <string>
 #include <thread>
+#include <utility>
 #include <vector>
 
 #include "frames/FrameGenerator.h"
@@ -165,13 +166,32 @@ TEST_F(RecordingFileTest, DoesNotTakeAMagicWithinAFrameForOne) {
                         {Kind::kFrame, 2 * kLength, kLength, nullptr}});
 }
 
+TEST_F(RecordingFileTest, TellsHowFarItIsAndIsGivenUp) {
+    write(framesTo(3));
+    std::vector<std::pair<uint64_t, uint64_t>> told;
+    const auto tell = [&told](uint64_t done, uint64_t total) {
+        told.emplace_back(done, total);
+        return told.size() < 3;
+    };
+    EXPECT_EQ(nullptr, RecordingFile::open(path, &problem, tell));
+    EXPECT_EQ("cannot read " + path + ": that was given up", problem);
+    EXPECT_EQ((std::vector<std::pair<uint64_t, uint64_t>>{
+                      {0, 3 * kLength}, {kLength, 3 * kLength}, {2 * kLength, 3 * kLength}}),
+              told);
+}
+
 TEST_F(RecordingFileTest, CanBeReadFromAPipe) {
     ASSERT_EQ(0, mkfifo(path.c_str(), 0600));
     std::thread writer([this] { std::ofstream(path, std::ios::binary) << framesTo(3); });
-    const auto file = RecordingFile::open(path, &problem);
+    uint64_t last = 0;
+    const auto file = RecordingFile::open(path, &problem, [&last](uint64_t done, uint64_t total) {
+        last = total == 0 ? done : last;
+        return true;
+    });
     writer.join();
     ASSERT_NE(nullptr, file) << problem;
     EXPECT_EQ(3u, file->parts().size());
+    EXPECT_EQ(3 * kLength, last);
 }
 
 TEST_F(RecordingFileTest, IsRefusedAtOnceWhenItIsForeignAndEndless) {
@@ -184,7 +204,7 @@ TEST_F(RecordingFileTest, IsRefusedWhenAPipeHasNoEnd) {
     signal(SIGPIPE, SIG_IGN);
     ASSERT_EQ(0, mkfifo(path.c_str(), 0600));
     std::thread writer([this] { std::ofstream(path, std::ios::binary) << framesTo(800); });
-    EXPECT_EQ(nullptr, RecordingFile::open(path, &problem, 700 * kLength));
+    EXPECT_EQ(nullptr, RecordingFile::open(path, &problem, nullptr, 700 * kLength));
     writer.join();
     EXPECT_EQ("cannot read " + path + ": there is no end within 89600 bytes", problem);
 }

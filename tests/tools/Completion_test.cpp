@@ -93,6 +93,8 @@ TEST(BashCompletion, FollowsTheCommandLine) {
              {ZELK_TOOLS_DIR "/common", ZELK_TOOLS_DIR "/completions"}},
             {"touch watch --output", ZELK_TOOLS_DIR "/dem", {ZELK_TOOLS_DIR "/demo"}},
             {"touch watch -o", ZELK_TOOLS_DIR "/dem", {ZELK_TOOLS_DIR "/demo"}},
+            {"frames export --format", "", {"png", "csv", "cells", "json"}},
+            {"frames export file -f", "c", {"csv", "cells"}},
             {"fly", "-", {"--help"}},
     };
     for (const auto& row : rows) {

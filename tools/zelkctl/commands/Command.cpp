@@ -8,6 +8,24 @@
 #include "tools/zelkctl/commands/CommonOptions.h"
 
 namespace pemaro::zelkctl {
+namespace {
+
+std::string join(const std::vector<std::string>& words) {
+    std::string name;
+    for (const std::string& word : words) {
+        name += (name.empty() ? "" : "|") + word;
+    }
+    return name;
+}
+
+std::function<std::string(const std::string&)> isOneOf(const std::vector<std::string>& words) {
+    return [words](const std::string& typed) {
+        const bool known = std::find(words.begin(), words.end(), typed) != words.end();
+        return known ? "" : "'" + typed + "' is neither of them";
+    };
+}
+
+}  // namespace
 
 Command::Command(CLI::App& app, Action& action, const std::string& name, const std::string& help)
         : mApp(app.add_subcommand(name, help)), mAction(action) {}
@@ -47,19 +65,13 @@ Command& Command::operands(const char* word, std::vector<std::string>& values,
 
 Command& Command::choice(std::string& value, const std::vector<std::string>& words,
                          const std::string& help) {
-    std::string name;
-    for (const std::string& word : words) {
-        name += (name.empty() ? "" : "|") + word;
-    }
-    mApp->add_option(name, value, help)
-            ->required()
-            ->check(
-                    [words, name](const std::string& typed) {
-                        const bool known =
-                                std::find(words.begin(), words.end(), typed) != words.end();
-                        return known ? "" : "'" + typed + "' is neither of them";
-                    },
-                    "");
+    mApp->add_option(join(words), value, help)->required()->check(isOneOf(words), "");
+    return *this;
+}
+
+Command& Command::choiceOption(const char* names, std::string& value,
+                               const std::vector<std::string>& words, const std::string& help) {
+    mApp->add_option(names, value, help)->type_name(join(words))->check(isOneOf(words), "");
     return *this;
 }
 
@@ -107,6 +119,11 @@ Command& Command::decimal(const char* names, const char* word, double& value,
 
 Command& Command::flag(const char* names, bool& value, const std::string& help) {
     mApp->add_flag(names, value, help);
+    return *this;
+}
+
+Command& Command::required(const char* name) {
+    mApp->get_option(name)->required();
     return *this;
 }
 

@@ -61,12 +61,17 @@ class Command {
 
     Command& option(const char* names, const char* word, std::string& value,
                     const std::string& help);
+    /// An option that is one of some words.
+    Command& choiceOption(const char* names, std::string& value,
+                          const std::vector<std::string>& words, const std::string& help);
     /// An option whose value `take` reads; what it returns is wrong with it.
     Command& parsed(const char* names, const char* word, const std::string& help,
                     std::function<std::string(const std::string& text)> take);
     Command& decimal(const char* names, const char* word, double& value, const std::string& help,
                      tools::DecimalRange range);
     Command& flag(const char* names, bool& value, const std::string& help);
+    /// An option that has to be there.
+    Command& required(const char* name);
     /// Two options that do not go together.
     Command& excludes(const char* one, const char* other);
 

@@ -2,6 +2,8 @@
 #include "tools/zelkctl/files/FrameReport.h"
 
 #include <fmt/format.h>
+// What is to be packed is not changed.
+#define ZLIB_CONST
 #include <zlib.h>
 
 #include <algorithm>
@@ -12,6 +14,8 @@
 #include "frames/Sequence.h"
 #include "tools/zelkctl/files/ReportTemplate.h"
 #include "tools/zelkctl/terminal/Heat.h"
+#include "tools/zelkctl/terminal/ProgressLine.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -39,20 +43,6 @@ void append(std::string& bytes, const Value* values, size_t size) {
     }
 }
 
-int hottestCell(const RecordingFile& file) {
-    int hottest = 1;
-    for (const RecordingFile::Part& part : file.parts()) {
-        const uint8_t* frame =
-                part.kind == RecordingFile::Kind::kFrame ? file.bytes(part) : nullptr;
-        if (frame != nullptr) {
-            for (const int16_t cell : frames::readFrameContent(frame).image) {
-                hottest = std::max<int>(hottest, cell);
-            }
-        }
-    }
-    return hottest;
-}
-
 std::string base64(const std::string& bytes) {
     constexpr char kDigits[] = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
     std::string text;
@@ -70,12 +60,25 @@ std::string base64(const std::string& bytes) {
     return text;
 }
 
+/// Empty when the command was asked to stop.
 std::string deflated(const std::string& bytes) {
-    uLongf size = compressBound(bytes.size());
-    std::string packed(size, '\0');
-    compress2(reinterpret_cast<Bytef*>(&packed[0]), &size,
-              reinterpret_cast<const Bytef*>(bytes.data()), bytes.size(), Z_BEST_COMPRESSION);
-    packed.resize(size);
+    constexpr uInt kPiece = 1 << 20;
+    ProgressLine progress("packing", "bytes");
+    z_stream stream{};
+    deflateInit(&stream, Z_BEST_COMPRESSION);
+    std::string packed(deflateBound(&stream, bytes.size()), '\0');
+    stream.next_in = reinterpret_cast<const Bytef*>(bytes.data());
+    stream.next_out = reinterpret_cast<Bytef*>(&packed[0]);
+    // All of it fits, so that each piece is taken whole.
+    stream.avail_out = static_cast<uInt>(packed.size());
+    int result = Z_OK;
+    while (result == Z_OK && progress.step(stream.total_in, bytes.size())) {
+        const size_t left = bytes.size() - stream.total_in;
+        stream.avail_in = static_cast<uInt>(std::min<size_t>(left, kPiece));
+        result = deflate(&stream, left <= kPiece ? Z_FINISH : Z_NO_FLUSH);
+    }
+    packed.resize(result == Z_STREAM_END ? stream.total_out : 0);
+    deflateEnd(&stream);
     return packed;
 }
 
@@ -111,7 +114,12 @@ std::string reportFrames(const RecordingFile& file, uint64_t every) {
     uint64_t firstTime = 0;
     uint32_t number = 0;
     uint64_t lost = 0;
+    uint64_t done = 0;
+    ProgressLine progress("collecting", "frames");
     for (const RecordingFile::Part& part : file.parts()) {
+        if (!progress.step(++done, file.parts().size())) {
+            break;
+        }
         if (part.kind != RecordingFile::Kind::kFrame) {
             continue;
         }
@@ -160,14 +168,15 @@ std::string reportPage(const RecordingFile& file, const FrameSummary& summary, u
                                file.size() / 2 / kMaxReportBytes + 1);
         return "";
     }
-    std::string page = kReportTemplate;
-    replaceOnce(page, "@SUMMARY@", withoutTags(summaryJson(file, summary)));
-    replaceOnce(page, "@PALETTE@", palette());
-    replaceOnce(page, "@FRAMES@", base64(deflated(reportFrames(file, every))));
-    if (!file.problem().empty()) {
+    const std::string frames = deflated(reportFrames(file, every));
+    if (mustStop() || !file.problem().empty()) {
         *problem = file.problem();
         return "";
     }
+    std::string page = kReportTemplate;
+    replaceOnce(page, "@SUMMARY@", withoutTags(summaryJson(file, summary)));
+    replaceOnce(page, "@PALETTE@", palette());
+    replaceOnce(page, "@FRAMES@", base64(frames));
     return page;
 }
 

@@ -26,11 +26,12 @@ constexpr uint64_t kMaxReportBytes = uint64_t{256} << 20;
 ///       28     .  fingers x 8 bytes: number, x, y, peak
 ///        .     .  rows x columns bytes: how hot each cell is, from 0 to 254
 ///
-/// Only every so many of them.
+/// Only every so many of them. Shows how far it is.
 std::string reportFrames(const frames::RecordingFile& file, uint64_t every);
 
 /// An HTML page that plays the recording; it needs nothing but itself. Empty, with a sentence about why
-/// in `problem`, when there are no frames, or too many.
+/// in `problem`, when there are no frames, or too many, or when the command was asked to stop. Shows
+/// how far it is.
 std::string reportPage(const frames::RecordingFile& file, const FrameSummary& summary,
                        uint64_t every, std::string* problem);
 

@@ -7,9 +7,11 @@
 #include <cmath>
 #include <numeric>
 
+#include "frames/FrameContent.h"
 #include "frames/Sequence.h"
 #include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Printable.h"
+#include "tools/zelkctl/terminal/ProgressLine.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -142,6 +144,25 @@ FrameSummary summarize(const RecordingFile& file) {
     summary.seconds = static_cast<double>(static_cast<int64_t>(lastTime - firstTime)) / 1e9;
     summary.intervals = spreadOf(std::move(intervals));
     return summary;
+}
+
+int hottestCell(const RecordingFile& file) {
+    ProgressLine progress("looking at the images", "frames");
+    int hottest = 1;
+    uint64_t done = 0;
+    for (const RecordingFile::Part& part : file.parts()) {
+        const uint8_t* frame =
+                part.kind == RecordingFile::Kind::kFrame ? file.bytes(part) : nullptr;
+        if (frame != nullptr) {
+            for (const int16_t cell : frames::readFrameContent(frame).image) {
+                hottest = std::max<int>(hottest, cell);
+            }
+        }
+        if (!progress.step(++done, file.parts().size())) {
+            break;
+        }
+    }
+    return hottest;
 }
 
 std::string summaryText(const RecordingFile& file, const FrameSummary& summary) {

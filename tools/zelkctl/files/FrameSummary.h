@@ -59,6 +59,10 @@ struct FrameSummary {
 
 FrameSummary summarize(const frames::RecordingFile& file);
 
+/// The hottest cell of all frames, at least 1, so that pictures of them can be compared. Shows how far
+/// it is.
+int hottestCell(const frames::RecordingFile& file);
+
 /// Some lines for people, in which the first ten of many are told.
 std::string summaryText(const frames::RecordingFile& file, const FrameSummary& summary);
 

@@ -7,20 +7,10 @@
 #include "tools/zelkctl/terminal/Output.h"
 
 namespace pemaro::zelkctl {
-namespace {
 
-void draw(const std::string& text) {
-    if (wordsDescriptor() == STDOUT_FILENO) {
-        tools::writeOutput(text);
-    } else {
-        // Not worth a word when it fails.
-        [[maybe_unused]] const ssize_t written = write(STDERR_FILENO, text.data(), text.size());
-    }
-}
+LiveLine::LiveLine() : LiveLine(wordsDescriptor()) {}
 
-}  // namespace
-
-LiveLine::LiveLine() : mTerminal(isatty(wordsDescriptor()) != 0) {}
+LiveLine::LiveLine(int fd) : mFd(fd), mTerminal(isatty(fd) != 0) {}
 
 LiveLine::~LiveLine() {
     end();
@@ -33,10 +23,26 @@ void LiveLine::end() {
     mShown = false;
 }
 
+void LiveLine::clear() {
+    if (mTerminal && mShown) {
+        draw("\r\x1b[K");
+    }
+    mShown = false;
+}
+
 void LiveLine::show(const std::string& text) {
     // Back to the first column, and away with what stood there.
     draw(mTerminal ? "\r" + text + "\x1b[K" : text + "\n");
     mShown = true;
+}
+
+void LiveLine::draw(const std::string& text) const {
+    if (mFd == STDOUT_FILENO) {
+        tools::writeOutput(text);
+    } else {
+        // Not worth a word when it fails.
+        [[maybe_unused]] const ssize_t written = write(mFd, text.data(), text.size());
+    }
 }
 
 }  // namespace pemaro::zelkctl

@@ -2,6 +2,7 @@
 #include <memory>
 
 #include "tools/zelkctl/commands/config/ConfigCommands.h"
+#include "tools/zelkctl/files/OutputFile.h"
 #include "tools/zelkctl/services/Companion.h"
 
 namespace pemaro::zelkctl {
@@ -37,10 +38,9 @@ int dump(const std::string& path) {
         if (result != tools::kExitSuccess) {
             return result;
         }
-        const Waiting waiting("while writing " + path);
-        const FileResult written = writeConfigFile(path, bytes);
-        if (!written.isGood()) {
-            return fail("config dump", written);
+        OutputFile file;
+        if (!file.open(path) || !file.write(bytes) || !file.close()) {
+            return fail("config dump", file.result());
         }
         sayResult(fmt::format("configuration of {} bytes written to {}", bytes.size(),
                               path == kStandardOutput ? "the standard output" : path),

@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include <sys/stat.h>
+#include <unistd.h>
 
-#include <CLI/CLI.hpp>
-#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <functional>
@@ -11,14 +10,18 @@
 
 #include "frames/FrameContent.h"
 #include "frames/RecordingFile.h"
-#include "tools/zelkctl/commands/CommonOptions.h"
+#include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
+#include "tools/zelkctl/commands/frames/OpenRecording.h"
 #include "tools/zelkctl/files/FramePicture.h"
 #include "tools/zelkctl/files/FrameSummary.h"
 #include "tools/zelkctl/files/FrameText.h"
 #include "tools/zelkctl/files/OutputFile.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Printable.h"
+#include "tools/zelkctl/terminal/ProgressLine.h"
 #include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -26,23 +29,25 @@ namespace {
 using frames::FrameContent;
 using frames::RecordingFile;
 
-constexpr uint64_t kMaxNumber = 1000000000000;
+constexpr int64_t kMaxNumber = 1000000000000;
 constexpr unsigned kMaxScale = 64;
 
 struct ExportOptions {
     std::string path;
     std::string format;
-    std::string output;
+    std::string output = kStandardOutput;
     uint64_t first = 0;
     uint64_t last = kMaxNumber;
     uint64_t every = 1;
     unsigned scale = PictureStyle().scale;
 };
 
-/// Runs `body` with each frame that was asked for and its number, until it returns false; how many
-/// frames the file has.
-uint64_t forEachFrame(const RecordingFile& file, const ExportOptions& options,
-                      const std::function<bool(uint64_t, const FrameContent&)>& body) {
+/// Runs `body` with each frame that was asked for and its number, until it returns false or the
+/// command is asked to stop.
+void forEachFrame(const RecordingFile& file, const ExportOptions& options,
+                  const std::function<bool(uint64_t, const FrameContent&)>& body) {
+    const bool showsData = options.output == kStandardOutput && isatty(STDOUT_FILENO) != 0;
+    ProgressLine progress("exporting", "frames", !showsData);
     uint64_t number = 0;
     for (const RecordingFile::Part& part : file.parts()) {
         if (part.kind != RecordingFile::Kind::kFrame) {
@@ -57,20 +62,10 @@ uint64_t forEachFrame(const RecordingFile& file, const ExportOptions& options,
             }
         }
         number += 1;
-    }
-    return number;
-}
-
-/// The hottest cell of the whole recording, so that pictures can be compared.
-int hottestCell(const RecordingFile& file) {
-    int hottest = 1;
-    forEachFrame(file, {}, [&hottest](uint64_t, const FrameContent& frame) {
-        for (const int16_t cell : frame.image) {
-            hottest = std::max<int>(hottest, cell);
+        if (!progress.step(number, file.parts().size())) {
+            break;
         }
-        return true;
-    });
-    return hottest;
+    }
 }
 
 int exportPictures(const RecordingFile& file, const ExportOptions& options) {
@@ -97,17 +92,21 @@ int exportPictures(const RecordingFile& file, const ExportOptions& options) {
         drawn += 1;
         return true;
     });
+    if (problem.empty()) {
+        problem = file.problem();
+    }
     if (!problem.empty()) {
         return fail(printable(problem));
     }
-    fmt::print(stderr, "{} pictures in {}{}\n", drawn, printable(options.output),
-               without == 0 ? "" : fmt::format(", {} frames have no image", without));
-    return tools::kExitSuccess;
+    tools::writeError(
+            fmt::format("{} pictures in {}{}", drawn, printable(options.output),
+                        without == 0 ? "" : fmt::format(", {} frames have no image", without)));
+    return mustStop() ? failStopped() : tools::kExitSuccess;
 }
 
 int exportText(const RecordingFile& file, const ExportOptions& options) {
     OutputFile output;
-    if (!output.open(options.output.empty() ? "-" : options.output)) {
+    if (!output.open(options.output)) {
         return fail(printable(output.problem()));
     }
     const auto text = options.format == "csv"     ? fingersCsv
@@ -122,14 +121,20 @@ int exportText(const RecordingFile& file, const ExportOptions& options) {
     forEachFrame(file, options, [&](uint64_t number, const FrameContent& frame) {
         return output.write(text(number, frame));
     });
+    if (mustStop() && output.result().isGood()) {
+        return failStopped();
+    }
+    if (!file.problem().empty()) {
+        return fail(printable(file.problem()));
+    }
     return output.close() ? tools::kExitSuccess : fail(printable(output.problem()));
 }
 
 int exportFrames(const ExportOptions& options) {
-    std::string problem;
-    const auto file = RecordingFile::open(options.path, &problem);
+    int exitStatus = tools::kExitSuccess;
+    const auto file = openRecording(options.path, exitStatus);
     if (file == nullptr) {
-        return fail(printable(problem));
+        return exitStatus;
     }
     const FrameSummary summary = summarize(*file);
     if (options.first >= summary.frames) {
@@ -138,9 +143,6 @@ int exportFrames(const ExportOptions& options) {
     }
     const int result =
             options.format == "png" ? exportPictures(*file, options) : exportText(*file, options);
-    if (result == tools::kExitSuccess && !file->problem().empty()) {
-        return fail(printable(file->problem()));
-    }
     const std::string damage = damageText(summary);
     return result != tools::kExitSuccess || damage.empty()
                    ? result
@@ -148,44 +150,33 @@ int exportFrames(const ExportOptions& options) {
                                       printable(options.path), damage));
 }
 
-void check(const ExportOptions& options) {
+std::string problemOf(const ExportOptions& options) {
     if (options.first > options.last) {
-        throw CLI::ValidationError("--first", "is behind --last");
+        return "--first: is behind --last";
     }
-    if (options.format == "png" && (options.output.empty() || options.output == "-")) {
-        throw CLI::ValidationError("--output", "pictures need a folder");
-    }
+    return options.format == "png" && options.output == kStandardOutput
+                   ? "--output: pictures need a folder"
+                   : "";
 }
 
 }  // namespace
 
 void addFramesExportCommand(CLI::App& frames, Action& action) {
     auto options = std::make_shared<ExportOptions>();
-    CLI::App* command =
-            frames.add_subcommand("export", "Make pictures, tables or JSON of a recording");
-    command->add_option("FILE", options->path, "The recording")->required();
-    command->add_option("-f,--format", options->format,
-                        "png (a heat map of each frame), csv (the fingers), cells (the images as "
-                        "CSV) or json (all, a line for each frame)")
-            ->required()
-            ->check(CLI::IsMember({"png", "csv", "cells", "json"}));
-    command->add_option("-o,--output", options->output,
-                        "Folder for the pictures, or file for all else (standard output)")
-            ->type_name("FILE");
-    command->add_option("--first", options->first, "First frame, counted from 0")
-            ->check(CLI::Range(uint64_t{0}, kMaxNumber));
-    command->add_option("--last", options->last, "Last frame")
-            ->check(CLI::Range(uint64_t{0}, kMaxNumber));
-    command->add_option("--every", options->every, "Only every so many frames")
-            ->check(CLI::Range(uint64_t{1}, kMaxNumber));
-    command->add_option("--scale", options->scale, "Pixels of a cell of a picture")
-            ->check(CLI::Range(1u, kMaxScale))
-            ->capture_default_str();
-    addCommonOptions(*command);
-    command->callback([options, &action] {
-        check(*options);
-        action = [options] { return exportFrames(*options); };
-    });
+    Command(frames, action, "export", "Make pictures, tables or JSON of a recording")
+            .operand("FILE", options->path, "The recording")
+            .choiceOption("-f,--format", options->format, {"png", "csv", "cells", "json"},
+                          "png (a heat map of each frame), csv (the fingers), cells (the images as "
+                          "CSV) or json (all, a line for each frame)")
+            .required("--format")
+            .option("-o,--output", "FILE", options->output,
+                    "Folder for the pictures, or file for all else (the standard output)")
+            .number("--first", options->first, "First frame, counted from 0", {0, kMaxNumber})
+            .number("--last", options->last, "Last frame", {0, kMaxNumber})
+            .number("--every", options->every, "Only every so many frames", {1, kMaxNumber})
+            .number("--scale", options->scale, "Pixels of a cell of a picture (8)", {1, kMaxScale})
+            .check([options] { return problemOf(*options); })
+            .runs([options] { return exportFrames(*options); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,15 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <CLI/CLI.hpp>
 #include <memory>
 #include <string>
 
-#include "frames/RecordingFile.h"
-#include "tools/zelkctl/commands/CommonOptions.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
+#include "tools/zelkctl/commands/frames/OpenRecording.h"
 #include "tools/zelkctl/files/FrameReport.h"
 #include "tools/zelkctl/files/OutputFile.h"
 #include "tools/zelkctl/terminal/Printable.h"
 #include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -21,18 +20,25 @@ struct ReportOptions {
 };
 
 int makeReport(const ReportOptions& options) {
-    std::string problem;
-    const auto file = frames::RecordingFile::open(options.path, &problem);
+    int exitStatus = tools::kExitSuccess;
+    const auto file = openRecording(options.path, exitStatus);
     if (file == nullptr) {
-        return fail(printable(problem));
+        return exitStatus;
+    }
+    OutputFile output;
+    if (!output.open(options.output)) {
+        return fail(printable(output.problem()));
     }
     const FrameSummary summary = summarize(*file);
+    std::string problem;
     const std::string page = reportPage(*file, summary, options.every, &problem);
+    if (mustStop()) {
+        return failStopped();
+    }
     if (page.empty()) {
         return fail(fmt::format("{}: {}", printable(options.path), problem));
     }
-    OutputFile output;
-    if (!output.open(options.output) || !output.write(page) || !output.close()) {
+    if (!output.write(page) || !output.close()) {
         return fail(printable(output.problem()));
     }
     const std::string damage = damageText(summary);
@@ -45,16 +51,13 @@ int makeReport(const ReportOptions& options) {
 
 void addFramesReportCommand(CLI::App& frames, Action& action) {
     auto options = std::make_shared<ReportOptions>();
-    CLI::App* command =
-            frames.add_subcommand("report", "Make a page for a browser that plays a recording");
-    command->add_option("FILE", options->path, "The recording")->required();
-    command->add_option("-o,--output", options->output, "File to write the page to")
-            ->type_name("FILE")
-            ->required();
-    command->add_option("--every", options->every, "Only every so many frames")
-            ->check(CLI::Range(uint64_t{1}, uint64_t{1000000}));
-    addCommonOptions(*command);
-    command->callback([options, &action] { action = [options] { return makeReport(*options); }; });
+    Command(frames, action, "report", "Make a page for a browser that plays a recording")
+            .operand("FILE", options->path, "The recording")
+            .option("-o,--output", "FILE", options->output,
+                    "File to write the page to; - is the standard output")
+            .required("--output")
+            .number("--every", options->every, "Only every so many frames", {1, 1000000})
+            .runs([options] { return makeReport(*options); });
 }
 
 }  // namespace pemaro::zelkctl

@@ -2,9 +2,9 @@
 #include <memory>
 #include <string>
 
-#include "frames/RecordingFile.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
+#include "tools/zelkctl/commands/frames/OpenRecording.h"
 #include "tools/zelkctl/files/FrameSummary.h"
 #include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Printable.h"
@@ -19,10 +19,10 @@ struct StatOptions {
 };
 
 int showStat(const StatOptions& options) {
-    std::string problem;
-    const auto file = frames::RecordingFile::open(options.path, &problem);
+    int exitStatus = tools::kExitSuccess;
+    const auto file = openRecording(options.path, exitStatus);
     if (file == nullptr) {
-        return fail(printable(problem));
+        return exitStatus;
     }
     const FrameSummary summary = summarize(*file);
     if (settings().json) {

@@ -175,6 +175,17 @@ TEST_F(FramesExport, TellsWhatItCannotWrite) {
               framesCommand({"export", path, "-f", "png", "-o", "/no/such/folder"}).errors);
 }
 
+TEST_F(FramesExport, LeavesAFileAloneWhenThereIsNothingGoodToWrite) {
+    const std::string file = recordings.write("precious", "precious");
+    const std::string foreign = recordings.write("foreign", "no frame at all");
+    for (const std::string& recording : {foreign, recordings.path("none")}) {
+        EXPECT_EQ(1, framesCommand({"export", recording, "-f", "csv", "-o", file}).status);
+        EXPECT_EQ(1, framesCommand({"report", recording, "-o", file}).status);
+    }
+    EXPECT_EQ(1, framesCommand({"export", path, "-f", "csv", "-o", file, "--first", "7"}).status);
+    EXPECT_EQ("precious", recordings.read("precious"));
+}
+
 TEST_F(FramesExport, TakesWhatIsIntactOfADamagedRecording) {
     std::string bytes = recordings.frames({0, 1, 2});
     bytes[RecordingToLookInto::kLength + 100] ^= 1;
@@ -193,9 +204,7 @@ TEST_F(FramesExport, RefusesWhatMakesNoSense) {
         int status;
         std::string error;
     } rows[] = {
-            {{"-f", "gif"},
-             2,
-             "zelkctl: --format: gif not in {png,csv,cells,json} (--help tells more)\n"},
+            {{"-f", "gif"}, 2, "zelkctl: --format: 'gif' is neither of them (--help tells more)\n"},
             {{}, 2, "zelkctl: --format is required (--help tells more)\n"},
             {{"-f", "png"}, 2, "zelkctl: --output: pictures need a folder (--help tells more)\n"},
             {{"-f", "csv", "--first", "5", "--last", "2"},
