@@ -36,7 +36,7 @@ run_lint() {
 }
 
 lint_format() {
-    cpp_sources | xargs -d '\n' clang-format --dry-run --Werror --
+    cpp_sources | xargs -d '\n' -n 50 -P "$(nproc)" clang-format --dry-run --Werror --
 }
 
 # Templates, *.in, are no scripts yet.
@@ -50,12 +50,14 @@ shell_sources() {
 }
 
 lint_shellcheck() {
-    shell_sources | xargs -d '\n' shellcheck --
+    shell_sources | xargs -d '\n' -n 8 -P "$(nproc)" shellcheck --
 }
 
 # The macros that it would have to find in the platform's headers and in ours.
 lint_cppcheck() {
-    cppcheck --quiet --error-exitcode=1 --std=c++17 --enable=warning,performance,portability \
+    mkdir -p build/lint/cppcheck
+    cppcheck --quiet -j "$(nproc)" --cppcheck-build-dir=build/lint/cppcheck --error-exitcode=1 \
+        --std=c++17 --enable=warning,performance,portability \
         --suppressions-list=cmake/cppcheck-suppressions -I include -I . \
         -D'DECLARE_META_INTERFACE(name)=' -D'IMPLEMENT_META_INTERFACE(name, text)=' \
         -D'IMPLEMENT_STUB(name, rows)=' -D'IMPLEMENT_SUBSCRIPTION(name, client)=' \
