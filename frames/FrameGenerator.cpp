@@ -77,16 +77,18 @@ void FrameGenerator::drawFinger(const FingerRecord& finger, uint8_t* image) cons
             const size_t cell = (down.first + row) * mColumns + across.first + column;
             int16_t value;
             memcpy(&value, image + cell * sizeof(value), sizeof(value));
-            const float add = finger.peak * down.weights[row] * across.weights[column];
-            value = static_cast<int16_t>(std::min(value + add, 32767.0f));
+            const float add =
+                    static_cast<float>(finger.peak) * down.weights[row] * across.weights[column];
+            value = static_cast<int16_t>(std::min(static_cast<float>(value) + add, 32767.0f));
             memcpy(image + cell * sizeof(value), &value, sizeof(value));
         }
     }
 }
 
 FrameGenerator::Axis FrameGenerator::bell(uint32_t position, uint32_t cells) {
-    const float centre = static_cast<float>(position) * (cells - 1) / kPositionMax;
-    const auto nearest = static_cast<uint32_t>(centre + 0.5f);
+    const float centre =
+            static_cast<float>(position) * static_cast<float>(cells - 1) / kPositionMax;
+    const auto nearest = static_cast<uint32_t>(std::lround(centre));
     Axis axis;
     axis.first = nearest > kReach ? nearest - kReach : 0;
     const uint32_t end = std::min(nearest + kReach + 1, cells);

@@ -28,6 +28,8 @@ int writeRead(binder_write_read& transfer) {
     transfer.read_consumed = 0;
     const uint32_t answer = BR_DEAD_REPLY;
     if (transfer.read_size >= sizeof(answer)) {
+        // The driver's interface has addresses as numbers.
+        // NOLINTNEXTLINE(performance-no-int-to-ptr)
         memcpy(reinterpret_cast<void*>(transfer.read_buffer), &answer, sizeof(answer));
         transfer.read_consumed = sizeof(answer);
     }

@@ -10,13 +10,13 @@ Looks at the sources without running them, and fails for every finding:
   - format: C++ sources that ./dev format would change;
   - shellcheck: all shell scripts;
   - cppcheck: the library, frames/, simulator/, tools/ and testkit/;
-  - clang-tidy: the library, as .clang-tidy says. It is not repeated for sources that it found clean.
+  - clang-tidy: the library, frames/, simulator/ and testkit/, as .clang-tidy says. It is not repeated for sources that it found clean.
 What is overlooked is named with its reason: in cmake/cppcheck-suppressions, in .clang-tidy, or as NOLINT.
 TEXT
 }
 
 LINT_STEPS=(format shellcheck cppcheck clang_tidy)
-LINT_LIBRARY=(values binder companion managers)
+LINT_TIDY=(values binder companion managers frames simulator testkit)
 
 command_lint() {
     (($# == 0)) || die_usage "lint takes no argument"
@@ -62,7 +62,7 @@ lint_cppcheck() {
         -D'DECLARE_META_INTERFACE(name)=' -D'IMPLEMENT_META_INTERFACE(name, text)=' \
         -D'IMPLEMENT_STUB(name, rows)=' -D'IMPLEMENT_SUBSCRIPTION(name, client)=' \
         -D'IMPLEMENT_MANAGER_CALLBACK(name, text, operation, record, texts)=' -DZELK_API= -DZELK_LOCAL= \
-        "${LINT_LIBRARY[@]}" frames simulator tools testkit
+        "${LINT_TIDY[@]}" tools
 }
 
 lint_clang_tidy() {
@@ -71,12 +71,12 @@ lint_clang_tidy() {
     clean=$ROOT/build/lint/$(
         {
             cat .clang-tidy build/release/compile_commands.json
-            git ls-files --cached --others --exclude-standard -- include "${LINT_LIBRARY[@]}" | xargs -d '\n' cat --
+            git ls-files --cached --others --exclude-standard -- include "${LINT_TIDY[@]}" | xargs -d '\n' cat --
         } | sha256sum | cut -c 1-16
     )
     if [[ ! -e $clean ]]; then
-        printf '%s\n' "${LINT_LIBRARY[@]/%//*.cpp}" | xargs -I '{}' bash -c 'printf "%s\n" {}' |
-            xargs -d '\n' -n 1 -P "$(nproc)" \
+        find "${LINT_TIDY[@]}" -name '*.cpp' -print0 |
+            xargs -0 -n 1 -P "$(nproc)" \
                 clang-tidy -p build/release --quiet --warnings-as-errors='*' 2>/dev/null || return
         mkdir -p -- "${clean%/*}"
         : >"$clean"

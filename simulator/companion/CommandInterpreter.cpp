@@ -41,7 +41,7 @@ bool getNumbers(const SerializableMap& params, std::vector<int>& numbers) {
     if (text.find_first_of("\"{") != std::string::npos || text.find('[', 1) != std::string::npos) {
         return false;
     }
-    const int present = text == "[]" ? 0 : 1 + std::count(text.begin(), text.end(), ',');
+    const auto present = text == "[]" ? 0 : 1 + std::count(text.begin(), text.end(), ',');
     if (present != count) {
         return false;
     }

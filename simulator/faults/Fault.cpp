@@ -77,7 +77,7 @@ constexpr std::string_view kOperations[] = {
         "hand.disableWakeup",
 };
 
-constexpr long kMaxDelayMs = 3600 * 1000;
+constexpr long kMaxDelayMs = 3600L * 1000;
 
 /// False when `name` names no operation of any service.
 bool readOperation(const std::string& name, Fault* fault) {

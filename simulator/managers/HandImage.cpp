@@ -28,7 +28,8 @@ std::array<std::complex<double>, kCells> turns(double perCell, double phase) {
 
 /// The sum of a few waves in directions of the person's own, with mean square 1 or about.
 Plane veins(uint32_t person) {
-    std::minstd_rand random(2654435761u * (person + 1));
+    const uint32_t seed = 2654435761u * (person + 1);
+    std::minstd_rand random(seed);
     const auto upTo = [&random](double high) {
         return std::uniform_real_distribution<double>(0, high)(random);
     };
@@ -59,7 +60,7 @@ double disturbance(std::minstd_rand& random) {
 }
 
 double meanOf(const HandImage& image) {
-    return std::accumulate(image.begin(), image.end(), 0.0) / image.size();
+    return std::accumulate(image.begin(), image.end(), 0.0) / static_cast<double>(image.size());
 }
 
 }  // namespace

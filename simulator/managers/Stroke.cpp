@@ -62,7 +62,7 @@ Path resample(const Path& path, size_t count) {
     size_t segment = 1;
     double before = 0;  // the way up to the segment
     for (size_t i = 0; i < count; ++i) {
-        const double wanted = length * i / (count - 1);
+        const double wanted = length * static_cast<double>(i) / static_cast<double>(count - 1);
         double here = distance(path[segment - 1], path[segment]);
         while (segment + 1 < path.size() && before + here < wanted) {
             before += here;
