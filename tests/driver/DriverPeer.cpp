@@ -3,13 +3,19 @@
 
 #include <binder/IServiceManager.h>
 #include <gtest/gtest.h>
+#include <time.h>
+#include <unistd.h>
+#include <utils/SystemClock.h>
+#include <utils/Timers.h>
 
+#include <algorithm>
 #include <memory>
 
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FaultyServices.h"
 #include "tests/faults/Operations.h"
 #include "tests/faults/Peer.h"
+#include "tests/support/FakeWaits.h"
 
 namespace pemaro::test {
 
@@ -38,11 +44,34 @@ class DriverPeer : public Peer {
                   binder(kServices[0])->transact(kOrderTransaction, data, &reply));
     }
 
+    bool awaitStalled() override {
+        for (int i = 0; i < 10000; ++i) {
+            android::Parcel data;
+            android::Parcel reply;
+            binder(kServices[0])->transact(kStalledTransaction, data, &reply);
+            if (reply.readInt32() != 0) {
+                return true;
+            }
+            usleep(1000);
+        }
+        return false;
+    }
+
+    void kill() override {
+        mProcess.reset();
+        for (const char* name : kServices) {
+            while (binder(name) != nullptr) {
+                usleep(1000);
+            }
+        }
+    }
+
     sp<android::IBinder> binder(const std::string& service) override {
         return android::defaultServiceManager()->checkService(android::String16(service.c_str()));
     }
 
   private:
+    FakeWaits mWaits;
     std::unique_ptr<ChildProcess> mProcess;
 };
 
@@ -54,3 +83,14 @@ Peer& Peer::instance() {
 }
 
 }  // namespace pemaro::test
+
+// In place of libutils' and the C library's: where a service is absent, the platform looks for it for five
+// seconds, with a second's sleep between, and some clients have it look ten times.
+int64_t android::uptimeMillis() {
+    return systemTime(SYSTEM_TIME_MONOTONIC) / 10000;  // a hundred times as fast
+}
+
+extern "C" int usleep(useconds_t micros) {
+    const timespec time = {0, std::min<long>(micros, 10000) * 1000};
+    return nanosleep(&time, nullptr);
+}

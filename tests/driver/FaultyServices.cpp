@@ -10,10 +10,10 @@
 #include <unistd.h>
 
 #include <cstdio>
-#include <mutex>
 
 #include "tests/driver/FaultyServices.h"
 #include "tests/faults/Operations.h"
+#include "tests/faults/OrderedAnswers.h"
 #include "tools/common/BinderDriver.h"
 
 namespace pemaro::test {
@@ -25,8 +25,7 @@ using android::sp;
 using android::status_t;
 using android::String16;
 
-std::mutex gLock;
-Order gOrder;
+OrderedAnswers gAnswers;
 
 class FaultyService : public android::BBinder {
   public:
@@ -35,20 +34,16 @@ class FaultyService : public android::BBinder {
             return BBinder::onTransact(code, data, reply, flags);
         }
         if (code == kOrderTransaction) {
-            std::lock_guard<std::mutex> lock(gLock);
-            gOrder = readOrder(data);
+            gAnswers.order(readOrder(data));
             return android::NO_ERROR;
         }
-        Order order;
-        {
-            std::lock_guard<std::mutex> lock(gLock);
-            order = gOrder;
+        if (code == kStalledTransaction) {
+            return reply->writeInt32(gAnswers.stalled());
         }
-        if (order.deadly == Order::kAnyCall || order.deadly == code) {
+        if (!gAnswers.answer(code, reply)) {
             _exit(0);
         }
-        usleep(static_cast<useconds_t>(order.delayMillis) * 1000);
-        return reply->write(order.reply.data(), order.reply.size());
+        return android::NO_ERROR;
     }
 };
 

@@ -5,6 +5,7 @@
 
 #include "pemaro/testkit/FakeServiceManager.h"
 #include "tests/faults/Operations.h"
+#include "tests/faults/OrderedAnswers.h"
 #include "tests/faults/Peer.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/RecordingBinder.h"
@@ -23,24 +24,34 @@ class NativePeer : public Peer {
             sp<RecordingBinder>& binder = mBinders[name];
             if (binder == nullptr || !binder->isBinderAlive()) {
                 binder = new RecordingBinder;
+                binder->handle([this](uint32_t code, const Parcel&, Parcel* reply) {
+                    if (mAnswers.answer(code, reply)) {
+                        return android::status_t{android::NO_ERROR};
+                    }
+                    die();
+                    return android::status_t{android::DEAD_OBJECT};
+                });
                 mServices->add(name, binder);
             }
         }
         order({});
     }
 
-    void order(const Order& order) override {
-        for (const auto& entry : mBinders) {
-            const sp<RecordingBinder> binder = entry.second;
-            binder->handle([this, order](uint32_t code, const Parcel&, Parcel* reply) {
-                if (order.deadly == Order::kAnyCall || order.deadly == code) {
-                    die();
-                    return android::status_t{android::DEAD_OBJECT};
-                }
-                usleep(static_cast<useconds_t>(order.delayMillis) * 1000);
-                return reply->setData(order.reply.data(), order.reply.size());
-            });
+    void order(const Order& order) override { mAnswers.order(order); }
+
+    bool awaitStalled() override {
+        for (int i = 0; mAnswers.stalled() == 0 && i < 10000; ++i) {
+            usleep(1000);
         }
+        return mAnswers.stalled() != 0;
+    }
+
+    void kill() override {
+        die();
+        for (const char* name : kServices) {
+            mServices->remove(name);
+        }
+        mBinders.clear();
     }
 
     sp<android::IBinder> binder(const std::string& service) override {
@@ -57,6 +68,7 @@ class NativePeer : public Peer {
 
     ScopedServiceManager mServices;
     FakeWaits mWaits;
+    OrderedAnswers mAnswers;
     std::map<std::string, sp<RecordingBinder>> mBinders;
 };
 

@@ -10,10 +10,11 @@ failures=0
 
 cd -- "$here/../.."
 cp -r --parents -- include companion/ITouchCompanionService.cpp managers docs/*-protocol.md simulator/faults \
-    fuzz/proxies_fuzzer.cpp tools/zelkctl/conformance tests/companion tests/managers "$folder"
+    fuzz/proxies_fuzzer.cpp tools/zelkctl tests/companion tests/managers tests/faults \
+    tests/install/consumer "$folder"
 cd -- "$folder"
 
-# forget FILE SED-COMMAND: what a contributor may forget.
+# forget FILE SED-COMMAND [NAMED]: what a contributor may forget; the file is named, or what NAMED says.
 forget() {
     cp -- "$1" "$folder/saved"
     sed -i "$2" "$1"
@@ -23,8 +24,8 @@ forget() {
     elif "$here/check-interfaces" "$folder" 2>"$folder/log"; then
         echo "not noticed: '$2' in $1" >&2
         failures=$((failures + 1))
-    elif ! grep -q -F "$1" "$folder/log"; then
-        echo "$1 is not named: $(<"$folder/log")" >&2
+    elif ! grep -q -F "${3:-$1}" "$folder/log"; then
+        echo "${3:-$1} is not named: $(<"$folder/log")" >&2
         failures=$((failures + 1))
     fi
     mv -- "$folder/saved" "$1"
@@ -38,6 +39,12 @@ forget() {
     forget docs/manager-protocol.md 's/`GET_MAXUSER`/`GET_MAX_USER`/'
     forget managers/IHandBiometricManagerService.cpp 's/"SCAN transact received/"scan transact received/'
     forget tools/zelkctl/conformance/Operations.cpp 's/^ *28,$/27,/'
+    forget tools/zelkctl/conformance/Operations.cpp '/"setSecurity of no level"/d'
+    forget tools/zelkctl/conformance/Operations.cpp 's/, 12 renameProfile//'
+    forget tests/faults/Operations.cpp '/hand->scan()/d'
+    forget tests/faults/Faults_test.cpp '/->pingService/d'
+    forget tests/install/consumer/Clients.cpp 's/&C::setAuth/nullptr/'
+    forget tools/zelkctl/commands/hand/HandSecurityCommand.cpp 's/setSecurity//' tools/zelkctl
     forget fuzz/proxies_fuzzer.cpp '/deleteGesture/d'
     forget tests/companion/ITouchCompanionService_test.cpp '/Service::setAuth/d'
     forget tests/companion/BnTouchCompanionService_test.cpp 's/{"saveSession", 26/{"saveSession", 99/'

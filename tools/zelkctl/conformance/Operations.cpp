@@ -121,6 +121,8 @@ std::string fieldProblem(const Parcel& reply, char field, int32_t* status) {
 
 }  // namespace
 
+// Each transaction is called here, or a comment tells by its code why it is not: check-interfaces
+// looks for it.
 const std::vector<CheckedInterface>& checkedInterfaces() {
     static const std::vector<CheckedInterface> interfaces = {
             {CheckedService::kCompanion,
@@ -142,6 +144,12 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      {25, "sendCommand of none", emptyMap, "Sm", Harm::kState},
                      {26, "saveSession", none, "Si", Harm::kState},
                      {27, "restoreSession of none", noSuch, "S", Harm::kState},
+                     // Parts of a recording, which has checks of its own (RecordingChecks.cpp):
+                     // 1 registerClient, 2 unregisterClient, 3 open, 4 getCblk, 5 prepareRecord,
+                     // 6 startRecord, 7 stopRecord.
+                     // They write over what somebody keeps: 8 setRecordFile, 11 reloadConfig,
+                     // 12 reloadConfig, 18 saveConfig, 19 saveConfig, 21 setConfigParams.
+                     // They take something from the others: 10 close, 28 setAuth.
              }},
             {CheckedService::kTouch,
              "touch",
@@ -154,6 +162,9 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      {4, "isEnabled of no feature", noSuch, "bS", Harm::kNone},
                      {5, "enable of no feature", noSuch, "S", Harm::kState},
                      {6, "disable of no feature", noSuch, "S", Harm::kState},
+                     // In SubscriptionChecks.cpp: 1 subscribe, 2 unsubscribe.
+                     // No region is none, and there is no asking for the one in force:
+                     // 7 configure_vm_region.
              }},
             {CheckedService::kGesture,
              "gesture",
@@ -167,6 +178,9 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      {9, "enableGesture of none", noSuch, "S", Harm::kState},
                      {10, "disableGesture of none", noSuch, "S", Harm::kState},
                      {11, "improveGestureTraining of nothing", emptyGesture, "iS", Harm::kState},
+                     // In SubscriptionChecks.cpp: 1 subscribe, 2 unsubscribe.
+                     // A switch whose state cannot be asked for and put back: 3 enableWakeup,
+                     // 4 disableWakeup, 5 startGestureDetection, 6 stopGestureDetection.
              }},
             {CheckedService::kHand,
              "hand",
@@ -177,6 +191,12 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      {14, "getProfileList", none, "nS", Harm::kNone},
                      {9, "setSecurity of no level", noSuch, "S", Harm::kState},
                      {11, "deleteProfile of none", noName, "S", Harm::kState},
+                     // In SubscriptionChecks.cpp: 1 subscribe, 2 unsubscribe.
+                     // Somebody's hand is asked for: 3 startEnrollment, 4 stopEnrollment, 5 scan,
+                     // 6 startMatching, 7 stopMatching, 8 cancelScan.
+                     // No name is refused by all: 10 setProfileName, 12 renameProfile.
+                     // A switch whose state cannot be asked for and put back: 15 enableWakeup,
+                     // 16 disableWakeup.
              }},
     };
     return interfaces;
