@@ -5,10 +5,13 @@
 #include <algorithm>
 #include <utility>
 
-#include "tools/zelkctl/commands/CommonOptions.h"
+#include "tools/common/Number.h"
+#include "tools/zelkctl/terminal/Settings.h"
 
 namespace pemaro::zelkctl {
 namespace {
+
+constexpr tools::DecimalRange kTimeouts{0.001, 1e6};
 
 std::string join(const std::vector<std::string>& words) {
     std::string name;
@@ -147,6 +150,23 @@ void Command::runs(Action run) {
         }
         action = run;
     });
+}
+
+void addCommonOptions(CLI::App& app) {
+    // Bound by hand: a command that was not named must not undo what zelkctl itself was told.
+    app.add_flag_function(
+            "--json", [](int64_t) { settings().json = true; },
+            "Print results and errors as JSON, one object a line");
+    app.add_option(
+               "--timeout",
+               [](const CLI::results_t& words) {
+                   settings().timeout = tools::parseDecimal(words[0], kTimeouts).value_or(0);
+                   return true;
+               },
+               "Give a call up after so many seconds, and exit with 4")
+            ->type_name("SECONDS")
+            ->check([](const std::string& text) { return tools::decimalProblem(text, kTimeouts); },
+                    "");
 }
 
 CLI::App& addGroup(CLI::App& app, const char* name, const char* help) {

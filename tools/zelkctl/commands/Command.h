@@ -89,6 +89,9 @@ class Command {
     std::function<std::string()> mCheck;
 };
 
+/// The options that zelkctl itself and all commands have; they fill in the settings.
+void addCommonOptions(CLI::App& app);
+
 /// A word in front of other commands, which are added to what is returned.
 CLI::App& addGroup(CLI::App& app, const char* name, const char* help);
 

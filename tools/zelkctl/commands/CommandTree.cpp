@@ -4,7 +4,6 @@
 #include <CLI/CLI.hpp>
 
 #include "tools/zelkctl/commands/Commands.h"
-#include "tools/zelkctl/commands/CommonOptions.h"
 #include "tools/zelkctl/terminal/Settings.h"
 
 namespace pemaro::zelkctl {

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
 
-#include <CLI/CLI.hpp>
-
 namespace pemaro::zelkctl {
 
 void addFramesCommands(CLI::App& app, Action& action) {
