@@ -5,6 +5,9 @@
 # How long a command may take to end after it was told to, before it is killed.
 VM_GRACE_SECONDS=5
 
+# The processors of the guest.
+VM_PROCESSORS=2
+
 # How long the guest may take to boot, on a very busy machine.
 VM_BOOT_SECONDS=180
 
@@ -221,7 +224,7 @@ vm_watch_boot() {
 vm_qemu_arguments() {
     local build
     build=$(<"$VM_EXCHANGE/build")
-    VM_QEMU=(-nodefaults -display none -no-reboot -smp 2 -m 2048
+    VM_QEMU=(-nodefaults -display none -no-reboot -smp "$VM_PROCESSORS" -m 2048
         -kernel "$VM_KERNEL/vmlinuz" -initrd "$VM_INITRAMFS"
         # servicemanager asks for its callers' security contexts, which exist only with SELinux on.
         -append "console=ttyS0 quiet panic=-1 lsm=selinux selinux=1"

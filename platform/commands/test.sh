@@ -109,6 +109,7 @@ stage_dev() {
 stage_driver() {
     build_preset release
     ctest_arguments release driver "$1"
+    CTEST_ARGUMENTS+=(--parallel "$VM_PROCESSORS")
     "$ROOT/dev" vm --timeout "$DRIVER_TESTS_TIMEOUT" ctest "${CTEST_ARGUMENTS[@]}"
 }
 

@@ -11,8 +11,8 @@ namespace pemaro::test {
 
 // Tests over the real Binder driver. A program that links this library has a servicemanager of its
 // own while its tests run, and Binder threads of its own; where the driver cannot be used, the
-// program fails with one sentence and runs no test. One machine has one service manager: such
-// programs run one after another.
+// program fails with one sentence and runs no test. Two such programs that run at once need a Binder
+// device each (with-own-driver).
 
 /// The path of a program of this build, and of one of the platform's.
 std::string binary(const std::string& name);
