@@ -2,6 +2,11 @@
 # targets only and is never exported.
 find_package(Threads REQUIRED)
 
+# ccache takes precompiled headers only where it is told to overlook things, and then gains nothing by them.
+if(CMAKE_CXX_COMPILER_LAUNCHER MATCHES "ccache")
+  set(CMAKE_DISABLE_PRECOMPILE_HEADERS ON)
+endif()
+
 add_library(zelk_options INTERFACE)
 add_library(zelk::options ALIAS zelk_options)
 target_compile_options(zelk_options INTERFACE -Wall -Wextra -fno-strict-aliasing)
