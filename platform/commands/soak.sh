@@ -8,7 +8,8 @@ usage: ./dev soak [--minutes N] [--seed SEED]
 
 Lets some hundred clients record, command and watch for N minutes, 5 if not told, over the real Binder driver (see
 ./dev vm), in rounds, while they and the service are stopped, continued and killed at random. Checks that each
-frame is accounted for, that every client ends when it is told to, and that the service uses no more than before.
+frame is accounted for, that every client ends when it is told to, and that neither the clients nor the service use
+more than before.
 The same seed, 1 if not told, makes the same choices.
 TEXT
 }

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstdio>
 #include <fstream>
 #include <iterator>
 #include <string>
@@ -31,6 +32,17 @@ int countLines(const std::string& path) {
                                        std::istreambuf_iterator<char>(), '\n'));
 }
 
+int residentKiB(const std::string& process) {
+    std::ifstream file(process + "/status");
+    for (std::string line; std::getline(file, line);) {
+        int size = 0;
+        if (sscanf(line.c_str(), "VmRSS: %d", &size) == 1) {
+            return size;
+        }
+    }
+    return 0;
+}
+
 }  // namespace
 
 ProcessUsage::ProcessUsage(pid_t pid) {
@@ -38,6 +50,7 @@ ProcessUsage::ProcessUsage(pid_t pid) {
     threads = countEntries(process + "/task");
     descriptors = countEntries(process + "/fd");
     mappings = countLines(process + "/maps");
+    memoryKiB = residentKiB(process);
 }
 
 void expectNoGrowth(const ProcessUsage& before, const ProcessUsage& after, int leeway) {

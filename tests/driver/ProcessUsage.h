@@ -12,6 +12,7 @@ struct ProcessUsage {
     int threads;
     int descriptors;
     int mappings;
+    int memoryKiB;  ///< resident
 };
 
 /// Each has grown by less than `leeway`: Binder's threads and the heaps of the allocator come and

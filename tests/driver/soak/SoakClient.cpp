@@ -20,6 +20,7 @@
 #include "pemaro/HandBiometricManagerClient.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
+#include "pemaro/TouchCompanionSharedCblk.h"
 #include "pemaro/TouchManagerClient.h"
 #include "simulator/managers/GestureRecord.h"
 #include "simulator/managers/HandRecord.h"
@@ -43,6 +44,9 @@ class Client {
     int record();
     int command();
     int watch();
+
+    /// When everything of the work is let go of. What the driver has a part in goes a little later.
+    void tellUsageAfterwards();
 
   private:
     int upTo(int most) { return std::uniform_int_distribution<int>(0, most)(mRandom); }
@@ -83,14 +87,51 @@ class Client {
     void commandOnce(TouchCompanionClient& client);
     void checkUsage();
 
+    static void tellUsage(test::SoakUsage& usage) {
+        const test::ProcessUsage now(getpid());
+        usage.threads = now.threads;
+        usage.mappings = now.mappings;
+        usage.memoryKiB = now.memoryKiB;
+        usage.descriptors = now.descriptors;
+    }
+
+    void ready() {
+        tellUsage(mReport.atWork);
+        mReport.ready = 1;
+    }
+
     SoakReport& mReport;
     std::mt19937 mRandom;
+    const TouchCompanionSharedCblk* mBlock = nullptr;
     test::SoakRecording* mRecording = nullptr;
     uint32_t mNextSequence = 0;
     std::optional<test::ProcessUsage> mUsage;
 };
 
+void Client::tellUsageAfterwards() {
+    for (int i = 0; i < 500; ++i) {
+        tellUsage(mReport.afterwards);
+        if (mReport.ready == 0 || mReport.afterwards.descriptors <= mReport.atWork.descriptors) {
+            return;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+}
+
+/// What is in the ring comes, one frame after another: the index tells of each that it is the next. So
+/// those whose numbers are missing were not written, for want of room.
 void Client::take(const void* frame, size_t bytes) {
+    if (mRecording->received == 0) {
+        // A recording has a ring of its own, and its first frame is the first in there.
+        mBlock = reinterpret_cast<const TouchCompanionSharedCblk*>(
+                static_cast<const uint8_t*>(frame) - kTouchCompanionRingOffset);
+    }
+    mRecording->written = TouchCompanionSharedCblk::acquireIndex(mBlock->write);
+    if (mBlock->read != mRecording->received) {
+        mReport.fail("frame " + std::to_string(mRecording->received) +
+                     " of the ring is the reader's number " + std::to_string(mBlock->read));
+        return;
+    }
     frames::FrameHeader header{};
     const char* fault = frames::frameFault(frame, bytes);
     if (fault != nullptr || !frames::readFrameHeader(frame, bytes, &header)) {
@@ -111,7 +152,7 @@ int Client::record() {
     if (!check("init", client->init()) || !check("setRecordOutput", client->setRecordOutput(1))) {
         return 0;
     }
-    mReport.ready = 1;
+    ready();
     while (gStop == 0) {
         mRecording = &mReport.recording[mReport.recordings % SoakReport::kMostRecordings];
         mNextSequence = 0;
@@ -193,7 +234,7 @@ int Client::command() {
     if (!check("init", client->init())) {
         return 0;
     }
-    mReport.ready = 1;
+    ready();
     while (gStop == 0) {
         commandOnce(*client);
         pause(20);
@@ -217,7 +258,7 @@ int Client::watch() {
         check("init", gesture.back()->init());
         check("init", hand.back()->init());
     }
-    mReport.ready = 1;
+    ready();
     while (gStop == 0) {
         const auto which = static_cast<size_t>(upTo(static_cast<int>(hand.size()) - 1));
         check("enable", touch[which]->enable(1 + upTo(3)));
@@ -260,6 +301,7 @@ int main(int argc, char** argv) {
                        : role == "commander" ? client.command()
                        : role == "watcher"   ? client.watch()
                                              : 2;
+    client.tellUsageAfterwards();
     // Binder's threads are still at work: nothing of what they use may be destroyed.
     _exit(status);
 }

@@ -12,6 +12,13 @@ namespace pemaro::test {
 struct SoakRecording {
     std::atomic<uint64_t> received;  ///< frames that came, all of them intact
     std::atomic<uint64_t> missing;   ///< sequence numbers left out between them
+    std::atomic<uint64_t>
+            written;  ///< frames in the ring so far, as its index told with the last of them
+};
+
+/// What a soak client used, as ProcessUsage has it.
+struct SoakUsage {
+    std::atomic<int> threads, descriptors, mappings, memoryKiB;
 };
 
 /// What a soak client has to tell, in a file that it and the test have mapped.
@@ -22,6 +29,8 @@ struct SoakReport {
     std::atomic<uint64_t> operations;  ///< done so far
     std::atomic<uint64_t> events;      ///< gestures and hand events that came, all of them intact
     std::atomic<uint32_t> recordings;  ///< started with success
+    SoakUsage atWork;                  ///< when it was ready
+    SoakUsage afterwards;  ///< when it had let go of everything, zeros where it was killed
     SoakRecording recording[kMostRecordings];
     char problem[256];  ///< the first thing that should not have happened
 
