@@ -50,7 +50,7 @@ vm --verbose true|unknown option '--verbose'
 fuzz nothing|unknown target 'nothing'
 fuzz --seconds|--seconds needs a number
 fuzz --seconds 1h|'1h' is not a number of seconds
-fuzz --fast|unknown option '--fast'
+fuzz --quick|unknown option '--quick'
 coverage values|coverage takes no argument
 mutate --count|--count needs a number
 mutate --count all|--count needs a number
