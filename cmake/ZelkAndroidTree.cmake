@@ -9,6 +9,7 @@ set(ZELK_BP_LIBRARIES
   "android::base=shared_libs:libbase"
   "PNG::PNG=shared_libs:libpng"
   "ZLIB::ZLIB=shared_libs:libz"
+  "PkgConfig::LIBEVDEV=shared_libs:libevdev"
   "fmt::fmt=static_libs:libfmtlib"
   "CLI11::CLI11=header_libs:libcli11_headers"
   "GTest::gmock=static_libs:libgmock"

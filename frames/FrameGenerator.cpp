@@ -8,12 +8,10 @@
 namespace pemaro::frames {
 namespace {
 
-constexpr uint32_t kPositionMax = 65535;
 constexpr uint32_t kMaxSide = 65535;
 /// A finger touches this many cells to each side of its centre.
 constexpr uint32_t kReach = 3;
 constexpr float kSigma = 1.3f;
-constexpr int16_t kPeak = 1200;
 
 FingerRecord fingerAt(uint32_t id, double seconds) {
     const double x = std::sin(2 * M_PI * (0.31 + 0.07 * id) * seconds + id);
@@ -22,7 +20,7 @@ FingerRecord fingerAt(uint32_t id, double seconds) {
     finger.id = static_cast<uint16_t>(id);
     finger.x = static_cast<uint16_t>((0.5 + 0.45 * x) * kPositionMax);
     finger.y = static_cast<uint16_t>((0.5 + 0.45 * y) * kPositionMax);
-    finger.peak = static_cast<int16_t>(kPeak - 60 * (id % 8));
+    finger.peak = static_cast<int16_t>(kFingerPeak - 60 * (id % 8));
     return finger;
 }
 
@@ -40,6 +38,17 @@ FrameGenerator::FrameGenerator(uint32_t frameBytes, uint32_t fingers) {
 
 const std::vector<uint8_t>& FrameGenerator::draw(uint32_t sequence, uint64_t timeNs,
                                                  uint32_t filter) {
+    mMoving.clear();
+    for (uint32_t id = 0; id < mFingers; ++id) {
+        mMoving.push_back(fingerAt(id, static_cast<double>(timeNs) / 1e9));
+    }
+    return draw(sequence, timeNs, filter, mMoving);
+}
+
+const std::vector<uint8_t>& FrameGenerator::draw(uint32_t sequence, uint64_t timeNs,
+                                                 uint32_t filter,
+                                                 const std::vector<FingerRecord>& fingers) {
+    const size_t shown = std::min<size_t>(fingers.size(), mFingers);
     FrameHeader header{};
     header.magic = kFrameMagic;
     header.version = kFrameVersion;
@@ -47,20 +56,20 @@ const std::vector<uint8_t>& FrameGenerator::draw(uint32_t sequence, uint64_t tim
     header.sequence = sequence;
     header.timeNs = timeNs;
     header.filter = filter;
-    header.fingers = static_cast<uint16_t>((filter & kFilterFingers) != 0 ? mFingers : 0);
+    header.fingers = static_cast<uint16_t>((filter & kFilterFingers) != 0 ? shown : 0);
     header.columns = static_cast<uint16_t>((filter & kFilterImage) != 0 ? mColumns : 0);
     header.rows = static_cast<uint16_t>((filter & kFilterImage) != 0 ? mRows : 0);
     const size_t image = sizeof(header) + header.fingers * sizeof(FingerRecord);
     header.length = static_cast<uint32_t>(image + sizeof(int16_t) * header.columns * header.rows);
 
     mFrame.assign(header.length, 0);
-    for (uint32_t id = 0; id < mFingers; ++id) {
-        const FingerRecord finger = fingerAt(id, static_cast<double>(timeNs) / 1e9);
+    for (size_t i = 0; i < shown; ++i) {
         if (header.fingers != 0) {
-            memcpy(&mFrame[sizeof(header) + id * sizeof(finger)], &finger, sizeof(finger));
+            memcpy(&mFrame[sizeof(header) + i * sizeof(FingerRecord)], &fingers[i],
+                   sizeof(FingerRecord));
         }
         if (header.rows != 0) {
-            drawFinger(finger, &mFrame[image]);
+            drawFinger(fingers[i], &mFrame[image]);
         }
     }
     memcpy(mFrame.data(), &header, sizeof(header));

@@ -8,15 +8,25 @@
 
 namespace pemaro::frames {
 
-/// Draws the frames of a recording: fingers that move along Lissajous figures over a panel of as
-/// many cells as the frame has room for, each finger a bell of capacitance around its position.
+/// The last position across the panel, and the peak of a finger that presses firmly.
+constexpr uint32_t kPositionMax = 65535;
+constexpr int16_t kFingerPeak = 1200;
+
+/// Draws the frames of a recording: fingers over a panel of as many cells as the frame has room for,
+/// each a bell of capacitance around its position.
 class FrameGenerator {
   public:
-    /// REQUIRES: frameBytes >= sizeof(FrameHeader). Fingers that do not fit are left out.
+    /// REQUIRES: frameBytes >= sizeof(FrameHeader). There is room for so many fingers; those that do
+    /// not fit are left out.
     FrameGenerator(uint32_t frameBytes, uint32_t fingers);
 
-    /// The next frame, valid until the next call; its size is the frame's length.
+    /// The next frame, valid until the next call; its size is the frame's length. As many fingers as
+    /// there is room for move along Lissajous figures.
     const std::vector<uint8_t>& draw(uint32_t sequence, uint64_t timeNs, uint32_t filter);
+
+    /// The same with these fingers.
+    const std::vector<uint8_t>& draw(uint32_t sequence, uint64_t timeNs, uint32_t filter,
+                                     const std::vector<FingerRecord>& fingers);
 
   private:
     struct Axis {
@@ -30,6 +40,7 @@ class FrameGenerator {
     uint32_t mFingers;
     uint32_t mColumns;
     uint32_t mRows;
+    std::vector<FingerRecord> mMoving;
     std::vector<uint8_t> mFrame;
 };
 

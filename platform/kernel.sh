@@ -2,9 +2,9 @@
 # Debian's kernel with the Binder driver, and the initramfs that starts it. Sourced by ./dev.
 # shellcheck shell=bash disable=SC2153,SC2034 # variables shared with ./dev and vm.sh
 
-# In the order in which they are loaded.
+# In the order in which they are loaded. Input devices are made by tests.
 KERNEL_MODULES=(virtio_ring virtio virtio_pci_modern_dev virtio_pci_legacy_dev virtio_pci
-    virtio_console netfs fscache 9pnet 9pnet_virtio 9p binder_linux)
+    virtio_console netfs fscache 9pnet 9pnet_virtio 9p evdev uinput binder_linux)
 
 VM_KERNEL=$ZELK_CACHE/kernel/bookworm-$(printf '%s\n' "${KERNEL_MODULES[@]}" | short_hash)
 

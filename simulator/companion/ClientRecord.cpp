@@ -8,6 +8,7 @@
 #include "simulator/companion/FileWriter.h"
 #include "simulator/companion/GeneratedFrames.h"
 #include "simulator/companion/ReplayedFrames.h"
+#include "simulator/touchscreen/TouchScreen.h"
 
 namespace pemaro::simulator {
 namespace {
@@ -18,6 +19,11 @@ constexpr int kOutputMemory = 1;
 std::unique_ptr<FrameSource> makeSource(const SimulatorOptions& options) {
     if (options.replay != nullptr) {
         return std::make_unique<ReplayedFrames>(options.replay, options.speed, options.loop);
+    }
+    if (const auto& screen = options.touchScreen; screen != nullptr) {
+        return std::make_unique<GeneratedFrames>(
+                frames::FrameGenerator(options.frameBytes, screen->maxFingers()), options.rate,
+                [screen] { return screen->fingers(); });
     }
     return std::make_unique<GeneratedFrames>(
             frames::FrameGenerator(options.frameBytes, options.fingers), options.rate);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <functional>
 #include <utility>
 #include <vector>
 
@@ -12,9 +13,14 @@ namespace pemaro::simulator {
 /// Frames without end that a generator draws, so many a second.
 class GeneratedFrames : public FrameSource {
   public:
-    /// A rate of 0 is as fast as there is room.
-    GeneratedFrames(frames::FrameGenerator generator, double rate)
-            : mGenerator(std::move(generator)), mPeriod(rate > 0 ? 1e9 / rate : 0) {}
+    using Fingers = std::function<std::vector<frames::FingerRecord>()>;
+
+    /// A rate of 0 is as fast as there is room. The fingers are those that `fingers` tells at that
+    /// time, or, where it is null, the generator's.
+    GeneratedFrames(frames::FrameGenerator generator, double rate, Fingers fingers = nullptr)
+            : mGenerator(std::move(generator)),
+              mPeriod(rate > 0 ? 1e9 / rate : 0),
+              mFingers(std::move(fingers)) {}
 
     bool isPaced() const override { return mPeriod > 0; }
 
@@ -25,13 +31,16 @@ class GeneratedFrames : public FrameSource {
 
     Frame next(uint32_t sequence, uint64_t timeNs, uint32_t filter) override {
         mDrawn += 1;
-        const std::vector<uint8_t>& frame = mGenerator.draw(sequence, timeNs, filter);
+        const std::vector<uint8_t>& frame =
+                mFingers ? mGenerator.draw(sequence, timeNs, filter, mFingers())
+                         : mGenerator.draw(sequence, timeNs, filter);
         return {frame.data(), frame.size()};
     }
 
   private:
     frames::FrameGenerator mGenerator;
     const double mPeriod;  ///< nanoseconds
+    const Fingers mFingers;
     uint64_t mDrawn = 0;
 };
 

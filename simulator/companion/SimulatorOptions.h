@@ -13,6 +13,7 @@
 namespace pemaro::simulator {
 
 class Replay;
+class TouchScreen;
 
 /// Debug commands without numbers, each with what yields the lines of its answer. Called with the
 /// service's lock held.
@@ -33,6 +34,8 @@ struct SimulatorOptions {
     uint32_t frameBytes = 4096;  ///< the packet size, and a slot of the ring
     uint32_t ringFrames = 64;    ///< slots of the ring
     uint32_t fingers = 3;
+    /// Whose fingers are drawn, if set; then `fingers` means nothing.
+    std::shared_ptr<TouchScreen> touchScreen;
     /// Played instead of drawing frames, if set; no frame of it is longer than frameBytes. Then `rate`,
     /// `fingers` and the record filter mean nothing.
     std::shared_ptr<const Replay> replay;

@@ -11,8 +11,10 @@
 #include <algorithm>
 #include <atomic>
 #include <chrono>
+#include <memory>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "simulator/TouchStack.h"
@@ -22,12 +24,14 @@
 #include "tools/common/Number.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/touchstack/Registrar.h"
+#include "tools/touchstack/Source.h"
 
 using pemaro::simulator::Fault;
 using pemaro::simulator::ManagerOptions;
 using pemaro::simulator::Replay;
 using pemaro::simulator::ServiceKind;
 using pemaro::simulator::SimulatorOptions;
+using pemaro::simulator::TouchScreen;
 using pemaro::simulator::TouchStack;
 using pemaro::tools::kExitFailure;
 using pemaro::tools::kExitSuccess;
@@ -35,12 +39,13 @@ using pemaro::touchstack::Registrar;
 
 namespace {
 
-/// How often the service manager is looked after.
-constexpr timespec kManagerPeriod{0, 500000000};
+/// How often the service manager and a source are looked after.
+constexpr timespec kPeriod{0, 500000000};
 
 struct CommandLine {
     TouchStack::Options options;
     std::string replayPath;
+    std::string source;
     bool hasFrameBytes = false;
     std::vector<Fault> faults;
     bool showLog = false;
@@ -113,7 +118,7 @@ void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
             ->allow_extra_args(false);
 }
 
-void addReplayOptions(CLI::App& app, CommandLine& line) {
+void addSourceOptions(CLI::App& app, CommandLine& line) {
     SimulatorOptions& options = line.options.companion;
     CLI::Option* replay = app.add_option("--replay", line.replayPath,
                                          "A recording to play, bit for bit and at its own pace, "
@@ -125,6 +130,12 @@ void addReplayOptions(CLI::App& app, CommandLine& line) {
             ->check(decimal(0, SimulatorOptions::kMaxSpeed), "")
             ->capture_default_str();
     app.add_flag("--loop", options.loop, "Play it again and again")->needs(replay);
+    app.add_option("--source", line.source,
+                   "Whose fingers to draw instead of moving some: evdev:DEVICE, a touch screen of "
+                   "this machine; list prints which there are, and exits")
+            ->excludes(replay)
+            ->excludes("--fingers")
+            ->check(pemaro::touchstack::sourceProblem, "");
 }
 
 void addManagerOptions(CLI::App& app, ManagerOptions& options) {
@@ -215,10 +226,15 @@ void describeReplay(const CommandLine& line) {
 }
 
 void describeDrawing(const SimulatorOptions& options) {
+    if (options.touchScreen != nullptr) {
+        tell("source      " + pemaro::touchstack::describeSource(*options.touchScreen));
+    }
     const std::string rate =
             options.rate > 0 ? fmt::format("{:g} frames/s", options.rate) : std::string(kUnpaced);
-    tell(fmt::format("frames      {} bytes, {}, {} fingers", options.frameBytes, rate,
-                     options.fingers));
+    const std::string fingers = options.touchScreen == nullptr
+                                        ? fmt::format("{} fingers", options.fingers)
+                                        : "the source's fingers";
+    tell(fmt::format("frames      {} bytes, {}, {}", options.frameBytes, rate, fingers));
 }
 
 void describeFrames(const CommandLine& line) {
@@ -260,6 +276,22 @@ sigset_t stopSignals() {
     return signals;
 }
 
+/// Tells once that the touch screen whose fingers are drawn is gone.
+class SourceWatch {
+  public:
+    explicit SourceWatch(std::shared_ptr<TouchScreen> screen) : mScreen(std::move(screen)) {}
+
+    void check() {
+        if (mScreen != nullptr && mScreen->isLost()) {
+            tell(fmt::format("lost        {}; frames go on without fingers", mScreen->path()));
+            mScreen.reset();
+        }
+    }
+
+  private:
+    std::shared_ptr<TouchScreen> mScreen;
+};
+
 int serve(CommandLine& line) {
     // Blocked before the first thread is made, so that only sigtimedwait below sees them.
     const sigset_t signals = stopSignals();
@@ -282,8 +314,10 @@ int serve(CommandLine& line) {
     describe(line);
 
     Registrar registrar(stack.services(), tell);
-    while (sigtimedwait(&signals, nullptr, &kManagerPeriod) < 0) {
+    SourceWatch source(line.options.companion.touchScreen);
+    while (sigtimedwait(&signals, nullptr, &kPeriod) < 0) {
         registrar.check();
+        source.check();
     }
     stack.shutDown();
     for (const std::string& text : stack.summary()) {
@@ -307,7 +341,7 @@ int main(int argc, char** argv) {
     CommandLine line;
     Texts texts;
     addOptions(app, line, texts);
-    addReplayOptions(app, line);
+    addSourceOptions(app, line);
     addManagerOptions(app, line.options.managers);
     const auto done = pemaro::tools::parseCommandLine(app, argc, argv, [&] {
         readServices(texts.services, line.options.services);
@@ -318,7 +352,13 @@ int main(int argc, char** argv) {
         return *done;
     }
     line.hasFrameBytes = app.count("--frame-bytes") != 0;
-    const std::string problem = openReplay(line);
+    if (line.source == "list") {
+        return pemaro::touchstack::listSources();
+    }
+    std::string problem = openReplay(line);
+    if (problem.empty()) {
+        line.options.companion.touchScreen = pemaro::touchstack::openSource(line.source, &problem);
+    }
     if (!problem.empty()) {
         return fail(problem);
     }
