@@ -13,6 +13,7 @@
 
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
+#include "tests/support/Terminal.h"
 
 using testing::HasSubstr;
 using testing::MatchesRegex;
@@ -214,6 +215,76 @@ TEST(ManagerCommands, TellHandEventsInWords) {
     const RunResult stopped = zelkctl({"hand", "match", "--stop"});
     EXPECT_EQ(1, stopped.status);
     EXPECT_THAT(stopped.errors, HasSubstr("Invalid state"));
+}
+
+TEST(ManagerCommands, WaitForTheEndOfAnActivity) {
+    TouchStack stack({"--hand-rate", "50", "--hand-profiles", "1"});
+    const std::string start = "[0-9:]{8}\\.[0-9]{3}  #[0-9]+  ";
+    // Without a profile no hand is like one.
+    const RunResult stranger = zelkctl({"hand", "match", "--wait"});
+    EXPECT_EQ(1, stranger.status);
+    EXPECT_EQ("zelkctl: not matched\n", stranger.errors);
+
+    const RunResult enrolled = zelkctl({"hand", "enroll", "--wait"});
+    EXPECT_EQ(0, enrolled.status) << enrolled.errors;
+    const std::vector<std::string> steps = splitLines(enrolled.output);
+    ASSERT_EQ(7u, steps.size());
+    EXPECT_THAT(steps[2], MatchesRegex(start + "enrollment progress, 40 %"));
+    EXPECT_THAT(steps[6], MatchesRegex(start + "enrollment done as hand 1"));
+
+    const RunResult matched = zelkctl({"hand", "match", "--wait", "--json"});
+    EXPECT_EQ(0, matched.status) << matched.errors;
+    EXPECT_THAT(splitLines(matched.output).back(), HasSubstr("\"name\":\"matched\""));
+    EXPECT_EQ(0, zelkctl({"hand", "scan", "--wait"}).status);
+    // Nothing is left switched on, and what is refused is no wait.
+    EXPECT_THAT(zelkctl({"command", "handstate"}).output, HasSubstr("activity=idle\n"));
+    expectRows({{{"hand", "enroll", "--wait"},
+                 1,
+                 "startEnrollment: Error attempting to acquire resource (0x4000000A)\n"}});
+}
+
+TEST(ManagerCommands, EndTheirWaitWhenTheEndWillNotCome) {
+    {
+        TouchStack stack({"--hand-rate", "0"});
+        const RunResult late = zelkctl({"hand", "enroll", "--wait", "--seconds", "0.5"});
+        EXPECT_EQ(4, late.status);
+        EXPECT_EQ("zelkctl: enrollment done has not come within 0.5 s\n", late.errors);
+        EXPECT_THAT(zelkctl({"command", "handstate"}).output, HasSubstr("activity=idle\n"));
+    }
+    {
+        // Ten seconds to the first step.
+        TouchStack stack({"--hand-rate", "0.1"});
+        ChildProcess scan({binary("zelkctl"), "hand", "scan", "--wait"});
+        ASSERT_TRUE(stack.awaitLine("hand: scan"));
+        ASSERT_EQ(0, zelkctl({"hand", "cancel"}).status);
+        EXPECT_EQ(1, scan.wait());
+        EXPECT_EQ("zelkctl: cancelled\n", scan.errors());
+
+        ChildProcess given({binary("zelkctl"), "hand", "enroll", "--wait"});
+        ASSERT_TRUE(stack.awaitLine("hand: startEnrollment"));
+        given.signal(SIGINT);
+        EXPECT_EQ(130, given.wait());
+        EXPECT_EQ("zelkctl: interrupted\n", given.errors());
+        EXPECT_TRUE(stack.awaitLine("hand: stopEnrollment"));
+    }
+    TouchStack stack({"--hand-rate", "0"});
+    ChildProcess orphan({binary("zelkctl"), "hand", "match", "--wait"});
+    ASSERT_TRUE(stack.awaitLine("hand: startMatching"));
+    stack.kill();
+    EXPECT_EQ(3, orphan.wait());
+    EXPECT_EQ("zelkctl: the service died\n", orphan.errors());
+}
+
+TEST(ManagerCommands, ShowTheProgressOfAWaitInOneLineOfATerminal) {
+    TouchStack stack({"--hand-rate", "1"});
+    Terminal terminal("env TERM=vt100 " + binary("zelkctl") + " hand enroll --wait", 80, 20);
+    EXPECT_TRUE(terminal.await([](const std::string& text) {
+        return testing::Matches(
+                MatchesRegex("[0-9:.]+  #[0-9]+  enrollment progress, [0-9]+ %\n+"))(text);
+    })) << terminal.text();
+    EXPECT_TRUE(terminal.awaitText("ended with 0"));
+    EXPECT_THAT(terminal.text(), MatchesRegex("[0-9:.]+  #[0-9]+  enrollment done as hand 1\n"
+                                              "ended with 0\n+"));
 }
 
 namespace {

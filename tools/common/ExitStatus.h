@@ -27,7 +27,9 @@ constexpr ExitStatus kExitStatuses[] = {
         {kExitUsage, "The command line makes no sense; nothing was done."},
         {kExitAbsent,
          "A service, the service manager or the Binder driver is not there, or the service died."},
-        {kExitTimeout, "A call was not answered within the seconds of --timeout."},
+        {kExitTimeout,
+         "A call was not answered within the seconds of --timeout, or what --wait waits for did not "
+         "come within those of --seconds."},
 };
 
 }  // namespace pemaro::tools

@@ -32,6 +32,7 @@ class Watcher {
     Watcher(const WatchOptions& options, const Watched& watched, EventReceiver& receiver)
             : mWatched(watched),
               mReceiver(receiver),
+              mIsAwaiting(options.goal.reached.has_value()),
               mDeadline(options.seconds > 0
                                 ? Clock::now() +
                                           std::chrono::duration_cast<Clock::duration>(
@@ -52,15 +53,26 @@ class Watcher {
         }
         status = begin();
         while (status == STATUS_NO_ERROR && !isOver(kWatchPeriod)) {
+            if (mService->died() && mIsAwaiting) {
+                break;
+            }
             if (mService->died()) {
                 status = reconnect();
             }
         }
+        if (mIsAwaiting) {
+            // That it is ended now is no event that was waited for.
+            mReceiver.close();
+        }
+        const bool died = mService != nullptr && mService->died();
         if (mHasBegun && mWatched.end && !mService->died()) {
             // It may have ended by itself, and then the service refuses, which is as well.
             call(mWatched.endName, mWatched.end);
         }
         call("deinit", mWatched.deinit);
+        if (mIsAwaiting && died && !mReceiver.awaited()) {
+            return fail("the service died", tools::kExitAbsent);
+        }
         return status == STATUS_NO_ERROR ? tools::kExitSuccess : tools::kExitFailure;
     }
 
@@ -113,10 +125,25 @@ class Watcher {
 
     const Watched& mWatched;
     EventReceiver& mReceiver;
+    const bool mIsAwaiting;
     const Clock::time_point mDeadline;
     std::unique_ptr<ServiceWatch> mService;
     bool mHasBegun = false;
 };
+
+/// How the wait for an event ended; the exit status.
+int judge(const EventGoal& goal, const std::optional<simulator::HandEvent>& event, double seconds) {
+    if (event == goal.reached) {
+        return tools::kExitSuccess;
+    }
+    if (event) {
+        return fail(simulator::handEventName(*event));
+    }
+    return mustStop() ? failStopped()
+                      : fail(fmt::format("{} has not come within {:g} s",
+                                         simulator::handEventName(*goal.reached), seconds),
+                             tools::kExitTimeout);
+}
 
 }  // namespace
 
@@ -129,7 +156,8 @@ void addWatchOptions(Command& command, WatchOptions& options) {
 }
 
 void addGestureOptions(Command& command, WatchOptions& options) {
-    command.parsed("--gesture", "GESTURE", "Only this gesture, a number or a name like swipe-right",
+    command.parsed("--gesture", "GESTURE",
+                   "Only this gesture, by its number or its name: " + gestureWords(),
                    [&options](const std::string& text) {
                        options.filter.gesture = gestureOf(text);
                        return options.filter.gesture ? "" : noSuch("gesture", text, gestureWords());
@@ -149,7 +177,8 @@ void addFeatureOption(Command& command, WatchOptions& options) {
 }
 
 void addHandEventOption(Command& command, WatchOptions& options) {
-    command.parsed("--event", "EVENT", "Only this event, a number or a name like hand-detected",
+    command.parsed("--event", "EVENT",
+                   "Only this event, by its number or its name: " + handEventWords(),
                    [&options](const std::string& text) {
                        options.filter.event = handEventOf(text);
                        return options.filter.event ? "" : noSuch("event", text, handEventWords());
@@ -185,9 +214,13 @@ int watch(const WatchOptions& options, const MakeWatched& make) {
     auto* receiver = new EventReceiver(options.output.empty() ? nullptr : &file, options.count,
                                        settings().json);
     receiver->choose(options.filter, options.draw);
+    receiver->await(options.goal);
     const Watched watched = make(receiver);
     result = Watcher(options, watched, *receiver).run();
     const uint64_t taken = receiver->close();
+    if (result == tools::kExitSuccess && options.goal.reached) {
+        result = judge(options.goal, receiver->awaited(), options.seconds);
+    }
     // Without an event, and without success, a file stays what it was.
     const bool isWritten = taken > 0 || result == tools::kExitSuccess || !file.problem().empty();
     if (isWritten && !file.close()) {

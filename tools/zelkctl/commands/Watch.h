@@ -17,8 +17,9 @@ struct WatchOptions {
     std::string output;
     EventFilter filter;  ///< others are neither shown, nor counted, nor kept
     bool draw = false;   ///< strokes
+    EventGoal goal;      ///< the event that ends it
 
-    bool isLimited() const { return count != 0 || seconds > 0; }
+    bool isLimited() const { return count != 0 || seconds > 0 || goal.reached; }
 };
 
 void addWatchOptions(Command& command, WatchOptions& options);
@@ -53,7 +54,9 @@ struct Watched {
 using MakeWatched = std::function<Watched(EventReceiver*)>;
 
 /// Prints events until there are enough or the command is asked to stop; returns the exit status.
-/// When the service dies, the client is disconnected, waits for a new service, and connects again.
+/// When the service dies, the client is disconnected, waits for a new service, and connects again;
+/// but where an event is waited for, which will not come then, that is a failure. So is an event that
+/// has not come in time, or that tells of another end.
 int watch(const WatchOptions& options, const MakeWatched& make);
 
 }  // namespace pemaro::zelkctl

@@ -3,6 +3,8 @@
 
 #include <fmt/chrono.h>
 
+#include <algorithm>
+
 #include "frames/Checksum.h"
 #include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Output.h"
@@ -65,6 +67,11 @@ std::string serviceLine(Clock::time_point when, const char* what, bool json) {
                 : fmt::format("{}  the service {}", timeOfDay(when), what);
 }
 
+bool EventGoal::isEndedBy(simulator::HandEvent event) const {
+    return reached &&
+           (event == *reached || std::find(missed.begin(), missed.end(), event) != missed.end());
+}
+
 void EventReceiver::tellOfService(const char* what) {
     std::lock_guard<std::mutex> guard(mLock);
     say(serviceLine(Clock::now(), what, mJson));
@@ -75,10 +82,26 @@ bool EventReceiver::waitUntilDone(std::chrono::milliseconds patience) {
     return mChanged.wait_for(guard, patience, [this] { return mDone; });
 }
 
+std::optional<simulator::HandEvent> EventReceiver::awaited() {
+    std::lock_guard<std::mutex> guard(mLock);
+    return mAwaited;
+}
+
 uint64_t EventReceiver::close() {
     std::lock_guard<std::mutex> guard(mLock);
     mDone = true;
+    mLine.end();
     return mTaken;
+}
+
+void EventReceiver::print(const void* record, size_t size) {
+    if (mGoal.reached && !mAwaited && !mJson && mLine.isTerminal()) {
+        mLine.show(eventLine(Clock::now(), record, size, false));
+        return;
+    }
+    mLine.clear();
+    say(mDraw ? eventText(Clock::now(), record, size, mJson, terminalTraits().unicode)
+              : eventLine(Clock::now(), record, size, mJson));
 }
 
 void EventReceiver::take(const void* record, size_t size) {
@@ -94,10 +117,14 @@ void EventReceiver::take(const void* record, size_t size) {
     if (mFile != nullptr && present != 0 && !mFile->write(record, present)) {
         mDone = true;
     } else {
-        say(mDraw ? eventText(Clock::now(), record, present, mJson, terminalTraits().unicode)
-                  : eventLine(Clock::now(), record, present, mJson));
+        const std::optional<simulator::HandEvent> event =
+                EventRecord::read(record, present).handEvent();
+        if (event && mGoal.isEndedBy(*event)) {
+            mAwaited = event;
+        }
+        print(record, present);
         mTaken += 1;
-        mDone = mTaken == mLimit;
+        mDone = mTaken == mLimit || mAwaited;
     }
     if (mDone) {
         mChanged.notify_all();

@@ -6,12 +6,23 @@
 #include <cstddef>
 #include <cstdint>
 #include <mutex>
+#include <optional>
 #include <string>
+#include <vector>
 
 #include "frames/FrameFile.h"
 #include "tools/zelkctl/services/EventRecord.h"
+#include "tools/zelkctl/terminal/LiveLine.h"
 
 namespace pemaro::zelkctl {
+
+/// What is waited for: a good end, or one of those that are not.
+struct EventGoal {
+    std::optional<simulator::HandEvent> reached;  ///< nothing is waited for without it
+    std::vector<simulator::HandEvent> missed;
+
+    bool isEndedBy(simulator::HandEvent event) const;
+};
 
 /// Prints the events of a manager, one a line, and keeps their records. A line tells when an event came
 /// and what it was (see EventRecord), or of a record of an unknown kind its size and a digest, the
@@ -33,6 +44,13 @@ class EventReceiver {
         mDraw = draw;
     }
 
+    /// To be told before the first event: the receiver is done with the first of these. Until then
+    /// a terminal shows the last event alone.
+    void await(const EventGoal& goal) { mGoal = goal; }
+
+    /// What ended the waiting, once it is over.
+    std::optional<simulator::HandEvent> awaited();
+
     /// The callback of a client; `context` is the receiver.
     template <typename Record>
     static void onEvent(Record* record, void* context) {
@@ -51,17 +69,21 @@ class EventReceiver {
 
   private:
     void take(const void* record, size_t size);
+    void print(const void* record, size_t size);
 
     frames::FrameFile* const mFile;
     const uint64_t mLimit;
     const bool mJson;
     EventFilter mFilter;
     bool mDraw = false;
+    EventGoal mGoal;
 
     std::mutex mLock;
     std::condition_variable mChanged;
     uint64_t mTaken = 0;
     bool mDone = false;
+    std::optional<simulator::HandEvent> mAwaited;
+    LiveLine mLine;
 };
 
 /// The line of an event, or of one that came without a record, whose size is then 0.

@@ -178,6 +178,10 @@ void EventRecord::describe(JsonObject& object, bool stroke) const {
     }
 }
 
+std::optional<HandEvent> EventRecord::handEvent() const {
+    return mHand != nullptr ? std::optional<HandEvent>(mHand->event) : std::nullopt;
+}
+
 bool EventRecord::passes(const EventFilter& filter) const {
     const bool gesture =
             !filter.gesture || (mGesture != nullptr && mGesture->gesture == *filter.gesture);

@@ -55,6 +55,9 @@ class EventRecord {
     /// Whether it is wanted. Of an unknown record nothing is known, so that it passes no filter.
     bool passes(const EventFilter& filter) const;
 
+    /// What happened to a hand; nothing for other events.
+    std::optional<simulator::HandEvent> handEvent() const;
+
     /// A gesture's stroke, in lines; nothing for other events.
     std::vector<std::string> drawing(bool unicode) const;
 

@@ -13,10 +13,15 @@ using Client = HandBiometricManagerClient;
 
 struct ActivityOptions {
     bool stop = false;
+    bool wait = false;
     WatchOptions watch;
 };
 
 int act(const HandActivity& activity, const ActivityOptions& options) {
+    WatchOptions watch = options.watch;
+    if (options.wait) {
+        watch.goal = activity.goal;
+    }
     const auto operateOnce = [&](const char* name, int (Client::*operation)(), const char* state) {
         return operate<HandManager>(
                 name, [&](Client& client) { return (client.*operation)(); },
@@ -26,13 +31,13 @@ int act(const HandActivity& activity, const ActivityOptions& options) {
     if (options.stop) {
         return operateOnce(activity.stopName, activity.stop, "stopped");
     }
-    if (options.watch.isLimited()) {
+    if (watch.isLimited()) {
         WatchSteps<Client> steps;
         steps.beginName = activity.startName;
         steps.begin = activity.start;
         steps.endName = activity.endName;
         steps.end = activity.end;
-        return watchManager<HandManager>(options.watch, steps);
+        return watchManager<HandManager>(watch, steps);
     }
     return operateOnce(activity.startName, activity.start, "started");
 }
@@ -44,18 +49,24 @@ void addHandActivityCommand(CLI::App& hand, Action& action, const HandActivity& 
     Command command(hand, action, activity.name, activity.help);
     addWatchOptions(command, options->watch);
     addHandEventOption(command, options->watch);
+    // Other events could not be waited for, and a number of them is another end.
+    command.flag("--wait", options->wait, activity.waitHelp)
+            .excludes("--count", "--wait")
+            .excludes("--event", "--wait");
     if (activity.stop != nullptr) {
         command.flag("--stop", options->stop, "End it instead")
                 .excludes("--count", "--stop")
-                .excludes("--seconds", "--stop");
+                .excludes("--seconds", "--stop")
+                .excludes("--wait", "--stop");
     }
     command.details(
-                   "With --count or --seconds the events are watched, and what still goes on then "
-                   "is ended.")
+                   "With --count, --seconds or --wait the events are watched, and what still goes "
+                   "on then is ended. What --wait waits for has to come within --seconds, if they "
+                   "are told.")
             .check([options] {
-                return options->watch.output.empty() || options->watch.isLimited()
+                return options->watch.output.empty() || options->watch.isLimited() || options->wait
                                ? ""
-                               : "--output needs --count or --seconds";
+                               : "--output needs --count, --seconds or --wait";
             })
             .runs([options, activity] { return act(activity, *options); });
 }

@@ -3,6 +3,7 @@
 
 #include "pemaro/HandBiometricManagerClient.h"
 #include "tools/zelkctl/commands/Commands.h"
+#include "tools/zelkctl/services/EventReceiver.h"
 
 namespace pemaro::zelkctl {
 
@@ -32,6 +33,9 @@ struct HandActivity {
     int (HandBiometricManagerClient::*stop)();
     const char* endName;
     int (HandBiometricManagerClient::*end)();
+    /// What --wait waits for.
+    EventGoal goal;
+    const char* waitHelp;
 };
 
 /// A command that starts an activity, watches what comes of it, or stops it.

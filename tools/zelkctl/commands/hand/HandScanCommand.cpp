@@ -4,10 +4,20 @@
 namespace pemaro::zelkctl {
 
 void addHandScanCommand(CLI::App& hand, Action& action) {
+    using simulator::HandEvent;
     using Client = HandBiometricManagerClient;
     addHandActivityCommand(hand, action,
-                           {"scan", "Scan a hand", "scan", "scan", &Client::scan, nullptr, nullptr,
-                            "cancelScan", &Client::cancelScan});
+                           {"scan",
+                            "Scan a hand",
+                            "scan",
+                            "scan",
+                            &Client::scan,
+                            nullptr,
+                            nullptr,
+                            "cancelScan",
+                            &Client::cancelScan,
+                            {HandEvent::kScanDone, {HandEvent::kCancelled}},
+                            "Wait until the hand is scanned"});
 }
 
 }  // namespace pemaro::zelkctl
