@@ -88,6 +88,10 @@ void addCheckCommand(CLI::App& app, Action& action) {
             .flag("--invasive", options->invasive,
                   "Check operations as well that may change the service's state")
             .flag("--tap", options->tap, "Print in the Test Anything Protocol")
+            .details(
+                    "Looked at is whether a service keeps to what clients rely on. Each check has "
+                    "passed, failed, or was skipped for a reason; the exit status is 1 when one "
+                    "failed.")
             .check([options]() -> std::string {
                 for (const std::string& service : options->services) {
                     if (!isChecked(service)) {

@@ -175,6 +175,12 @@ void addFramesExportCommand(CLI::App& frames, Action& action) {
             .number("--last", options->last, "Last frame", {0, kMaxNumber})
             .number("--every", options->every, "Only every so many frames", {1, kMaxNumber})
             .number("--scale", options->scale, "Pixels of a cell of a picture (8)", {1, kMaxScale})
+            .details(
+                    "A picture is a heat map with a cross at each finger, in which the hottest "
+                    "cell "
+                    "of the whole recording is the brightest. What is intact of a damaged "
+                    "recording "
+                    "is exported, and the exit status is 1 then.")
             .check([options] { return problemOf(*options); })
             .runs([options] { return exportFrames(*options); });
 }

@@ -57,6 +57,10 @@ void addFramesReportCommand(CLI::App& frames, Action& action) {
                     "File to write the page to; - is the standard output")
             .required("--output")
             .number("--every", options->every, "Only every so many frames", {1, 1000000})
+            .details(
+                    "The page has the heat map, the tracks of the fingers, and the times between "
+                    "frames. It needs no network and nothing beside it. Of a very long recording "
+                    "--every takes what fits.")
             .runs([options] { return makeReport(*options); });
 }
 

@@ -41,6 +41,10 @@ void addFramesStatCommand(CLI::App& frames, Action& action) {
     auto options = std::make_shared<StatOptions>();
     Command(frames, action, "stat", "Tell what a recording holds")
             .operand("FILE", options->path, "The recording")
+            .details(
+                    "Told are how many frames there are, how long and how regular they are, and "
+                    "what is lost, corrupt or cut off, and where. The exit status is 1 when the "
+                    "recording is damaged.")
             .runs([options] { return showStat(*options); });
 }
 

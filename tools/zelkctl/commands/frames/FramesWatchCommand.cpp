@@ -266,7 +266,12 @@ void addFramesWatchCommand(CLI::App& frames, Action& action) {
     Command command(frames, action, "watch",
                     "Show the frames as they come, as a heat map in the terminal");
     addSecondsOption(command, options->seconds);
-    command.details("With --json, or where there is no terminal, a line is printed each second.")
+    command.details(
+                   "Shown are how many frames there are a second and how many were lost, the image "
+                   "as a heat map with the number of each finger at its place, and the positions "
+                   "of the fingers. The map is as large as the terminal allows, in the colours "
+                   "that it has according to TERM, COLORTERM and NO_COLOR. With --json, or where "
+                   "there is no terminal, a line is printed each second.")
             .runs([options] { return watchFrames(*options); });
 }
 
