@@ -70,6 +70,11 @@ TEST(ExampleServices, RecordIntoTheRing) {
                                             "recorded [1-9][0-9]* frames, [1-9][0-9]* bytes\n"));
     // Once more: the first recording has left nothing behind.
     EXPECT_EQ(linked.status, run({binary("client_linked")}).status);
+    // As the tutorial has it.
+    const RunResult recorded = run({binary("zelkctl"), "record", "--frames", "5"});
+    EXPECT_EQ(0, recorded.status) << recorded.errors;
+    EXPECT_THAT(recorded.output + recorded.errors,
+                testing::HasSubstr("no sequence numbers, 0 corrupt"));
     const RunResult refused = run({binary("zelkctl"), "session", "save"});
     EXPECT_EQ(1, refused.status);
     EXPECT_THAT(refused.errors, testing::HasSubstr(errStr(STATUS_UNSUPPORTED)));
