@@ -4,6 +4,7 @@
 #include <libevdev/libevdev.h>
 
 #include <algorithm>
+#include <cmath>
 
 #include "frames/FrameGenerator.h"
 
@@ -52,7 +53,8 @@ double partOf(const libevdev* device, unsigned int code, int value) {
 template <typename Read>
 frames::FingerRecord fingerOf(const libevdev* device, int slot, const Axes& axes, Read read) {
     const auto position = [&](unsigned int code) {
-        return static_cast<uint16_t>(partOf(device, code, read(code)) * frames::kPositionMax + 0.5);
+        return static_cast<uint16_t>(
+                std::lround(partOf(device, code, read(code)) * frames::kPositionMax));
     };
     double firmness = 1;
     if (isRange(device, axes.pressure)) {

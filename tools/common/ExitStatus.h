@@ -28,8 +28,8 @@ constexpr ExitStatus kExitStatuses[] = {
         {kExitAbsent,
          "A service, the service manager or the Binder driver is not there, or the service died."},
         {kExitTimeout,
-         "A call was not answered within the seconds of --timeout, or what --wait waits for did not "
-         "come within those of --seconds."},
+         "A call was not answered within the seconds of --timeout, or what --wait waits for did "
+         "not come within those of --seconds."},
 };
 
 }  // namespace pemaro::tools
