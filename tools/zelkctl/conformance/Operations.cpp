@@ -126,9 +126,7 @@ std::string fieldProblem(const Parcel& reply, char field, int32_t* status) {
 const std::vector<CheckedInterface>& checkedInterfaces() {
     static const std::vector<CheckedInterface> interfaces = {
             {CheckedService::kCompanion,
-             "companion",
-             "pemaro.TouchService",
-             28,
+             knownService("companion"),
              {
                      {14, "getProperties", none, "Sm", Harm::kNone},
                      {15, "getAFEParams", none, "Sm", Harm::kNone},
@@ -152,9 +150,7 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      // They take something from the others: 10 close, 28 setAuth.
              }},
             {CheckedService::kTouch,
-             "touch",
-             "pemaro.TouchManagerService",
-             7,
+             knownService("touch"),
              {
                      {3, "isSupported", feature, "bS", Harm::kNone},
                      {3, "isSupported of no feature", noSuch, "bS", Harm::kNone},
@@ -167,9 +163,7 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      // 7 configure_vm_region.
              }},
             {CheckedService::kGesture,
-             "gesture",
-             "pemaro.GestureManagerService",
-             13,
+             knownService("gesture"),
              {
                      {12, "getMaxPreDefinedGesture", none, "uS", Harm::kNone},
                      {13, "getMaxUserDefinedGesture", none, "uS", Harm::kNone},
@@ -183,9 +177,7 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
                      // 4 disableWakeup, 5 startGestureDetection, 6 stopGestureDetection.
              }},
             {CheckedService::kHand,
-             "hand",
-             "pemaro.HandBiometricManagerService",
-             16,
+             knownService("hand"),
              {
                      {13, "getMaxUser", none, "uS", Harm::kNone},
                      {14, "getProfileList", none, "nS", Harm::kNone},

@@ -9,6 +9,8 @@
 #include <string>
 #include <vector>
 
+#include "tools/zelkctl/services/Interfaces.h"
+
 namespace pemaro::zelkctl {
 
 /// The four services whose interfaces are known.
@@ -35,10 +37,11 @@ struct CheckedCall {
 
 struct CheckedInterface {
     CheckedService service;
-    const char* word;        ///< what it is called on the command line
-    const char* descriptor;  ///< and its name in the service manager
-    uint32_t lastCode;
+    const KnownInterface& known;
     std::vector<CheckedCall> calls;
+    const char* word = known.word;
+    const char* descriptor = known.descriptor;
+    uint32_t lastCode = static_cast<uint32_t>(known.operations.size());
 };
 
 /// All four, in the order in which they are checked.
