@@ -3,10 +3,10 @@
 
 #include <fmt/core.h>
 
-#include <cerrno>
-#include <cstdio>
+#include <algorithm>
 #include <cstring>
-#include <memory>
+
+#include "tools/zelkctl/files/InputFile.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -22,25 +22,26 @@ std::string refusal(const std::string& path, size_t bytes) {
 
 std::string readGestures(const std::string& path, size_t limit,
                          std::vector<IGestureManagerClient::GestureData>& records) {
-    const std::unique_ptr<FILE, int (*)(FILE*)> file(fopen(path.c_str(), "rbe"), fclose);
-    if (file == nullptr) {
-        return fmt::format("cannot open {}: {}", path, strerror(errno));
+    // One record more than there may be tells that there are too many.
+    const size_t room = limit - std::min(limit, records.size());
+    std::string bytes;
+    const FileResult result = readInputFile(path, (room + 1) * kRecord, bytes);
+    if (!result.isGood()) {
+        const bool isOpen = result.status != STATUS_ERROR_OPENING_FILE;
+        return fmt::format("cannot {} {}", isOpen ? "read" : "open", result.detail);
     }
-    auto record = std::make_unique<IGestureManagerClient::GestureData>();
+    const size_t count = bytes.size() / kRecord;
+    if (count > room) {
+        return fmt::format("{} makes it more than {} record{} of {} bytes", path, limit,
+                           limit == 1 ? "" : "s", kRecord);
+    }
     const size_t before = records.size();
-    size_t length = 0;
-    while ((length = fread(record.get(), 1, kRecord, file.get())) == kRecord) {
-        if (records.size() == limit) {
-            return fmt::format("{} makes it more than {} record{} of {} bytes", path, limit,
-                               limit == 1 ? "" : "s", kRecord);
-        }
-        records.push_back(*record);
+    records.resize(before + count);
+    if (count != 0) {
+        memcpy(&records[before], bytes.data(), count * kRecord);
     }
-    if (ferror(file.get()) != 0) {
-        return fmt::format("cannot read {}: {}", path, strerror(errno));
-    }
-    if (length != 0) {
-        return refusal(path, length);
+    if (bytes.size() % kRecord != 0) {
+        return refusal(path, bytes.size());
     }
     return records.size() > before ? "" : path + " is empty";
 }
