@@ -21,6 +21,7 @@ struct Fault {
     const char* service;
     const char* fault;
     const char* line;
+    bool invasive = false;
 };
 
 class CheckFinds : public ::testing::TestWithParam<Fault> {};
@@ -36,10 +37,12 @@ TEST(Check, IsPassedByTheSimulatedStack) {
         EXPECT_THAT(check.output, Not(HasSubstr("FAILED")));
         for (const char* service :
              {"pemaro.TouchService\n", "pemaro.TouchManagerService\n",
-              "pemaro.GestureManagerService\n", "pemaro.HandBiometricManagerService\n",
-              "  passed   keeps `write - read` within the ring\n",
-              "  passed   signals the condition after a frame\n"}) {
+              "pemaro.GestureManagerService\n", "pemaro.HandBiometricManagerService\n"}) {
             EXPECT_THAT(check.output, HasSubstr(service));
+        }
+        for (const char* line : {"  passed   keeps `write - read` within the ring\n",
+                                 "  passed   signals the condition after a frame\n"}) {
+            EXPECT_EQ(words.size() == 2, check.output.find(line) != std::string::npos) << line;
         }
         EXPECT_EQ(words.size() == 1, check.output.find("see --invasive") != std::string::npos)
                 << check.output;
@@ -70,6 +73,35 @@ TEST(Check, SeesTheEventsOfASubscription) {
     EXPECT_THAT(check.output, Not(HasSubstr("pemaro.TouchService\n")));
 }
 
+// A recording would be taken from a client that has one, and its settings changed.
+TEST(Check, LeavesTheRecordingsOfOthersAlone) {
+    TouchStack touchStack({"--services", "companion"});
+    const RunResult check = zelkctl({"check"});
+    EXPECT_EQ(0, check.status) << check.output << check.errors;
+    EXPECT_THAT(check.output,
+                HasSubstr("  skipped  records to shared memory: it may take the recording of "
+                          "another client; see --invasive\n"));
+    EXPECT_EQ("", touchStack.process().errors());
+    EXPECT_THAT(touchStack.process().output(), Not(HasSubstr("client ")));
+    EXPECT_EQ(0, zelkctl({"check", "--invasive"}).status);
+    EXPECT_TRUE(touchStack.process().awaitOutput("client "));
+}
+
+TEST(Check, GivesEachCallTheTimeThatACallMayTake) {
+    const Words words = {"check", "companion", "--invasive", "--timeout", "1.2"};
+    {
+        // The frames that it wants to see alone take longer.
+        TouchStack touchStack({"--rate", "30"});
+        const RunResult check = zelkctl(words);
+        EXPECT_EQ(0, check.status) << check.output << check.errors;
+        EXPECT_EQ("", check.errors);
+    }
+    TouchStack touchStack({"--fault", "inspect=delay:5000ms"});
+    const RunResult check = zelkctl(words);
+    EXPECT_EQ(4, check.status);
+    EXPECT_EQ("zelkctl: check of companion: code 23: no answer within 1.2 s\n", check.errors);
+}
+
 TEST(Check, SpeaksJsonAndTap) {
     TouchStack touchStack({"--services", "hand"});
     const std::vector<std::string> json = splitLines(zelkctl({"check", "--json"}).output);
@@ -96,7 +128,11 @@ TEST(Check, TellsWhatIsNotThere) {
 TEST_P(CheckFinds, TheFault) {
     ChildProcess service({binary("broken-service"), GetParam().service, GetParam().fault});
     ASSERT_TRUE(service.awaitOutput("process ")) << service.errors();
-    const RunResult check = zelkctl({"check", GetParam().service});
+    Words words = {"check", GetParam().service};
+    if (GetParam().invasive) {
+        words.emplace_back("--invasive");
+    }
+    const RunResult check = zelkctl(words);
     EXPECT_EQ(1, check.status);
     EXPECT_THAT(check.output, HasSubstr("  FAILED   " + std::string(GetParam().line)));
 }
@@ -141,18 +177,21 @@ INSTANTIATE_TEST_SUITE_P(
                 Fault{"companion", "ring-too-large",
                       "shares a control block with a ring that fits: a ring of 16 frames of 4096 "
                       "bytes "
-                      "does not fit in "},
+                      "does not fit in ",
+                      true},
                 Fault{"companion", "indices-ahead",
                       "shares a control block with a ring that fits: the indices begin at 0 and "
-                      "3\n"},
-                Fault{"companion", "overruns", "keeps `write - read` within the ring: "},
+                      "3\n",
+                      true},
+                Fault{"companion", "overruns", "keeps `write - read` within the ring: ", true},
                 Fault{"companion", "no-signal",
-                      "signals the condition after a frame: frames came, and no signal\n"},
+                      "signals the condition after a frame: frames came, and no signal\n", true},
                 Fault{"companion", "bad-frame-length",
                       "gives each frame a length that fits its slot: frame 0 tells a length of "
                       "4097, in "
-                      "slots of 4096\n"},
-                Fault{"companion", "goes-on", "writes no more once it was stopped: "},
+                      "slots of 4096\n",
+                      true},
+                Fault{"companion", "goes-on", "writes no more once it was stopped: ", true},
                 Fault{"companion", "hangs", "answers in time: no answer for 10 s"},
                 Fault{"touch", "unsure-answer",
                       "the reply of isSupported is as it should be: 2 is no answer\n"},

@@ -8,8 +8,11 @@
 #include <future>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <thread>
 #include <utility>
+
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 using android::IBinder;
 using android::Parcel;
@@ -22,10 +25,12 @@ namespace {
 /// Longer than any of the groups of checks takes with a good service.
 constexpr std::chrono::seconds kPatience(10);
 
-/// Passes findings on until it is told that nobody wants them any more.
+/// Passes findings on, and has the answers waited for, until it is told that nobody wants them any
+/// more.
 class Gate {
   public:
-    explicit Gate(std::function<void(const Finding&)> report) : mReport(std::move(report)) {}
+    Gate(std::string service, std::function<void(const Finding&)> report)
+            : mService(std::move(service)), mReport(std::move(report)) {}
 
     void pass(const Finding& finding) {
         std::lock_guard<std::mutex> guard(mLock);
@@ -34,14 +39,25 @@ class Gate {
         }
     }
 
+    void ask(const std::string& question) {
+        std::lock_guard<std::mutex> guard(mLock);
+        mCalling.reset();
+        if (mReport && !question.empty()) {
+            mCalling.emplace(fmt::format("check of {}: {}", mService, question));
+        }
+    }
+
     void close() {
         std::lock_guard<std::mutex> guard(mLock);
         mReport = nullptr;
+        mCalling.reset();
     }
 
   private:
+    const std::string mService;
     std::mutex mLock;
     std::function<void(const Finding&)> mReport;
+    std::optional<Calling> mCalling;
 };
 
 /// Runs a group of checks on a thread of its own, which is left behind when it does not end.
@@ -64,7 +80,12 @@ status_t Subject::call(uint32_t code, const std::function<void(Parcel&)>& argume
                        Parcel* reply) const {
     Parcel request;
     arguments(begin(request));
-    return mBinder->transact(code, request, reply);
+    return transact(code, request, reply);
+}
+
+status_t Subject::transact(uint32_t code, const Parcel& request, Parcel* reply) const {
+    return ask(fmt::format("code {}", code),
+               [&] { return mBinder->transact(code, request, reply); });
 }
 
 int32_t Subject::callForStatus(uint32_t code, const std::function<void(Parcel&)>& arguments,
@@ -91,9 +112,10 @@ void Subject::skip(const std::string& check, const std::string& reason) const {
 
 void checkService(const sp<IBinder>& binder, const CheckedInterface& interface, bool invasive,
                   const std::function<void(const Finding&)>& report) {
-    const auto gate = std::make_shared<Gate>(report);
+    const auto gate = std::make_shared<Gate>(interface.word, report);
     const auto subject = std::make_shared<const Subject>(
-            binder, interface, invasive, [gate](const Finding& finding) { gate->pass(finding); });
+            binder, interface, invasive, [gate](const Finding& finding) { gate->pass(finding); },
+            [gate](const std::string& question) { gate->ask(question); });
     const bool isCompanion = interface.service == CheckedService::kCompanion;
     const bool answers = runGroup(checkWire, subject) &&
                          runGroup(isCompanion ? checkRecording : checkSubscription, subject);
@@ -101,12 +123,13 @@ void checkService(const sp<IBinder>& binder, const CheckedInterface& interface, 
                   answers ? ""
                           : fmt::format("no answer for {} s; the other checks are left out",
                                         kPatience.count()));
-    gate->close();
     if (answers) {
+        const status_t ping = subject->ask("ping", [&] { return binder->pingBinder(); });
         report({interface.descriptor, "lives on after the checks",
-                binder->pingBinder() == android::OK ? Outcome::kPassed : Outcome::kFailed,
+                ping == android::OK ? Outcome::kPassed : Outcome::kFailed,
                 binder->isBinderAlive() ? "" : "it died"});
     }
+    gate->close();
 }
 
 }  // namespace pemaro::zelkctl

@@ -16,13 +16,33 @@ namespace pemaro::zelkctl {
 /// A service that is being checked: calls to it as a client makes them, and what is found.
 class Subject {
   public:
+    /// `told` hears of each question before it is asked, and of none when the answer is there.
     Subject(const android::sp<android::IBinder>& binder, const CheckedInterface& interface,
-            bool invasive, const std::function<void(const Finding&)>& report)
-            : mBinder(binder), mInterface(interface), mInvasive(invasive), mReport(report) {}
+            bool invasive, const std::function<void(const Finding&)>& report,
+            const std::function<void(const std::string& question)>& told)
+            : mBinder(binder),
+              mInterface(interface),
+              mInvasive(invasive),
+              mReport(report),
+              mTold(told) {}
 
     const android::sp<android::IBinder>& binder() const { return mBinder; }
     const CheckedInterface& interface() const { return mInterface; }
     bool isInvasive() const { return mInvasive; }
+
+    /// Whatever waits for the service goes through here, one question after another; what `answer`
+    /// returns.
+    template <typename Answer>
+    auto ask(const std::string& question, Answer answer) const {
+        mTold(question);
+        const auto result = answer();
+        mTold("");
+        return result;
+    }
+
+    /// Sends a request as it is; the transaction's result.
+    android::status_t transact(uint32_t code, const android::Parcel& request,
+                               android::Parcel* reply) const;
 
     /// A request that begins with the interface token of this service, or another one.
     android::Parcel& begin(android::Parcel& request) const { return begin(request, nullptr); }
@@ -45,6 +65,7 @@ class Subject {
     const CheckedInterface& mInterface;
     const bool mInvasive;
     const std::function<void(const Finding&)> mReport;
+    const std::function<void(const std::string&)> mTold;
 };
 
 // What is checked.

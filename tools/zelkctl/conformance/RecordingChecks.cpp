@@ -65,13 +65,18 @@ struct Block {
 };
 
 /// What is wrong with the memory that a service handed over; else it is in `block`.
-std::string readBlock(const sp<android::IBinder>& binder, int32_t packetSize, Block* block) {
+std::string readBlock(const Subject& subject, const sp<android::IBinder>& binder,
+                      int32_t packetSize, Block* block) {
     if (binder == nullptr) {
         return "there is no memory";
     }
     block->memory = android::interface_cast<IMemory>(binder);
     ssize_t offset = 0;
-    block->heap = block->memory->getMemory(&offset, &block->size);
+    // The heap is the service's own object: it is asked for its descriptor.
+    subject.ask("shared memory", [&] {
+        block->heap = block->memory->getMemory(&offset, &block->size);
+        return block->heap != nullptr && block->heap->getBase() != MAP_FAILED;
+    });
     if (block->heap == nullptr || block->heap->getBase() == MAP_FAILED ||
         block->heap->getBase() == nullptr) {
         return "the memory cannot be mapped";
@@ -253,7 +258,7 @@ void checkBlock(const Subject& subject, int32_t packetSize) {
     std::string problem =
             result == android::OK ? "" : fmt::format("the transaction ended with {}", result);
     if (problem.empty()) {
-        problem = readBlock(reply.readStrongBinder(), packetSize, &block);
+        problem = readBlock(subject, reply.readStrongBinder(), packetSize, &block);
     }
     subject.tell("shares a control block with a ring that fits", problem);
     if (problem.empty() && step(subject, "starts a recording", kStartRecord, none)) {
@@ -264,6 +269,12 @@ void checkBlock(const Subject& subject, int32_t packetSize) {
 }  // namespace
 
 void checkRecording(const Subject& subject) {
+    if (!subject.isInvasive()) {
+        // A service may serve one client, whose recording would end.
+        subject.skip("records to shared memory",
+                     "it may take the recording of another client; see --invasive");
+        return;
+    }
     const sp<android::IBinder> client = new android::BBinder();
     const bool ready = step(subject, "registers a client", kRegisterClient,
                             [&client](Parcel& request) { request.writeStrongBinder(client); }) &&

@@ -30,7 +30,7 @@ std::string acceptance(const Subject& subject, uint32_t code, const char* token)
     if (token != nullptr) {
         subject.begin(request, token);
     }
-    const status_t result = subject.binder()->transact(code, request, &reply);
+    const status_t result = subject.transact(code, request, &reply);
     if (result == android::PERMISSION_DENIED) {
         return "";
     }
@@ -177,9 +177,10 @@ class DeathNotice : public IBinder::DeathRecipient {
 
 void checkDeathLinks(const Subject& subject) {
     const sp<DeathNotice> notice = new DeathNotice();
-    const status_t linked = subject.binder()->linkToDeath(notice);
-    const status_t unlinked =
-            linked == android::OK ? subject.binder()->unlinkToDeath(notice) : linked;
+    const status_t unlinked = subject.ask("death link", [&] {
+        const status_t linked = subject.binder()->linkToDeath(notice);
+        return linked == android::OK ? subject.binder()->unlinkToDeath(notice) : linked;
+    });
     subject.tell("lets its death be watched",
                  unlinked == android::OK ? "" : fmt::format("the link ended with {}", unlinked));
 }
@@ -187,7 +188,7 @@ void checkDeathLinks(const Subject& subject) {
 }  // namespace
 
 void checkWire(const Subject& subject) {
-    const status_t ping = subject.binder()->pingBinder();
+    const status_t ping = subject.ask("ping", [&] { return subject.binder()->pingBinder(); });
     subject.tell("answers a ping", ping == android::OK ? "" : fmt::format("result {}", ping));
     checkDescriptor(subject);
     checkTokens(subject);

@@ -32,6 +32,7 @@ constexpr milliseconds kGrace(800);
 constexpr milliseconds kCallPeriod(20);
 
 struct Wait {
+    uint64_t number;
     std::string what;
     bool isCall;
     Clock::time_point since;
@@ -39,6 +40,7 @@ struct Wait {
 
 std::mutex gLock;
 std::vector<Wait> gWaits;
+std::atomic<uint64_t> gLastWait{0};
 std::vector<std::function<void()>> gLastWords;
 
 std::atomic<bool> gMustStop{false};
@@ -210,14 +212,16 @@ int failStopped() {
     return fail(stopReason(), stopStatus());
 }
 
-Waiting::Waiting(const std::string& what, bool isCall) {
+Waiting::Waiting(const std::string& what, bool isCall) : mNumber(++gLastWait) {
     const std::lock_guard<std::mutex> guard(gLock);
-    gWaits.push_back({what, isCall, Clock::now()});
+    gWaits.push_back({mNumber, what, isCall, Clock::now()});
 }
 
+/// Threads may wait for several things at once, and end in any order.
 Waiting::~Waiting() {
     const std::lock_guard<std::mutex> guard(gLock);
-    gWaits.pop_back();
+    gWaits.erase(std::find_if(gWaits.begin(), gWaits.end(),
+                              [this](const Wait& wait) { return wait.number == mNumber; }));
 }
 
 LastWords::LastWords(std::function<void()> speak) {

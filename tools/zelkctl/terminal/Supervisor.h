@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <string>
 
@@ -33,6 +34,9 @@ class Waiting {
 
   protected:
     Waiting(const std::string& what, bool isCall);
+
+  private:
+    const uint64_t mNumber;
 };
 
 /// The same for the answer to an operation of a service.
