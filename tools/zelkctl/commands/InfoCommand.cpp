@@ -5,6 +5,7 @@
 #include "tools/zelkctl/services/Managers.h"
 #include "tools/zelkctl/services/MapText.h"
 #include "tools/zelkctl/services/StackQuery.h"
+#include "tools/zelkctl/terminal/Printable.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -52,6 +53,30 @@ class Info {
         mObject.add(name, object);
         for (const std::string& key : keysOf(map)) {
             mText += fmt::format("  {:18} {}\n", name, linesOf(map, {key}));
+        }
+    }
+
+    /// What no interface tells, as "name=value" lines of the simulated stack's own command.
+    void tellState(const std::string& name, const std::string& command) {
+        JsonObject object;
+        bool isTold = false;
+        for (const std::string& line : tryQueryStack(command)) {
+            const size_t equals = line.find('=');
+            if (equals == std::string::npos) {
+                continue;
+            }
+            const std::string key = line.substr(0, equals);
+            const std::string value = line.substr(equals + 1);
+            if (value == "on" || value == "off") {
+                object.addFlag(key, value == "on");
+            } else {
+                object.addParsed(key, value);
+            }
+            mText += fmt::format("  {:18} {}\n", name, printable(line));
+            isTold = true;
+        }
+        if (isTold) {
+            mObject.add(name, object);
         }
     }
 
@@ -131,6 +156,7 @@ class Info {
                  [&] { return client.getMaxUserDefinedGesture(count); }) == STATUS_NO_ERROR) {
             tell("userDefined", std::to_string(count));
         }
+        tellState("gestures", "gesturestate");
     }
 
     void tellHands(HandBiometricManagerClient& client) {
@@ -142,6 +168,7 @@ class Info {
             tell("profiles", std::to_string(names.size()));
             tell("maxProfiles", std::to_string(most));
         }
+        tellState("hands", "handstate");
     }
 
     std::string mText;

@@ -92,6 +92,11 @@ struct SwitchWord {
     const char* done;
 };
 
+/// Where to look for what can be set and not be asked for.
+constexpr const char* kStateIsInInfo =
+        "No interface tells the setting in force; \"zelkctl info\" shows what the simulated stack "
+        "tells of it.";
+
 /// A command that takes one of two words, with what a manager does for each.
 template <typename Manager>
 void addSwitchCommand(CLI::App& manager, Action& action, const char* name, const char* help,
@@ -101,6 +106,7 @@ void addSwitchCommand(CLI::App& manager, Action& action, const char* name, const
     auto word = std::make_shared<std::string>();
     Command(manager, action, name, help)
             .choice(*word, {on.word, off.word}, "What to do with it")
+            .details(kStateIsInInfo)
             .runs([=] {
                 const SwitchWord<Client>& chosen = *word == on.word ? on : off;
                 return operate<Manager>(

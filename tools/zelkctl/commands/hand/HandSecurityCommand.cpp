@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include <memory>
 
+#include "tools/zelkctl/commands/ManagerCommands.h"
 #include "tools/zelkctl/commands/hand/HandCommands.h"
 #include "tools/zelkctl/services/Managers.h"
 
@@ -21,9 +22,7 @@ void addHandSecurityCommand(CLI::App& hand, Action& action) {
     auto level = std::make_shared<int>(0);
     Command(hand, action, "security", "Set the security level")
             .number("LEVEL", *level, "A number that the service defines")
-            .details(
-                    "No interface tells the level in force; the events of the simulated stack "
-                    "do.")
+            .details(kStateIsInInfo)
             .runs([level] { return setSecurity(*level); });
 }
 
