@@ -135,7 +135,7 @@ TEST(Settings, CanBeReadAndListed) {
             {{"words", "SESSION"}, 0, "1\n2\n"},
             {{"words", "FEATURE"}, 0, "1\n2\n3\n4\n"},
             {{"words", "GESTURE"}, 0, "1\n2\n3\n4\n5\n6\n7\n8\n"},
-            {{"words", "PROPERTY"}, 0, "setRollingLogSize\n"},
+            {{"words", "SETTING"}, 0, "setRollingLogSize\n"},
     });
     EXPECT_THAT(zelkctl({"gesture", "list"}).output,
                 StartsWith("         1  enabled   predefined\n         2  disabled  predefined\n"));
@@ -150,6 +150,45 @@ TEST(Settings, CanBeReadAndListed) {
     EXPECT_THAT(object, HasSubstr("\"gain\":2.5,"));
     EXPECT_THAT(object, HasSubstr("{\"feature\":3,\"enabled\":true}"));
     EXPECT_EQ(1u, splitLines(object).size());
+}
+
+// No interface tells them; the simulated stack does.
+TEST(Settings, OfTheManagersAreShown) {
+    TouchStack stack({"--gesture-rate", "0", "--hand-rate", "0"});
+    expectRows({{{"gesture", "wakeup", "on"}, 0, "wake-up on\n"},
+                {{"hand", "security", "2"}, 0, "security level 2\n"}});
+    const std::string info = zelkctl({"info"}).output;
+    for (const char* line :
+         {"  gestures           detection=off\n", "  gestures           wakeup=on\n",
+          "  hands              activity=idle\n", "  hands              wakeup=off\n",
+          "  hands              security=2\n"}) {
+        EXPECT_THAT(info, HasSubstr(line));
+    }
+    const std::string object = zelkctl({"info", "--json"}).output;
+    EXPECT_THAT(object, HasSubstr("\"gestures\":{\"detection\":false,\"wakeup\":true}"));
+    EXPECT_THAT(object,
+                HasSubstr("\"hands\":{\"activity\":\"idle\",\"wakeup\":false,\"security\":2}"));
+    for (const Words& words : {Words{"gesture", "wakeup"}, Words{"gesture", "detect"},
+                               Words{"hand", "wakeup"}, Words{"hand", "security"}}) {
+        const RunResult help = zelkctl({words[0], words[1], "--help"});
+        EXPECT_THAT(help.output, HasSubstr("No interface tells the setting in force"));
+    }
+}
+
+TEST(Completion, OffersWhatTheServicesHave) {
+    TouchStack stack;
+    std::string parameters;
+    for (const std::string& line : splitLines(zelkctl({"afe", "get"}).output)) {
+        parameters += line.substr(0, line.find('=')) + "\n";
+    }
+    EXPECT_THAT(parameters, HasSubstr("frequency\n"));
+    expectRows({
+            {{"words", "PARAMETER"}, 0, parameters},
+            {{"words", "SERVICE"}, 0, "companion\ntouch\ngesture\nhand\n"},
+            {{"words", "PROPERTY"},
+             0,
+             "authenticated\nevents\nrecordFilter\nrollingLogSize\nsessions\n"},
+    });
 }
 
 TEST(Settings, AreNotListedByAServiceThatHasNoWayTo) {

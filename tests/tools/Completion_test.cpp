@@ -85,6 +85,14 @@ TEST(BashCompletion, FollowsTheCommandLine) {
             {"record --frames 5", "--o", {"--output"}},
             {"record --frames", "", {}},
             {"help", "rec", {"record", "record-file"}},
+            {"help session", "", {"save", "list", "restore"}},
+            {"help session save", "", {}},
+            {"help ping", "", {}},
+            {"check", "", {"companion", "touch", "gesture", "hand"}},
+            {"check touch", "h", {"hand"}},
+            {"frames export frames.bin --format", "", {"png", "csv", "cells", "json"}},
+            {"frames export -f", "c", {"csv", "cells"}},
+            {"hand watch --event", "hand-d", {"hand-detected"}},
             {"touch features", "", {"--first", "--last", "--json", "--timeout", "--help"}},
             {"touch region", "", {}},
             {"property set setRollingLogSize", "", {}},
@@ -99,6 +107,29 @@ TEST(BashCompletion, FollowsTheCommandLine) {
     };
     for (const auto& row : rows) {
         EXPECT_EQ(row.offered, asSet(completeInBash(row.words, row.typed))) << row.words;
+    }
+}
+
+TEST(ZshCompletion, OffersTheCommandsBehindThoseThatHelpIsAskedFor) {
+    const struct {
+        const char* words;
+        const char* offered;
+    } rows[] = {
+            {"help session ''", "save list restore"},
+            {"help --json session ''", "save list restore"},
+            {"help session save ''", ""},
+            {"help ping ''", ""},
+    };
+    for (const auto& row : rows) {
+        const RunResult result = run({"zsh", "-f", "-c",
+                                      "_arguments() { print -r -- arguments }\n"
+                                      "_describe() { print -r -- ${${(P)^@[-1]}%%:*} }\n"
+                                      ". " ZELK_REFERENCE_DIR "/_zelkctl\n"
+                                      "words=(" +
+                                              std::string(row.words) +
+                                              ")\nCURRENT=$#words\n_zelkctl_values COMMAND\n"});
+        EXPECT_EQ("", result.errors) << row.words;
+        EXPECT_EQ(row.offered, result.output.substr(0, result.output.find('\n'))) << row.words;
     }
 }
 

@@ -47,12 +47,36 @@ TEST_P(Usage, IsRefusedInOneLine) {
 }
 
 TEST(Version, IsTheLibrarysOwn) {
-    for (const char* program : {"zelkctl", "zelk-touchstack"}) {
-        const RunResult result = runLine(std::string(program) + " --version");
-        EXPECT_EQ(0, result.status);
-        EXPECT_EQ(std::string(program) + " " ZELK_VERSION "\n", result.output);
+    for (const char* line : {"zelkctl --version", "zelk-touchstack --version",
+                             // Wherever it is asked for, and whatever else is missing.
+                             "zelkctl ping --version", "zelkctl hand --version",
+                             "zelkctl hand rename --version", "zelkctl frames export --version"}) {
+        const RunResult result = runLine(line);
+        const std::string program = std::string(line).substr(0, std::string(line).find(' '));
+        EXPECT_EQ(0, result.status) << line;
+        EXPECT_EQ(program + " " ZELK_VERSION "\n", result.output) << line;
         EXPECT_EQ("", result.errors);
     }
+}
+
+TEST(Help, IsAnObjectOnRequest) {
+    const RunResult result = runLine("zelkctl help session restore --json");
+    EXPECT_EQ(0, result.status);
+    EXPECT_EQ("", result.errors);
+    EXPECT_EQ(
+            "{\"command\":\"zelkctl session restore\",\"help\":\"Go back to the settings of a "
+            "session\",\"details\":\"\",\"operands\":[{\"name\":\"SESSION\",\"help\":\"The "
+            "session's "
+            "number\"}],\"options\":[{\"name\":\"--help\",\"help\":\"Print this help message and "
+            "exit\"},{\"name\":\"--json\",\"help\":\"Print results and errors as JSON, one object "
+            "a "
+            "line\"},{\"name\":\"--timeout\",\"help\":\"Give a call up after so many seconds, and "
+            "exit with 4\",\"value\":\"SECONDS\"}],\"commands\":[]}\n",
+            result.output);
+    const std::string all = runLine("zelkctl --json help").output;
+    EXPECT_NE(std::string::npos,
+              all.find("{\"name\":\"ping\",\"help\":\"Ask whether the touch service is alive\"}"));
+    EXPECT_EQ(std::string::npos, all.find("\"words\""));
 }
 
 INSTANTIATE_TEST_SUITE_P(
@@ -89,6 +113,8 @@ INSTANTIATE_TEST_SUITE_P(
         CompanionCommands, Usage,
         ::testing::Values(
                 Misuse{"zelkctl check finger", "zelkctl: SERVICE: there is no 'finger'"},
+                Misuse{"zelkctl check touch gestur",
+                       "zelkctl: SERVICE: there is no 'gestur'; did you mean 'gesture'?"},
                 Misuse{"zelkctl command", "zelkctl: TEXT is required"},
                 Misuse{"zelkctl command calibrate 3", "zelkctl: the argument '3' is one too many"},
                 Misuse{"zelkctl filter", "zelkctl: MASK is required"},
@@ -107,6 +133,20 @@ INSTANTIATE_TEST_SUITE_P(
                 Misuse{"zelkctl session restore", "zelkctl: SESSION is required"},
                 Misuse{"zelkctl record-file --seconds 0 frames",
                        "zelkctl: --seconds: '0' is no number from 0.001 to 1000000"}));
+
+// One reader of numbers for all commands.
+INSTANTIATE_TEST_SUITE_P(
+        FramesCommands, Usage,
+        ::testing::Values(Misuse{"zelkctl frames export f -f csv --first 08",
+                                 "zelkctl: --first: '08' is no number from 0 to 1000000000000"},
+                          Misuse{"zelkctl frames export f -f csv --last 1.5",
+                                 "zelkctl: --last: '1.5' is no number from 0 to 1000000000000"},
+                          Misuse{"zelkctl frames export f -f csv --every 0",
+                                 "zelkctl: --every: '0' is no number from 1 to 1000000000000"},
+                          Misuse{"zelkctl frames export f -f png --scale 65",
+                                 "zelkctl: --scale: '65' is no number from 1 to 64"},
+                          Misuse{"zelkctl frames report f -o page --every -1",
+                                 "zelkctl: --every: '-1' is no number from 1 to 1000000"}));
 
 INSTANTIATE_TEST_SUITE_P(
         ManagerCommands, Usage,
@@ -134,6 +174,8 @@ INSTANTIATE_TEST_SUITE_P(
                 Misuse{"zelkctl gesture wakeup", "zelkctl: on|off is required"},
                 Misuse{"zelkctl gesture wakeup maybe",
                        "zelkctl: on|off: 'maybe' is neither of them"},
+                Misuse{"zelkctl gesture detect strat",
+                       "zelkctl: start|stop: 'strat' is neither of them; did you mean 'start'?"},
                 Misuse{"zelkctl gesture detect on", "zelkctl: start|stop: 'on' is neither of them"},
                 Misuse{"zelkctl gesture add", "zelkctl: FILE is required"},
                 Misuse{"zelkctl gesture verify", "zelkctl: FILE is required"},
@@ -146,7 +188,7 @@ INSTANTIATE_TEST_SUITE_P(
                        "zelkctl: --output needs --count, --seconds or --wait"},
                 Misuse{"zelkctl touch features --first 5 --last 2",
                        "zelkctl: --first: 5 is behind --last, 2"},
-                Misuse{"zelkctl afe get gain --channels", "zelkctl: --channels excludes NAME"},
+                Misuse{"zelkctl afe get gain --channels", "zelkctl: --channels excludes PARAMETER"},
                 Misuse{"zelkctl afe set gain", "zelkctl: 'gain' is no KEY=VALUE"},
                 Misuse{"zelkctl config set =5", "zelkctl: there is no name"},
                 Misuse{"zelkctl config set gain=", "zelkctl: gain is given no value"},
@@ -174,6 +216,10 @@ INSTANTIATE_TEST_SUITE_P(
                        "zelk-touchstack: --fault: a fault is OPERATION=WHAT, not 'open'"},
                 Misuse{"zelk-touchstack --services hand,foot",
                        "zelk-touchstack: --services: there is no 'foot'"},
+                Misuse{"zelk-touchstack --services hnad",
+                       "zelk-touchstack: --services: there is no 'hnad'; did you mean 'hand'?"},
+                Misuse{"zelk-touchstack --remind 08",
+                       "zelk-touchstack: --remind: '08' is no number from 0 to 1000000"},
                 Misuse{"zelk-touchstack --gesture-rate 1001",
                        "zelk-touchstack: --gesture-rate: '1001' is no number from 0 to 1000"},
                 Misuse{"zelk-touchstack --fault touch.scan=die",

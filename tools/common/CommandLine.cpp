@@ -123,16 +123,21 @@ class Walk {
 
     static std::string unknown(const char* kind, const std::string& word,
                                const std::vector<std::string>& known) {
-        const std::string nearest = nearestWord(word, known);
-        const std::string hint =
-                nearest.empty() ? "" : fmt::format("; did you mean '{}'?", nearest);
-        return fmt::format("there is no {} '{}'{}", kind, word, hint);
+        return fmt::format("there is no {} '{}'{}", kind, word, nearestWordHint(word, known));
     }
 
     const CLI::App* mCommand;
     size_t mOperands = 0;
     bool mOperandsOnly = false;
 };
+
+/// Whoever asks for the version behind a command is answered as well; the help lists it once.
+void addVersionBehind(CLI::App& app, const std::string& version) {
+    for (CLI::App* command : app.get_subcommands({})) {
+        command->set_version_flag("--version", version)->group("");
+        addVersionBehind(*command, version);
+    }
+}
 
 }  // namespace
 
@@ -148,6 +153,7 @@ std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
     };
     app.set_version_flag("--version", app.get_name() + " " ZELK_VERSION,
                          "Print the version and exit");
+    addVersionBehind(app, app.get_name() + " " ZELK_VERSION);
     const std::string problem = Walk(app).problem({argv + 1, argv + argc});
     if (!problem.empty()) {
         return refuse(problem);

@@ -42,4 +42,9 @@ std::string nearestWord(const std::string& typed, const std::vector<std::string>
     return nearest;
 }
 
+std::string nearestWordHint(const std::string& typed, const std::vector<std::string>& words) {
+    const std::string nearest = nearestWord(typed, words);
+    return nearest.empty() ? "" : "; did you mean '" + nearest + "'?";
+}
+
 }  // namespace pemaro::tools

@@ -62,6 +62,10 @@ std::string decimalProblem(const std::string& text, DecimalRange range) {
                                                    text, range.least, range.most);
 }
 
+std::string orderProblem(int64_t first, int64_t last) {
+    return first > last ? fmt::format("--first: {} is behind --last, {}", first, last) : "";
+}
+
 std::string numberListProblem(const std::string& list) {
     for (size_t start = 0, end = 0; end != std::string::npos; start = end + 1) {
         end = list.find(' ', start);

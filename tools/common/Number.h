@@ -36,6 +36,9 @@ std::optional<double> parseDecimal(const std::string& text, DecimalRange range);
 std::string numberProblem(const std::string& text, NumberRange range);
 std::string decimalProblem(const std::string& text, DecimalRange range);
 
+/// What is wrong with the options --first and --last; empty when nothing is.
+std::string orderProblem(int64_t first, int64_t last);
+
 /// The first thing that is wrong in a list of 32-bit numbers with single spaces between; empty when
 /// nothing is. The library would take what is no number for 0.
 std::string numberListProblem(const std::string& list);

@@ -21,6 +21,7 @@
 #include "simulator/companion/ReplayedFrames.h"
 #include "tools/common/BinderDriver.h"
 #include "tools/common/CommandLine.h"
+#include "tools/common/NearestWord.h"
 #include "tools/common/Number.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/touchstack/Registrar.h"
@@ -97,7 +98,7 @@ void addOptions(CLI::App& app, CommandLine& line, Texts& texts) {
     app.add_option("--remind", options.remindUs,
                    "Microseconds after which a frame that was not taken is signalled again; 0 is "
                    "never")
-            ->check(CLI::Range(0u, SimulatorOptions::kMaxRemindUs))
+            ->check(whole(0, SimulatorOptions::kMaxRemindUs), "")
             ->capture_default_str();
     app.add_option("--fingers", options.fingers, "Fingers on the panel")
             ->check(whole(0, SimulatorOptions::kMaxFingers), "")
@@ -155,6 +156,14 @@ void addManagerOptions(CLI::App& app, ManagerOptions& options) {
             ->capture_default_str();
 }
 
+std::vector<std::string> serviceWords() {
+    std::vector<std::string> words;
+    for (const ServiceKind service : pemaro::simulator::kServiceKinds) {
+        words.emplace_back(pemaro::simulator::shortName(service));
+    }
+    return words;
+}
+
 void readServices(const std::vector<std::string>& names, std::set<ServiceKind>& services) {
     if (!names.empty()) {
         services.clear();
@@ -162,7 +171,9 @@ void readServices(const std::vector<std::string>& names, std::set<ServiceKind>& 
     for (const std::string& name : names) {
         const auto service = pemaro::simulator::serviceKindOf(name);
         if (!service) {
-            throw CLI::ValidationError("--services", fmt::format("there is no '{}'", name));
+            throw CLI::ValidationError("--services", fmt::format("there is no '{}'{}", name,
+                                                                 pemaro::tools::nearestWordHint(
+                                                                         name, serviceWords())));
         }
         services.insert(*service);
     }

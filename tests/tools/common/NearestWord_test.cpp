@@ -26,6 +26,8 @@ TEST(NearestWord, IsTheOneThatWasProbablyMeant) {
         EXPECT_EQ(row.nearest, nearestWord(row.typed, words)) << row.typed;
     }
     EXPECT_EQ("", nearestWord("ping", {}));
+    EXPECT_EQ("; did you mean 'ping'?", nearestWordHint("pign", words));
+    EXPECT_EQ("", nearestWordHint("fly", words));
 }
 
 }  // namespace pemaro::tools

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "tools/common/NearestWord.h"
 #include "tools/zelkctl/conformance/Conformance.h"
 #include "tools/zelkctl/services/ServiceWatch.h"
 #include "tools/zelkctl/terminal/Output.h"
@@ -37,11 +38,16 @@ struct CheckOptions {
     }
 };
 
-bool isChecked(const std::string& service) {
-    const auto& interfaces = checkedInterfaces();
-    return std::any_of(
-            std::begin(interfaces), std::end(interfaces),
-            [&service](const CheckedInterface& interface) { return interface.word == service; });
+/// What is wrong with the words for services; empty when nothing is.
+std::string problemOf(const std::vector<std::string>& services) {
+    const std::vector<std::string> known = checkedWords();
+    for (const std::string& service : services) {
+        if (std::find(known.begin(), known.end(), service) == known.end()) {
+            return fmt::format("SERVICE: there is no '{}'{}", service,
+                               tools::nearestWordHint(service, known));
+        }
+    }
+    return "";
 }
 
 int check(const CheckOptions& options) {
@@ -70,7 +76,6 @@ int check(const CheckOptions& options) {
     }
     Findings findings(options.style(), say);
     for (const auto& [interface, binder] : found) {
-        const Calling calling(std::string("check of ") + interface->word);
         checkService(binder, *interface, options.invasive,
                      [&findings](const Finding& finding) { findings.add(finding); });
     }
@@ -86,19 +91,15 @@ void addCheckCommand(CLI::App& app, Action& action) {
             .operands("SERVICE", options->services,
                       "companion, touch, gesture or hand (all that run)", 0)
             .flag("--invasive", options->invasive,
-                  "Check operations as well that may change the service's state")
+                  "Record frames as well, and check operations that may change the service's state")
             .flag("--tap", options->tap, "Print in the Test Anything Protocol")
             .details(
                     "Looked at is whether a service keeps to what clients rely on. Each check has "
                     "passed, failed, or was skipped for a reason; the exit status is 1 when one "
                     "failed.")
             .check([options]() -> std::string {
-                for (const std::string& service : options->services) {
-                    if (!isChecked(service)) {
-                        return fmt::format("SERVICE: there is no '{}'", service);
-                    }
-                }
-                return options->tap && settings().json ? "--tap excludes --json" : "";
+                return options->tap && settings().json ? "--tap excludes --json"
+                                                       : problemOf(options->services);
             })
             .runs([options] { return check(*options); });
 }

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "tools/common/NearestWord.h"
 #include "tools/common/Number.h"
 #include "tools/zelkctl/terminal/Settings.h"
 
@@ -24,7 +25,8 @@ std::string join(const std::vector<std::string>& words) {
 std::function<std::string(const std::string&)> isOneOf(const std::vector<std::string>& words) {
     return [words](const std::string& typed) {
         const bool known = std::find(words.begin(), words.end(), typed) != words.end();
-        return known ? "" : "'" + typed + "' is neither of them";
+        const std::string none = words.size() == 2 ? "neither of them" : "none of " + join(words);
+        return known ? "" : "'" + typed + "' is " + none + tools::nearestWordHint(typed, words);
     };
 }
 

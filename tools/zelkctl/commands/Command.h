@@ -31,8 +31,8 @@ using Action = std::function<int()>;
 ///             .operand("NAME", options->second, "The new name")
 ///             .runs([options] { return rename(*options); });
 ///
-/// The word of an operand tells the completion what may stand there: FILE, KEY, KEY=VALUE, FEATURE,
-/// GESTURE, PROFILE, PROPERTY, SESSION, COMMAND.
+/// The word of an operand or of an option's value tells the completion what may stand there: FILE,
+/// COMMAND, or one of those that the hidden command "words" knows.
 class Command {
   public:
     Command(CLI::App& app, Action& action, const std::string& name, const std::string& help);

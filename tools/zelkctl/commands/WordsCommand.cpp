@@ -1,10 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
+#include <algorithm>
 #include <memory>
 
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/commands/touch/TouchCommands.h"
+#include "tools/zelkctl/conformance/Operations.h"
 #include "tools/zelkctl/services/Companion.h"
+#include "tools/zelkctl/services/EventRecord.h"
 #include "tools/zelkctl/services/Managers.h"
+#include "tools/zelkctl/services/MapText.h"
 #include "tools/zelkctl/services/StackQuery.h"
 #include "tools/zelkctl/terminal/Printable.h"
 
@@ -46,24 +50,49 @@ Words firstWords(const std::string& command) {
     return words;
 }
 
-int printWords(const std::string& kind) {
-    if (kind == "PROPERTY") {
-        say("setRollingLogSize");
-        return tools::kExitSuccess;
-    }
-    const int exitStatus = startBinder();
-    if (exitStatus != tools::kExitSuccess) {
-        return exitStatus;
-    }
+/// The keys of a map that the touch companion tells.
+Words keysFrom(int (ITouchCompanionService::*read)(SerializableMap&), const char* operation) {
     Words words;
-    if (kind == "FEATURE") {
-        words = features();
-    } else if (kind == "PROFILE") {
-        words = profiles();
-    } else {
-        words = firstWords(kind == "KEY" ? "keys" : kind == "SESSION" ? "sessions" : "gestures");
+    withService([&](ITouchCompanionService& service) {
+        SerializableMap map;
+        if (call(operation, [&] { return (service.*read)(map); }) == STATUS_NO_ERROR) {
+            words = keysOf(map);
+        }
+        return tools::kExitSuccess;
+    });
+    return words;
+}
+
+/// What may stand for an operand or an option's value, and whether a service is asked for it.
+struct Kind {
+    const char* word;
+    bool isAsked;
+    Words (*find)();
+};
+
+const Kind kKinds[] = {
+        {"EVENT", false, handEventNames},
+        {"FEATURE", true, features},
+        {"GESTURE", true, [] { return firstWords("gestures"); }},
+        {"KEY", true, [] { return firstWords("keys"); }},
+        {"PARAMETER", true,
+         [] { return keysFrom(&ITouchCompanionService::getAFEParams, "getAFEParams"); }},
+        {"PROFILE", true, profiles},
+        {"PROPERTY", true,
+         [] { return keysFrom(&ITouchCompanionService::getProperties, "getProperties"); }},
+        {"SERVICE", false, checkedWords},
+        {"SESSION", true, [] { return firstWords("sessions"); }},
+        {"SETTING", false, [] { return Words{"setRollingLogSize"}; }},
+};
+
+int printWords(const Kind& kind) {
+    if (kind.isAsked) {
+        const int exitStatus = startBinder();
+        if (exitStatus != tools::kExitSuccess) {
+            return exitStatus;
+        }
     }
-    for (const std::string& word : words) {
+    for (const std::string& word : kind.find()) {
         say(printable(word));
     }
     return tools::kExitSuccess;
@@ -72,12 +101,19 @@ int printWords(const std::string& kind) {
 }  // namespace
 
 void addWordsCommand(CLI::App& app, Action& action) {
-    auto kind = std::make_shared<std::string>();
+    Words words;
+    for (const Kind& kind : kKinds) {
+        words.emplace_back(kind.word);
+    }
+    auto chosen = std::make_shared<std::string>();
     Command(app, action, "words", "Print what may stand for an operand")
-            .choice(*kind, {"FEATURE", "GESTURE", "KEY", "PROFILE", "PROPERTY", "SESSION"},
-                    "The operand")
+            .choice(*chosen, words, "The operand")
             .hidden()
-            .runs([kind] { return printWords(*kind); });
+            .runs([chosen] {
+                return printWords(*std::find_if(
+                        std::begin(kKinds), std::end(kKinds),
+                        [&chosen](const Kind& kind) { return kind.word == *chosen; }));
+            });
 }
 
 }  // namespace pemaro::zelkctl

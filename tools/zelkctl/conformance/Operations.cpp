@@ -194,6 +194,14 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
     return interfaces;
 }
 
+std::vector<std::string> checkedWords() {
+    std::vector<std::string> words;
+    for (const CheckedInterface& interface : checkedInterfaces()) {
+        words.emplace_back(interface.word);
+    }
+    return words;
+}
+
 bool isKnownStatus(int32_t status) {
     return status == STATUS_NO_ERROR ||
            (status >= STATUS_UNKNOWN_ERROR && status <= STATUS_CORRUPT_DATA);

@@ -47,6 +47,9 @@ struct CheckedInterface {
 /// All four, in the order in which they are checked.
 const std::vector<CheckedInterface>& checkedInterfaces();
 
+/// What they are called on the command line.
+std::vector<std::string> checkedWords();
+
 /// Whether it is 0 or one of the thirty.
 bool isKnownStatus(int32_t status);
 

@@ -191,7 +191,7 @@ std::string zshCommands(const Entry& root) {
                 "_zelkctl" + (entry.path.empty() ? "" : "-" + replaceAll(entry.path, " ", "-"));
         text += name + "-words() {\n";
         if (entry.commands.empty()) {
-            text += "    _arguments";
+            text += "    _zelkctl_arguments";
         } else {
             text += "    _zelkctl_commands " + name;
             for (const Entry& command : entry.commands) {

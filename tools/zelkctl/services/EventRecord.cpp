@@ -153,7 +153,11 @@ std::string gestureWords() {
 }
 
 std::string handEventWords() {
-    return fmt::format("{}", fmt::join(wordsFor(nameOfEvent), ", "));
+    return fmt::format("{}", fmt::join(handEventNames(), ", "));
+}
+
+std::vector<std::string> handEventNames() {
+    return wordsFor(nameOfEvent);
 }
 
 EventRecord EventRecord::read(const void* record, size_t size) {

@@ -23,6 +23,9 @@ std::optional<simulator::HandEvent> handEventOf(const std::string& text);
 std::string gestureWords();
 std::string handEventWords();
 
+/// The names of the events of hands, as they are typed.
+std::vector<std::string> handEventNames();
+
 /// Which events are wanted: those that are all that is told here.
 struct EventFilter {
     std::optional<int> gesture;

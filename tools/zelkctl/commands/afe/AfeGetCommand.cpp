@@ -44,11 +44,13 @@ int getParameters(const Options& options) {
 void addAfeGetCommand(CLI::App& afe, Action& action) {
     auto options = std::make_shared<Options>();
     Command(afe, action, "get", "Print parameters of the analog front end")
-            .operands("NAME", options->names, "The parameters; without one, all that there are", 0)
+            .operands("PARAMETER", options->names,
+                      "The parameters; without one, all that there are", 0)
             .flag("--channels", options->channels, "All of them for each channel, as an array")
             .check([options] {
-                return options->channels && !options->names.empty() ? "--channels excludes NAME"
-                                                                    : "";
+                return options->channels && !options->names.empty()
+                               ? "--channels excludes PARAMETER"
+                               : "";
             })
             .runs([options] { return getParameters(*options); });
 }

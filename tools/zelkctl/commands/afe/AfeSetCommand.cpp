@@ -28,7 +28,7 @@ void addAfeSetCommand(CLI::App& afe, Action& action) {
     auto pairs = std::make_shared<Pairs>();
     auto parameters = std::make_shared<SerializableMap>();
     Command(afe, action, "set", "Set parameters of the analog front end, all or none")
-            .operands("NAME=VALUE", *pairs, "The parameters with their values")
+            .operands("PARAMETER=VALUE", *pairs, "The parameters with their values")
             .check([=] { return readPairs(*pairs, *parameters); })
             .runs([parameters] { return setParameters(*parameters); });
 }

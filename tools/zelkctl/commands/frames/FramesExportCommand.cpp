@@ -10,7 +10,6 @@
 
 #include "frames/FrameContent.h"
 #include "frames/RecordingFile.h"
-#include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
 #include "tools/zelkctl/commands/frames/OpenRecording.h"
 #include "tools/zelkctl/files/FramePicture.h"
@@ -74,8 +73,8 @@ int exportPictures(const RecordingFile& file, const ExportOptions& options) {
                                 strerror(errno)));
     }
     const PictureStyle style{options.scale, hottestCell(file)};
-    uint64_t drawn = 0;
-    uint64_t without = 0;
+    int64_t drawn = 0;
+    int64_t without = 0;
     std::string problem;
     forEachFrame(file, options, [&](uint64_t number, const FrameContent& frame) {
         const std::string png = drawFrame(frame, style);
@@ -98,9 +97,12 @@ int exportPictures(const RecordingFile& file, const ExportOptions& options) {
     if (!problem.empty()) {
         return fail(printable(problem));
     }
-    tools::writeError(
-            fmt::format("{} pictures in {}{}", drawn, printable(options.output),
-                        without == 0 ? "" : fmt::format(", {} frames have no image", without)));
+    sayResult(fmt::format("{} pictures in {}{}", drawn, printable(options.output),
+                          without == 0 ? "" : fmt::format(", {} frames have no image", without)),
+              JsonObject()
+                      .add("pictures", drawn)
+                      .add("without_image", without)
+                      .add("folder", options.output));
     return mustStop() ? failStopped() : tools::kExitSuccess;
 }
 
@@ -118,7 +120,9 @@ int exportText(const RecordingFile& file, const ExportOptions& options) {
         // A file may hold images of several widths: the head has names for the widest.
         output.write(cellsCsvHead(summarize(file).columns.most));
     }
+    int64_t written = 0;
     forEachFrame(file, options, [&](uint64_t number, const FrameContent& frame) {
+        written += 1;
         return output.write(text(number, frame));
     });
     if (mustStop() && output.result().isGood()) {
@@ -127,7 +131,15 @@ int exportText(const RecordingFile& file, const ExportOptions& options) {
     if (!file.problem().empty()) {
         return fail(printable(file.problem()));
     }
-    return output.close() ? tools::kExitSuccess : fail(printable(output.problem()));
+    if (!output.close()) {
+        return fail(printable(output.problem()));
+    }
+    // What was asked for on the standard output stands there alone.
+    if (options.output != kStandardOutput) {
+        sayResult(fmt::format("{} frames in {}", written, printable(options.output)),
+                  JsonObject().add("frames", written).add("file", options.output));
+    }
+    return tools::kExitSuccess;
 }
 
 int exportFrames(const ExportOptions& options) {
@@ -151,12 +163,10 @@ int exportFrames(const ExportOptions& options) {
 }
 
 std::string problemOf(const ExportOptions& options) {
-    if (options.first > options.last) {
-        return "--first: is behind --last";
-    }
     return options.format == "png" && options.output == kStandardOutput
                    ? "--output: pictures need a folder"
-                   : "";
+                   : tools::orderProblem(static_cast<int64_t>(options.first),
+                                         static_cast<int64_t>(options.last));
 }
 
 }  // namespace
@@ -174,13 +184,13 @@ void addFramesExportCommand(CLI::App& frames, Action& action) {
             .number("--first", options->first, "First frame, counted from 0", {0, kMaxNumber})
             .number("--last", options->last, "Last frame", {0, kMaxNumber})
             .number("--every", options->every, "Only every so many frames", {1, kMaxNumber})
-            .number("--scale", options->scale, "Pixels of a cell of a picture (8)", {1, kMaxScale})
+            .number("--scale", options->scale,
+                    fmt::format("Pixels of a cell of a picture ({})", options->scale),
+                    {1, kMaxScale})
             .details(
                     "A picture is a heat map with a cross at each finger, in which the hottest "
-                    "cell "
-                    "of the whole recording is the brightest. What is intact of a damaged "
-                    "recording "
-                    "is exported, and the exit status is 1 then.")
+                    "cell of the whole recording is the brightest. What is intact of a damaged "
+                    "recording is exported, and the exit status is 1 then.")
             .check([options] { return problemOf(*options); })
             .runs([options] { return exportFrames(*options); });
 }

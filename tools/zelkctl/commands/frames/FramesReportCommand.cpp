@@ -6,6 +6,7 @@
 #include "tools/zelkctl/commands/frames/OpenRecording.h"
 #include "tools/zelkctl/files/FrameReport.h"
 #include "tools/zelkctl/files/OutputFile.h"
+#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Printable.h"
 #include "tools/zelkctl/terminal/Report.h"
 #include "tools/zelkctl/terminal/Supervisor.h"
@@ -25,6 +26,9 @@ int makeReport(const ReportOptions& options) {
     if (file == nullptr) {
         return exitStatus;
     }
+    if (options.output == kStandardOutput) {
+        giveOutputToData();
+    }
     OutputFile output;
     if (!output.open(options.output)) {
         return fail(printable(output.problem()));
@@ -41,6 +45,12 @@ int makeReport(const ReportOptions& options) {
     if (!output.write(page) || !output.close()) {
         return fail(printable(output.problem()));
     }
+    const auto shown = static_cast<int64_t>((summary.frames + options.every - 1) / options.every);
+    sayResult(fmt::format("{} frames in {}", shown, printable(options.output)),
+              JsonObject()
+                      .add("frames", shown)
+                      .add("bytes", static_cast<int64_t>(page.size()))
+                      .add("file", options.output));
     const std::string damage = damageText(summary);
     return damage.empty() ? tools::kExitSuccess
                           : fail(fmt::format("{}: {}; the page has the intact frames",

@@ -24,7 +24,7 @@ int getProperties(const std::vector<std::string>& wanted) {
 void addPropertyGetCommand(CLI::App& property, Action& action) {
     auto names = std::make_shared<std::vector<std::string>>();
     Command(property, action, "get", "Print properties")
-            .operands("NAME", *names, "The properties; without one, all that there are", 0)
+            .operands("PROPERTY", *names, "The properties; without one, all that there are", 0)
             .runs([names] { return getProperties(*names); });
 }
 

@@ -28,7 +28,7 @@ int setProperty(const Property& property) {
 void addPropertySetCommand(CLI::App& app, Action& action) {
     auto property = std::make_shared<Property>();
     Command(app, action, "set", "Set a property to a number")
-            .operand("PROPERTY", property->name, "The property: setRollingLogSize")
+            .operand("SETTING", property->name, "The property: setRollingLogSize")
             .operand("VALUE", property->value, "A number, or several in one argument")
             .check([property] {
                 const std::string problem = tools::numberListProblem(property->value);

@@ -99,12 +99,7 @@ void addTouchFeaturesCommand(CLI::App& touch, Action& action) {
             .number("--first", options->first, "First number to ask for (0)")
             .number("--last", options->last,
                     fmt::format("Last number to ask for ({})", kLastFeature))
-            .check([options] {
-                return options->first > options->last
-                               ? fmt::format("--first: {} is behind --last, {}", options->first,
-                                             options->last)
-                               : "";
-            })
+            .check([options] { return tools::orderProblem(options->first, options->last); })
             .runs([options] { return showFeatures(*options); });
 }
 

@@ -63,8 +63,8 @@ TEST_F(FramesExport, DrawsAHeatMapOfEachFrame) {
     const RunResult result =
             framesCommand({"export", path, "-f", "png", "-o", folder, "--scale", "5"});
     EXPECT_EQ(0, result.status);
-    EXPECT_EQ("", result.output);
-    EXPECT_EQ("7 pictures in " + folder + "\n", result.errors);
+    EXPECT_EQ("7 pictures in " + folder + "\n", result.output);
+    EXPECT_EQ("", result.errors);
 
     int full = 0;
     std::vector<frames::FrameContent> contents;
@@ -101,7 +101,9 @@ TEST_F(FramesExport, LeavesOutFramesWithoutAnImage) {
     const std::string folder = recordings.path("pictures");
     const RunResult result = framesCommand({"export", mixed, "-f", "png", "-o", folder});
     EXPECT_EQ(0, result.status);
-    EXPECT_EQ("1 pictures in " + folder + ", 1 frames have no image\n", result.errors);
+    EXPECT_EQ("1 pictures in " + folder + ", 1 frames have no image\n", result.output);
+    EXPECT_EQ("{\"pictures\":1,\"without_image\":1,\"folder\":\"" + folder + "\"}\n",
+              framesCommand({"export", mixed, "-f", "png", "-o", folder, "--json"}).output);
     EXPECT_EQ(72u, decode(folder + "/frame-000000.png").width);
 }
 
@@ -162,8 +164,13 @@ TEST_F(FramesExport, TakesTheFramesAskedFor) {
 
 TEST_F(FramesExport, WritesToAFile) {
     const std::string file = recordings.write("fingers.csv", "what was there before");
-    EXPECT_EQ((std::vector<std::string>{}), lines("csv", {"--output", file}));
+    EXPECT_EQ((std::vector<std::string>{"7 frames in " + file}), lines("csv", {"--output", file}));
     EXPECT_EQ(15u, splitLines(recordings.read("fingers.csv")).size());
+    EXPECT_EQ((std::vector<std::string>{"{\"frames\":2,\"file\":\"" + file + "\"}"}),
+              lines("csv", {"--output", file, "--last", "1", "--json"}));
+    EXPECT_EQ(5u, splitLines(recordings.read("fingers.csv")).size());
+    // Data on the standard output stands there alone.
+    EXPECT_EQ(15u, lines("csv", {"--output", "-", "--json"}).size());
 }
 
 TEST_F(FramesExport, TellsWhatItCannotWrite) {
@@ -204,12 +211,18 @@ TEST_F(FramesExport, RefusesWhatMakesNoSense) {
         int status;
         std::string error;
     } rows[] = {
-            {{"-f", "gif"}, 2, "zelkctl: --format: 'gif' is neither of them (--help tells more)\n"},
+            {{"-f", "gif"},
+             2,
+             "zelkctl: --format: 'gif' is none of png|csv|cells|json (--help tells more)\n"},
+            {{"-f", "jsno"},
+             2,
+             "zelkctl: --format: 'jsno' is none of png|csv|cells|json; did you mean 'json'? "
+             "(--help tells more)\n"},
             {{}, 2, "zelkctl: --format is required (--help tells more)\n"},
             {{"-f", "png"}, 2, "zelkctl: --output: pictures need a folder (--help tells more)\n"},
             {{"-f", "csv", "--first", "5", "--last", "2"},
              2,
-             "zelkctl: --first: is behind --last (--help tells more)\n"},
+             "zelkctl: --first: 5 is behind --last, 2 (--help tells more)\n"},
             {{"-f", "csv", "--first", "7"},
              1,
              "zelkctl: " + path + " has 7 frames: there is no frame 7\n"},

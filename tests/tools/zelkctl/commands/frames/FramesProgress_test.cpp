@@ -109,7 +109,7 @@ TEST_F(FramesProgress, IsShownWhileFramesAreExported) {
     hurry = true;
     EXPECT_TRUE(terminal.awaitText("ended with 0"));
     reader.join();
-    EXPECT_THAT(terminal.text(), MatchesRegex("ended with 0\n+"));
+    EXPECT_THAT(terminal.text(), MatchesRegex("3000 frames in " + fifo + "\nended with 0\n+"));
     EXPECT_EQ(kFrames, splitLines(drained).size());
 }
 

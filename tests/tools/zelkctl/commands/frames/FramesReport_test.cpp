@@ -72,11 +72,13 @@ class FramesReport : public ::testing::Test {
         more.insert(more.begin(), {"report", path, "-o", recordings.path("page.html")});
         const RunResult result = framesCommand(more);
         EXPECT_EQ(0, result.status) << result.errors;
-        EXPECT_EQ("", result.output);
+        EXPECT_EQ("", result.errors);
+        output = result.output;
         return recordings.read("page.html");
     }
 
     RecordingToLookInto recordings;
+    std::string output;
 };
 
 }  // namespace
@@ -114,6 +116,20 @@ TEST_F(FramesReport, HasAllFramesInOnePage) {
     }
     EXPECT_THAT(element(page, "about"), HasSubstr("\"frames\":3"));
     EXPECT_EQ('[', element(page, "palette")[0]);
+}
+
+TEST_F(FramesReport, TellsWhatIsInThePage) {
+    const std::string path = recordings.write("frames", recordings.frames({0, 1, 2}));
+    report(path);
+    EXPECT_EQ("3 frames in " + recordings.path("page.html") + "\n", output);
+    const std::string page = report(path, {"--every", "2", "--json"});
+    EXPECT_EQ("{\"frames\":2,\"bytes\":" + std::to_string(page.size()) + ",\"file\":\"" +
+                      recordings.path("page.html") + "\"}\n",
+              output);
+    // A page on the standard output stands there alone.
+    const RunResult result = framesCommand({"report", path, "-o", "-", "--every", "2"});
+    EXPECT_EQ(page, result.output);
+    EXPECT_EQ("2 frames in -\n", result.errors);
 }
 
 TEST_F(FramesReport, NeedsNothingFromElsewhere) {
