@@ -6,6 +6,8 @@
 set(ZELK_BP_LIBRARIES
   "android::binder=" "android::utils=" "android::log=" "android::ui=" "Threads::Threads=" "zelk::options="
   "GTest::gtest=" "GTest::gtest_main=" "dl="
+  # Android 10 to 12 have no libtracefs: the tools are built without zelkctl's trace there.
+  "zelkctl_trace="
   "android::base=shared_libs:libbase"
   "PNG::PNG=shared_libs:libpng"
   "ZLIB::ZLIB=shared_libs:libz"
@@ -19,9 +21,9 @@ set(ZELK_BP_LIBRARIES
   "zelk::testkit=static_libs:libzelktestkit"
   "zelktestkit=static_libs:libzelktestkit")
 # Tests that start a service manager, the programs or the completions of a desk; what counts costs there; the
-# manual's programs, whose sources a build here takes out of the document.
+# manual's programs, whose sources a build here takes out of the document; what needs libtracefs.
 set(ZELK_BP_DESK_ONLY report_page_test tools_tests zelk_values_plain values_plain_test
-  values_plain_comparison_test values_allocations_test manual_by_name manual_watch)
+  values_plain_comparison_test values_allocations_test manual_by_name manual_watch zelkctl_trace trace_test)
 
 set_property(GLOBAL PROPERTY ZELK_BP "")
 

@@ -15,8 +15,9 @@ PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev va
     libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin gcovr tmux zsh python3)
 # The browser that shows what zelkctl makes for browsers; large, and for the tests without the driver alone.
 PACKAGES_BROWSER=(chromium)
-# Libraries of zelkctl and the simulator, one of which is found by pkg-config; mandoc checks the manual pages.
-PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev libpng-dev libevdev-dev pkg-config mandoc)
+# Libraries of zelkctl and the simulator, some of which are found by pkg-config; mandoc checks the manual pages.
+PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev libpng-dev libevdev-dev libtracefs-dev
+    libtraceevent-dev pkg-config mandoc)
 # What makes Debian packages, looks at them and finds them used; the tests do so as well.
 PACKAGES_PACKAGING=(dpkg-dev debhelper lintian pkg-config)
 # What the Android tree is given is formatted and compiled by these: bpfmt, the policy's compilers, and the

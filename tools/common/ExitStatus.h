@@ -26,7 +26,8 @@ constexpr ExitStatus kExitStatuses[] = {
          "should be."},
         {kExitUsage, "The command line makes no sense; nothing was done."},
         {kExitAbsent,
-         "A service, the service manager or the Binder driver is not there, or the service died."},
+         "A service, the service manager, the Binder driver or its trace events are not there, or "
+         "the service died."},
         {kExitTimeout,
          "A call was not answered within the seconds of --timeout, or what --wait waits for did "
          "not come within those of --seconds."},

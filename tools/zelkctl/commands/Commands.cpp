@@ -4,6 +4,10 @@
 #include "tools/zelkctl/commands/CheckCommand.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
 
+#ifdef ZELK_WITH_TRACE
+#include "tools/zelkctl/commands/TraceCommand.h"
+#endif
+
 namespace pemaro::zelkctl {
 
 void addAllCommands(CLI::App& app, Action& action) {
@@ -12,6 +16,9 @@ void addAllCommands(CLI::App& app, Action& action) {
     addInfoCommand(app, action);
     addPingCommand(app, action);
     addCheckCommand(app, action);
+#ifdef ZELK_WITH_TRACE
+    addTraceCommand(app, action);
+#endif
     addRecordCommand(app, action);
     addRecordFileCommand(app, action);
     addFramesCommands(app, action);

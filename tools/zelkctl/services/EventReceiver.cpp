@@ -1,25 +1,20 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/services/EventReceiver.h"
 
-#include <fmt/chrono.h>
+#include <fmt/core.h>
 
 #include <algorithm>
 
 #include "frames/Checksum.h"
 #include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Output.h"
+#include "tools/zelkctl/terminal/Printable.h"
 #include "tools/zelkctl/terminal/TerminalTraits.h"
 
 namespace pemaro::zelkctl {
 namespace {
 
 using Clock = std::chrono::system_clock;
-
-std::string timeOfDay(Clock::time_point when) {
-    const auto rounded = std::chrono::floor<std::chrono::milliseconds>(when);
-    return fmt::format("{:%H:%M:%S}.{:03}", fmt::localtime(Clock::to_time_t(rounded)),
-                       rounded.time_since_epoch().count() % 1000);
-}
 
 std::string digestOf(const void* record, size_t size) {
     return fmt::format("{:08x}", frames::crc32(record, size));

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/terminal/Printable.h"
 
+#include <fmt/chrono.h>
+
 #include <algorithm>
 
 namespace pemaro::zelkctl {
@@ -18,6 +20,13 @@ std::string joined(const std::vector<std::string>& words) {
         list += (list.empty() ? "" : ", ") + word;
     }
     return list;
+}
+
+std::string timeOfDay(std::chrono::system_clock::time_point when) {
+    const auto rounded = std::chrono::floor<std::chrono::milliseconds>(when);
+    return fmt::format("{:%H:%M:%S}.{:03}",
+                       fmt::localtime(std::chrono::system_clock::to_time_t(rounded)),
+                       rounded.time_since_epoch().count() % 1000);
 }
 
 }  // namespace pemaro::zelkctl

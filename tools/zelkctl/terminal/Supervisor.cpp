@@ -28,6 +28,8 @@ using std::chrono::milliseconds;
 
 /// How long a command that was asked to stop may take.
 constexpr milliseconds kGrace(800);
+/// How long what it finishes may take.
+constexpr milliseconds kFinishGrace(10000);
 /// How often calls are looked at, when they have a time.
 constexpr milliseconds kCallPeriod(20);
 
@@ -43,6 +45,8 @@ std::vector<Wait> gWaits;
 std::atomic<uint64_t> gLastWait{0};
 std::vector<std::function<void()>> gLastWords;
 
+std::atomic<int> gFinishing{0};
+std::atomic<Clock::time_point> gFinishedAt{Clock::time_point()};
 std::atomic<bool> gMustStop{false};
 /// The signal that asked to stop; 0 for the standard output.
 std::atomic<int> gSignal{0};
@@ -137,7 +141,7 @@ class Watch {
                 stop(0);
             }
             if (Clock::now() >= mDeadline) {
-                abandonStopped();
+                extendDeadline();
             }
             if (mTimeout > 0) {
                 checkCalls(mTimeout);
@@ -157,6 +161,15 @@ class Watch {
         return static_cast<int>(std::max<int64_t>(left.count(), 0));
     }
 
+    /// What was finished until now has its time, and so has what comes behind it.
+    void extendDeadline() {
+        const auto now = Clock::now();
+        mDeadline = (gFinishing > 0 ? now : gFinishedAt.load()) + kGrace;
+        if (now >= mDeadline || now >= mLastDeadline) {
+            abandonStopped();
+        }
+    }
+
     void takeSignal() {
         signalfd_siginfo info{};
         if (read(mSignals.get(), &info, sizeof(info)) != sizeof(info)) {
@@ -174,6 +187,7 @@ class Watch {
         gMustStop = true;
         if (mDeadline == kNever) {
             mDeadline = Clock::now() + kGrace;
+            mLastDeadline = Clock::now() + kFinishGrace;
         }
     }
 
@@ -183,6 +197,7 @@ class Watch {
     const int mDone;
     const unique_fd mSignals = takeSignals();
     Clock::time_point mDeadline = kNever;
+    Clock::time_point mLastDeadline = kNever;
 };
 
 }  // namespace
@@ -222,6 +237,15 @@ Waiting::~Waiting() {
     const std::lock_guard<std::mutex> guard(gLock);
     gWaits.erase(std::find_if(gWaits.begin(), gWaits.end(),
                               [this](const Wait& wait) { return wait.number == mNumber; }));
+}
+
+Finishing::Finishing() {
+    gFinishing += 1;
+}
+
+Finishing::~Finishing() {
+    gFinishedAt = Clock::now();
+    gFinishing -= 1;
 }
 
 LastWords::LastWords(std::function<void()> speak) {

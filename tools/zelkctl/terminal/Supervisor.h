@@ -52,6 +52,16 @@ auto call(const std::string& name, Operation operation) {
     return operation();
 }
 
+/// While one lives, the command is at work that ends by itself, soon but perhaps not within a second,
+/// and that must not be left half done: it is waited for even after the first signal.
+class Finishing {
+  public:
+    Finishing();
+    ~Finishing();
+    Finishing(const Finishing&) = delete;
+    Finishing& operator=(const Finishing&) = delete;
+};
+
 /// What is done while it lives when the process has to end without the command: tell what was
 /// reached, and what a service was not told. It runs on the first thread and must not wait.
 class LastWords {
