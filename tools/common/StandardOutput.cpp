@@ -11,13 +11,14 @@
 #include <chrono>
 #include <cstring>
 #include <mutex>
+#include <thread>
 
 namespace pemaro::tools {
 namespace {
 
 constexpr std::chrono::milliseconds kMoment(50);
 
-std::timed_mutex gWriting;
+std::mutex gWriting;
 /// The errno of the first failure.
 std::atomic<int> gFailure{0};
 
@@ -67,7 +68,7 @@ void openStandardStreams() {
 }
 
 bool writeOutput(const void* data, size_t size) {
-    const std::lock_guard<std::timed_mutex> guard(gWriting);
+    const std::lock_guard<std::mutex> guard(gWriting);
     if (gFailure == 0) {
         const int failure = writeAll(STDOUT_FILENO, static_cast<const char*>(data), size, true);
         if (failure != 0) {
@@ -82,7 +83,12 @@ bool writeOutput(const std::string& text) {
 }
 
 void tryWriteOutput(const std::string& text) {
-    const std::unique_lock<std::timed_mutex> guard(gWriting, kMoment);
+    std::unique_lock<std::mutex> guard(gWriting, std::try_to_lock);
+    const auto end = std::chrono::steady_clock::now() + kMoment;
+    while (!guard.owns_lock() && std::chrono::steady_clock::now() < end) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+        guard.try_lock();
+    }
     if (guard.owns_lock() && gFailure == 0) {
         const int failure = writeAll(STDOUT_FILENO, text.data(), text.size(), false);
         if (failure != 0) {

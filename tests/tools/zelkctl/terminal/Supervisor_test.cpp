@@ -16,6 +16,14 @@
 
 using testing::ExitedWithCode;
 
+#ifdef __SANITIZE_THREAD__
+// A process that ends while threads are at work would be kept for a second, for races to show: too long for
+// what is to end at once.
+extern "C" const char* __tsan_default_options() {
+    return "atexit_sleep_ms=0";
+}
+#endif
+
 namespace pemaro::zelkctl {
 
 namespace {
