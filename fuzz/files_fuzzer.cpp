@@ -4,8 +4,6 @@
 // configurations, and the records of events.
 
 #include <fuzzer/FuzzedDataProvider.h>
-#include <sys/mman.h>
-#include <unistd.h>
 
 #include <cstdint>
 #include <cstring>
@@ -15,6 +13,7 @@
 #include "frames/FrameContent.h"
 #include "frames/FrameGenerator.h"
 #include "frames/RecordingFile.h"
+#include "fuzz/support/MemoryFile.h"
 #include "fuzz/support/ParcelInput.h"
 #include "tools/zelkctl/files/ConfigFile.h"
 #include "tools/zelkctl/files/FrameSummary.h"
@@ -26,23 +25,6 @@
 namespace {
 
 using namespace pemaro;
-
-/// A file in memory with these bytes.
-class File {
-  public:
-    explicit File(const std::string& bytes) : mFd(memfd_create("input", MFD_CLOEXEC)) {
-        fuzz::expect(write(mFd, bytes.data(), bytes.size()) == static_cast<ssize_t>(bytes.size()),
-                     "the file was not written");
-    }
-    ~File() { close(mFd); }
-    File(const File&) = delete;
-    File& operator=(const File&) = delete;
-
-    std::string path() const { return "/proc/self/fd/" + std::to_string(mFd); }
-
-  private:
-    const int mFd;
-};
 
 /// Overwrites bytes anywhere.
 void damage(void* bytes, size_t size, FuzzedDataProvider& input) {
@@ -74,7 +56,7 @@ std::string recording(FuzzedDataProvider& input) {
 
 void checkRecording(FuzzedDataProvider& input) {
     const std::string bytes = recording(input);
-    const File file(bytes);
+    const fuzz::MemoryFile file(bytes);
     std::string problem;
     const auto read = frames::RecordingFile::open(file.path(), &problem);
     fuzz::expect((read == nullptr) == !problem.empty(), "a refusal without a reason");
@@ -130,7 +112,7 @@ void checkFrame(FuzzedDataProvider& input) {
 void checkConfigFile(FuzzedDataProvider& input) {
     const auto limit = input.ConsumeIntegralInRange<size_t>(0, 64);
     const std::string bytes = input.ConsumeRandomLengthString(128);
-    const File file(bytes);
+    const fuzz::MemoryFile file(bytes);
     std::string read;
     const zelkctl::FileResult result = zelkctl::readConfigFile(file.path(), limit, read);
     fuzz::expect(result.isGood() == (bytes.size() <= limit), "a size that was misjudged");
@@ -146,7 +128,8 @@ void checkGestures(FuzzedDataProvider& input) {
         damage(bytes.data(), bytes.size(), input);
     }
     std::vector<IGestureManagerClient::GestureData> records;
-    const std::string problem = zelkctl::readGestures(File(bytes).path(), kMost, records);
+    const std::string problem =
+            zelkctl::readGestures(fuzz::MemoryFile(bytes).path(), kMost, records);
     const bool good =
             !bytes.empty() && bytes.size() % kRecord == 0 && bytes.size() <= kMost * kRecord;
     fuzz::expect(problem.empty() == good, "records that were misjudged");

@@ -3,11 +3,8 @@
 // What zelkctl and the simulated stack are told by users: numbers, orders of faults, configurations, command
 // lines, and answers to be shown as JSON.
 
-#include <fcntl.h>
 #include <fuzzer/FuzzedDataProvider.h>
 #include <rapidjson/document.h>
-#include <sys/mman.h>
-#include <unistd.h>
 
 #include <CLI/CLI.hpp>
 #include <cctype>
@@ -18,6 +15,7 @@
 #include <string>
 #include <vector>
 
+#include "fuzz/support/MemoryFile.h"
 #include "fuzz/support/ParcelInput.h"
 #include "simulator/companion/Configuration.h"
 #include "simulator/faults/Fault.h"
@@ -28,23 +26,6 @@
 namespace {
 
 using namespace pemaro;
-
-/// A file in memory with these bytes.
-class File {
-  public:
-    explicit File(const std::string& bytes) : mFd(memfd_create("input", MFD_CLOEXEC)) {
-        fuzz::expect(write(mFd, bytes.data(), bytes.size()) == static_cast<ssize_t>(bytes.size()),
-                     "the file was not written");
-    }
-    ~File() { close(mFd); }
-    File(const File&) = delete;
-    File& operator=(const File&) = delete;
-
-    std::string path() const { return "/proc/self/fd/" + std::to_string(mFd); }
-
-  private:
-    const int mFd;
-};
 
 void checkNumber(const std::string& text) {
     const auto number = tools::parseNumber(text, tools::kAny32);
@@ -87,7 +68,7 @@ void checkConfiguration(const std::string& bytes) {
     fuzz::expect(read || configuration.toBinary() == before, "a failure changed something");
     if (!fuzz::isFatalText(bytes.c_str())) {
         const std::string now = configuration.toBinary();
-        const bool loaded = configuration.load(File(bytes).path()) == 0;
+        const bool loaded = configuration.load(fuzz::MemoryFile(bytes).path()) == 0;
         fuzz::expect(loaded || configuration.toBinary() == now, "a failure changed something");
     }
 }
