@@ -52,25 +52,22 @@ class Watcher {
             return failStatus("init", status);
         }
         status = begin();
-        while (status == STATUS_NO_ERROR && !isOver(kWatchPeriod)) {
-            if (mService->died() && mIsAwaiting) {
-                break;
-            }
+        while (status == STATUS_NO_ERROR && !isOver(kWatchPeriod) && !isOrphaned()) {
             if (mService->died()) {
                 status = reconnect();
             }
         }
+        const bool isLost = isOrphaned() && !mReceiver.waitUntilDone(milliseconds(0));
         if (mIsAwaiting) {
             // That it is ended now is no event that was waited for.
             mReceiver.close();
         }
-        const bool died = mService != nullptr && mService->died();
-        if (mHasBegun && mWatched.end && !mService->died()) {
+        if (mHasBegun && mWatched.end && !isOrphaned()) {
             // It may have ended by itself, and then the service refuses, which is as well.
             call(mWatched.endName, mWatched.end);
         }
         call("deinit", mWatched.deinit);
-        if (mIsAwaiting && died && !mReceiver.awaited()) {
+        if (isLost) {
             return fail("the service died", tools::kExitAbsent);
         }
         return status == STATUS_NO_ERROR ? tools::kExitSuccess : tools::kExitFailure;
@@ -86,12 +83,19 @@ class Watcher {
                 return status;
             }
         }
+        tellOfSilence();
+        return STATUS_NO_ERROR;
+    }
+
+    void tellOfSilence() const {
         const std::string silence = mWatched.silence ? mWatched.silence() : "";
         if (!silence.empty()) {
             note(silence);
         }
-        return STATUS_NO_ERROR;
     }
+
+    /// What was begun died with its service: another one knows nothing of it.
+    bool isOrphaned() const { return mHasBegun && mService->died(); }
 
     /// Waits for so long to see whether the watch is to end.
     bool isOver(milliseconds patience) {
@@ -103,7 +107,6 @@ class Watcher {
     }
 
     int reconnect() {
-        mHasBegun = false;
         mReceiver.tellOfService("died");
         call("deinit", mWatched.deinit);
         int status = STATUS_NO_ERROR;
@@ -120,6 +123,8 @@ class Watcher {
             return status;
         }
         mReceiver.tellOfService("is back");
+        // Another service begins with everything switched off.
+        tellOfSilence();
         return STATUS_NO_ERROR;
     }
 
@@ -218,7 +223,7 @@ int watch(const WatchOptions& options, const MakeWatched& make) {
     const Watched watched = make(receiver);
     result = Watcher(options, watched, *receiver).run();
     const uint64_t taken = receiver->close();
-    if (result == tools::kExitSuccess && options.goal.reached) {
+    if (result == tools::kExitSuccess && options.goal.reached && file.problem().empty()) {
         result = judge(options.goal, receiver->awaited(), options.seconds);
     }
     // Without an event, and without success, a file stays what it was.

@@ -55,8 +55,8 @@ using MakeWatched = std::function<Watched(EventReceiver*)>;
 
 /// Prints events until there are enough or the command is asked to stop; returns the exit status.
 /// When the service dies, the client is disconnected, waits for a new service, and connects again;
-/// but where an event is waited for, which will not come then, that is a failure. So is an event that
-/// has not come in time, or that tells of another end.
+/// but where begin() began something, which is gone with its service, that is a failure. So is an event
+/// that is waited for and has not come in time, or that tells of another end.
 int watch(const WatchOptions& options, const MakeWatched& make);
 
 }  // namespace pemaro::zelkctl
