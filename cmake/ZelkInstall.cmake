@@ -9,12 +9,14 @@ install(TARGETS zelktestkit zelktestkit_recorder EXPORT zelkclientTargets COMPON
 if(ZELK_BUILD_TOOLS)
   install(TARGETS zelkctl zelk-touchstack COMPONENT Tools)
   # Where bash, zsh and man look for them.
-  install(FILES ${ZELK_REFERENCE_DIR}/zelkctl.bash
-    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME zelkctl COMPONENT Tools)
-  install(FILES ${ZELK_REFERENCE_DIR}/_zelkctl
-    DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions COMPONENT Tools)
-  install(FILES ${ZELK_REFERENCE_DIR}/zelkctl.1 tools/man/zelk-touchstack.1
-    DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT Tools)
+  foreach(program zelkctl zelk-touchstack)
+    install(FILES ${ZELK_REFERENCE_DIR}/${program}.bash
+      DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME ${program} COMPONENT Tools)
+    install(FILES ${ZELK_REFERENCE_DIR}/_${program}
+      DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions COMPONENT Tools)
+    install(FILES ${ZELK_REFERENCE_DIR}/${program}.1
+      DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT Tools)
+  endforeach()
 endif()
 
 install(DIRECTORY include/pemaro DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT Development

@@ -127,6 +127,10 @@ std::optional<std::string> after(const std::string& text, const std::string& pre
 
 }  // namespace
 
+std::vector<std::string> Fault::operations() {
+    return {std::begin(kOperations), std::end(kOperations)};
+}
+
 std::optional<Fault> Fault::parse(const std::string& text, std::string* problem) {
     const size_t equals = text.find('=');
     if (equals == std::string::npos) {

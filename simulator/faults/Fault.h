@@ -33,6 +33,9 @@ struct Fault {
 
     /// Null, with the reason in `*problem`, when `text` is no fault.
     static std::optional<Fault> parse(const std::string& text, std::string* problem);
+
+    /// All OPERATIONs.
+    static std::vector<std::string> operations();
 };
 
 /// The faults in force for a service. Any thread may call.

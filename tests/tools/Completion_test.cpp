@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// The completions know what zelkctl knows, neither less nor more.
+// The completions know what the programs know, neither less nor more.
 
 #include <gtest/gtest.h>
 
@@ -19,16 +19,21 @@ WordSet asSet(const std::vector<std::string>& words) {
     return {words.begin(), words.end()};
 }
 
-// What bash offers for the last of these words, which is being typed.
-std::vector<std::string> completeInBash(const std::string& words, const std::string& typed) {
+constexpr const char* kPrograms[] = {"zelkctl", "zelk-touchstack"};
+
+// What bash offers for the last of these words, which is being typed. They are as bash breaks them.
+std::vector<std::string> completeInBash(const std::string& program, const std::string& words,
+                                        const std::string& typed) {
     const RunResult result =
             run({"bash", "--norc", "-c",
-                 ". " ZELK_REFERENCE_DIR "/zelkctl.bash\n"
-                 "COMP_WORDS=(" ZELK_BIN_DIR "/zelkctl " +
-                         words + " '" + typed +
+                 ". " ZELK_REFERENCE_DIR "/" + program +
+                         ".bash\n"
+                         "COMP_WORDS=(" ZELK_BIN_DIR "/" +
+                         program + " " + words + " '" + typed +
                          "')\n"
-                         "COMP_CWORD=$((${#COMP_WORDS[@]} - 1))\n"
-                         "_zelkctl\n"
+                         "COMP_CWORD=$((${#COMP_WORDS[@]} - 1))\n_" +
+                         program +
+                         "\n"
                          "((${#COMPREPLY[@]} == 0)) || printf '%s\\n' \"${COMPREPLY[@]}\"\n"});
     EXPECT_EQ(0, result.status);
     EXPECT_EQ("", result.errors);
@@ -36,17 +41,17 @@ std::vector<std::string> completeInBash(const std::string& words, const std::str
 }
 
 // What zsh is told of a command: the options, and the commands behind it.
-HelpEntry completeInZsh(const std::string& path) {
-    std::string function = "_zelkctl" + (path.empty() ? "" : "-" + path) + "-words";
+HelpEntry completeInZsh(const std::string& program, const std::string& path) {
+    std::string function = "_" + program + (path.empty() ? "" : "-" + path) + "-words";
     std::replace(function.begin(), function.end(), ' ', '-');
     const RunResult result = run({"zsh", "-f", "-c",
                                   "_arguments() { print -rl -- \"$@\"; state=command }\n"
                                   "_describe() { print -rl -- 'command '${(P)^@[-1]} }\n"
-                                  ". " ZELK_REFERENCE_DIR "/_zelkctl\n" +
-                                          function + "\n"});
+                                  ". " ZELK_REFERENCE_DIR "/_" +
+                                          program + "\n" + function + "\n"});
     EXPECT_EQ(0, result.status) << function;
     EXPECT_EQ("", result.errors) << function;
-    static const std::regex option("(?:\\([^)]*\\))?(--[a-z-]+)\\[.*");
+    static const std::regex option("(?:\\([^)]*\\)|\\*)?(--[a-z-]+)\\[.*");
     static const std::regex command("command ([a-z-]+):.*");
     HelpEntry entry;
     for (const std::string& line : splitLines(result.output)) {
@@ -63,10 +68,12 @@ HelpEntry completeInZsh(const std::string& path) {
 }  // namespace
 
 TEST(BashCompletion, OffersTheCommandsAndOptionsOfTheHelp) {
-    for (const auto& [path, entry] : readHelpTree("zelkctl")) {
-        EXPECT_EQ(entry.options, asSet(completeInBash(path, "-"))) << path;
-        if (!entry.commands.empty()) {
-            EXPECT_EQ(entry.commands, asSet(completeInBash(path, ""))) << path;
+    for (const char* program : kPrograms) {
+        for (const auto& [path, entry] : readHelpTree(program)) {
+            EXPECT_EQ(entry.options, asSet(completeInBash(program, path, "-"))) << path;
+            if (!entry.commands.empty()) {
+                EXPECT_EQ(entry.commands, asSet(completeInBash(program, path, ""))) << path;
+            }
         }
     }
 }
@@ -106,7 +113,62 @@ TEST(BashCompletion, FollowsTheCommandLine) {
             {"fly", "-", {"--help"}},
     };
     for (const auto& row : rows) {
-        EXPECT_EQ(row.offered, asSet(completeInBash(row.words, row.typed))) << row.words;
+        EXPECT_EQ(row.offered, asSet(completeInBash("zelkctl", row.words, row.typed))) << row.words;
+    }
+}
+
+// Words that bash breaks at = and :, of which it replaces the last part alone.
+TEST(BashCompletion, OffersTheValuesOfTheTouchStacksOptions) {
+    const struct {
+        const char* words;
+        const char* typed;
+        WordSet offered;
+    } rows[] = {
+            {"--services", "", {"companion", "touch", "gesture", "hand"}},
+            {"--services", "touch,ge", {"touch,gesture"}},
+            {"--fault", "ope", {"open="}},
+            {"--fault", "touch.en", {"touch.enable="}},
+            {"--fault open", "=", {"status:", "delay:", "die", "null"}},
+            {"--fault open =", "de", {"delay:"}},
+            {"--fault open=", "di", {"die"}},
+            {"--fault", "open=di", {"open=die"}},
+            {"--fault open = delay :", "5", {}},
+            {"--fault open = die --fi", "--fi", {"--fingers"}},
+            {"--source", "li", {"list"}},
+            {"--source evdev", ":", {}},
+            {"--replay", ZELK_TOOLS_DIR "/dem", {ZELK_TOOLS_DIR "/demo"}},
+            {"--rate", "", {}},
+            {"--rate 5 --lo", "--lo", {"--log", "--loop"}},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ(row.offered, asSet(completeInBash("zelk-touchstack", row.words, row.typed)))
+                << row.words << " " << row.typed;
+    }
+}
+
+TEST(ZshCompletion, OffersTheValuesOfTheTouchStacksOptions) {
+    const struct {
+        const char* word;
+        const char* typed;
+        WordSet offered;
+    } rows[] = {
+            {"SERVICES", "", {"companion", "touch", "gesture", "hand"}},
+            {"FAULT", "open=", {"status:", "delay:", "die", "null"}},
+            {"SOURCE", "", {"list"}},
+    };
+    for (const auto& row : rows) {
+        // What is typed is behind the mark that compset looks for, or is not.
+        const RunResult result =
+                run({"zsh", "-f", "-c",
+                     "PATH=" ZELK_BIN_DIR ":$PATH\n"
+                     "compset() { [[ " +
+                             std::string("'") + row.typed +
+                             "' == ${~@[-1]} ]] }\n"
+                             "compadd() { print -rl -- ${(P)@[-1]} }\n"
+                             ". " ZELK_REFERENCE_DIR "/_zelk-touchstack\n_zelk-touchstack_values " +
+                             row.word + "\n"});
+        EXPECT_EQ("", result.errors) << row.word;
+        EXPECT_EQ(row.offered, asSet(splitLines(result.output))) << row.word;
     }
 }
 
@@ -134,10 +196,12 @@ TEST(ZshCompletion, OffersTheCommandsBehindThoseThatHelpIsAskedFor) {
 }
 
 TEST(ZshCompletion, OffersTheCommandsAndOptionsOfTheHelp) {
-    for (const auto& [path, entry] : readHelpTree("zelkctl")) {
-        const HelpEntry offered = completeInZsh(path);
-        EXPECT_EQ(entry.options, offered.options) << path;
-        EXPECT_EQ(entry.commands, offered.commands) << path;
+    for (const char* program : kPrograms) {
+        for (const auto& [path, entry] : readHelpTree(program)) {
+            const HelpEntry offered = completeInZsh(program, path);
+            EXPECT_EQ(entry.options, offered.options) << path;
+            EXPECT_EQ(entry.commands, offered.commands) << path;
+        }
     }
 }
 

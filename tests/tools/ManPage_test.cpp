@@ -9,6 +9,7 @@
 #include <sstream>
 #include <string>
 
+#include "tests/support/ChildProcess.h"
 #include "tests/tools/HelpTree.h"
 
 namespace pemaro::test {
@@ -16,8 +17,7 @@ namespace pemaro::test {
 namespace {
 
 std::ifstream openPage(const std::string& name) {
-    const bool isMade = name == "zelkctl.1";
-    std::ifstream page((isMade ? ZELK_REFERENCE_DIR "/" : ZELK_TOOLS_DIR "/man/") + name);
+    std::ifstream page(ZELK_REFERENCE_DIR "/" + name);
     EXPECT_TRUE(page.is_open()) << name;
     return page;
 }
@@ -59,6 +59,19 @@ WordSet documentedOptions(const std::string& name) {
     return options;
 }
 
+// A page as it is read, with a blank between its words.
+std::string shownPage(const std::string& name) {
+    const RunResult shown = run({"bash", "-o", "pipefail", "-c",
+                                 "mandoc -T ascii " ZELK_REFERENCE_DIR "/" + name + " | col -b"});
+    EXPECT_EQ(0, shown.status) << shown.errors;
+    std::istringstream stream(shown.output);
+    std::string text;
+    for (std::string word; stream >> word;) {
+        text += word + " ";
+    }
+    return text;
+}
+
 }  // namespace
 
 TEST(ManPage, OfZelkctlTellsEachCommandWithItsOptions) {
@@ -84,6 +97,28 @@ TEST(ManPage, OfZelkctlExplainsTheOptionsOfTheProgram) {
 TEST(ManPage, OfTheTouchStackTellsEachOption) {
     EXPECT_EQ(readHelpTree("zelk-touchstack").at("").options,
               documentedOptions("zelk-touchstack.1"));
+}
+
+TEST(ManPage, OfTheTouchStackTellsWhatTheHelpTells) {
+    const std::string page = shownPage("zelk-touchstack.1");
+    // An option's line holds its words, behind two blanks, or the next one does.
+    static const std::regex words("(?:  -.*?  | {20,})\\s*([A-Z].*)");
+    int texts = 0;
+    for (const std::string& line :
+         splitLines(run({ZELK_BIN_DIR "/zelk-touchstack", "-h"}).output)) {
+        std::smatch match;
+        if (std::regex_match(line, match, words)) {
+            EXPECT_NE(std::string::npos, page.find(match[1].str() + ".")) << line;
+            ++texts;
+        }
+    }
+    EXPECT_EQ(readHelpTree("zelk-touchstack").at("").options.size(), static_cast<size_t>(texts));
+    for (const char* text :
+         {"--rate NUMBER Frames a second; 0 is as fast as the client takes them. "
+          "The default is 240. Excludes --replay.",
+          "--loop Play it again and again. Needs --replay."}) {
+        EXPECT_NE(std::string::npos, page.find(text)) << text;
+    }
 }
 
 }  // namespace pemaro::test

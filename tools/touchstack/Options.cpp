@@ -1,0 +1,179 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/touchstack/Options.h"
+
+#include <fmt/core.h>
+
+#include <CLI/CLI.hpp>
+#include <set>
+
+#include "tools/common/NearestWord.h"
+#include "tools/common/Number.h"
+#include "tools/touchstack/Source.h"
+
+namespace pemaro::touchstack {
+
+using simulator::Fault;
+using simulator::ManagerOptions;
+using simulator::ServiceKind;
+using simulator::SimulatorOptions;
+
+std::vector<std::string> serviceWords() {
+    std::vector<std::string> words;
+    for (const ServiceKind service : simulator::kServiceKinds) {
+        words.emplace_back(simulator::shortName(service));
+    }
+    return words;
+}
+
+namespace {
+
+/// Whole numbers of a range, and numbers with a fraction.
+std::function<std::string(const std::string&)> whole(int64_t least, int64_t most) {
+    return [=](const std::string& text) { return tools::numberProblem(text, {least, most}); };
+}
+
+std::function<std::string(const std::string&)> decimal(double least, double most) {
+    return [=](const std::string& text) { return tools::decimalProblem(text, {least, most}); };
+}
+
+void addCompanionOptions(CLI::App& app, CommandLine& line) {
+    SimulatorOptions& options = line.options.companion;
+    app.add_option("--rate", options.rate, "Frames a second; 0 is as fast as the client takes them")
+            ->type_name("NUMBER")
+            ->check(decimal(0, SimulatorOptions::kMaxRate), "")
+            ->capture_default_str();
+    app.add_option("--frame-bytes", options.frameBytes, "Packet size in bytes")
+            ->type_name("NUMBER")
+            ->check(whole(SimulatorOptions::kMinFrameBytes, SimulatorOptions::kMaxFrameBytes), "")
+            ->capture_default_str();
+    app.add_option("--ring-frames", options.ringFrames, "Frames that the shared ring holds")
+            ->type_name("NUMBER")
+            ->check(whole(1, SimulatorOptions::kMaxRingFrames), "")
+            ->capture_default_str();
+    app.add_option("--remind", options.remindUs,
+                   "Microseconds after which a frame that was not taken is signalled again; 0 is "
+                   "never")
+            ->type_name("NUMBER")
+            ->check(whole(0, SimulatorOptions::kMaxRemindUs), "")
+            ->capture_default_str();
+    app.add_option("--fingers", options.fingers, "Fingers on the panel")
+            ->type_name("NUMBER")
+            ->check(whole(0, SimulatorOptions::kMaxFingers), "")
+            ->capture_default_str();
+    app.add_option("--config-file", options.configPath,
+                   "Where the configuration is saved and reloaded when no path is told")
+            ->type_name("FILE");
+    app.add_option("--auth", options.authText, "What clients authenticate with")
+            ->type_name("TEXT")
+            ->capture_default_str();
+    app.add_option("--fault", line.faultTexts,
+                   "A fault to order, as OPERATION=status:NUMBER, OPERATION=delay:500ms, "
+                   "OPERATION=die or getCblk=null; a manager's operation is touch.OPERATION, "
+                   "gesture.OPERATION or hand.OPERATION; may be repeated")
+            ->type_name("FAULT")
+            ->allow_extra_args(false);
+    app.add_flag("--log", line.showLog, "Show the platform's log lines");
+    app.add_option("--services", line.serviceTexts,
+                   "Serve only these: companion, touch, gesture, hand, separated by commas")
+            ->type_name("SERVICES")
+            ->delimiter(',')
+            ->allow_extra_args(false);
+}
+
+void addSourceOptions(CLI::App& app, CommandLine& line) {
+    SimulatorOptions& options = line.options.companion;
+    CLI::Option* replay = app.add_option("--replay", line.replayPath,
+                                         "A recording to play, bit for bit and at its own pace, "
+                                         "instead of drawing frames");
+    replay->type_name("FILE")->excludes("--rate")->excludes("--fingers");
+    app.add_option("--speed", options.speed,
+                   "How fast to play it: 2 is twice as fast, 0 as fast as the client takes it")
+            ->needs(replay)
+            ->type_name("NUMBER")
+            ->check(decimal(0, SimulatorOptions::kMaxSpeed), "")
+            ->capture_default_str();
+    app.add_flag("--loop", options.loop, "Play it again and again")->needs(replay);
+    app.add_option("--source", line.source,
+                   "Whose fingers to draw instead of moving some: evdev:DEVICE, a touch screen of "
+                   "this machine; list prints which there are, and exits")
+            ->type_name("SOURCE")
+            ->excludes(replay)
+            ->excludes("--fingers")
+            ->check(sourceProblem, "");
+}
+
+void addManagerOptions(CLI::App& app, ManagerOptions& options) {
+    app.add_option("--gesture-rate", options.gestureRate,
+                   "Gestures a second of the touch and the gesture manager")
+            ->type_name("NUMBER")
+            ->check(decimal(0, ManagerOptions::kMaxRate), "")
+            ->capture_default_str();
+    app.add_option("--hand-rate", options.handRate,
+                   "Steps a second of an enrollment, a scan or a matching")
+            ->type_name("NUMBER")
+            ->check(decimal(0, ManagerOptions::kMaxRate), "")
+            ->capture_default_str();
+    app.add_option("--user-gestures", options.userGestures, "Gestures that can be defined")
+            ->type_name("NUMBER")
+            ->check(whole(0, ManagerOptions::kMaxUserGestures), "")
+            ->capture_default_str();
+    app.add_option("--hand-profiles", options.handProfiles, "Hands that can be enrolled")
+            ->type_name("NUMBER")
+            ->check(whole(0, ManagerOptions::kMaxHandProfiles), "")
+            ->capture_default_str();
+}
+
+void readServices(const std::vector<std::string>& names, std::set<ServiceKind>& services) {
+    if (!names.empty()) {
+        services.clear();
+    }
+    for (const std::string& name : names) {
+        const auto service = simulator::serviceKindOf(name);
+        if (!service) {
+            throw CLI::ValidationError("--services",
+                                       fmt::format("there is no '{}'{}", name,
+                                                   tools::nearestWordHint(name, serviceWords())));
+        }
+        services.insert(*service);
+    }
+}
+
+void readFaults(const std::vector<std::string>& texts, std::vector<Fault>& faults) {
+    for (const std::string& text : texts) {
+        std::string problem;
+        const auto fault = Fault::parse(text, &problem);
+        if (!fault) {
+            throw CLI::ValidationError("--fault", problem);
+        }
+        faults.push_back(*fault);
+    }
+}
+
+void checkRing(const SimulatorOptions& options) {
+    if (uint64_t{options.frameBytes} * options.ringFrames > SimulatorOptions::kMaxRingBytes) {
+        throw CLI::ValidationError("--ring-frames",
+                                   fmt::format("a ring may take {} MiB at most",
+                                               SimulatorOptions::kMaxRingBytes >> 20));
+    }
+}
+
+}  // namespace
+
+void addOptions(CLI::App& app, CommandLine& line) {
+    app.name("zelk-touchstack");
+    app.description(
+            "A simulated touch stack that serves the touch companion and the touch, gesture "
+            "and hand biometric managers over Binder until SIGINT or SIGTERM.");
+    addCompanionOptions(app, line);
+    addSourceOptions(app, line);
+    addManagerOptions(app, line.options.managers);
+}
+
+void readOptions(const CLI::App& app, CommandLine& line) {
+    line.hasFrameBytes = app.count("--frame-bytes") != 0;
+    readServices(line.serviceTexts, line.options.services);
+    readFaults(line.faultTexts, line.faults);
+    checkRing(line.options.companion);
+}
+
+}  // namespace pemaro::touchstack
