@@ -210,7 +210,7 @@ bool isKnownStatus(int32_t status) {
 std::string replyProblem(const Parcel& reply, const char* layout, int32_t* status) {
     reply.setDataPosition(0);
     for (const char* field = layout; *field != '\0'; ++field) {
-        const std::string problem = fieldProblem(reply, *field, status);
+        std::string problem = fieldProblem(reply, *field, status);
         if (!problem.empty()) {
             return problem;
         }

@@ -8,7 +8,7 @@
 namespace pemaro::zelkctl {
 
 FileResult readConfigFile(const std::string& path, size_t limit, std::string& bytes) {
-    const FileResult result = readInputFile(path, limit + 1, bytes);
+    FileResult result = readInputFile(path, limit + 1, bytes);
     if (!result.isGood()) {
         return result;
     }

@@ -58,7 +58,7 @@ void drawCross(Canvas& canvas, const frames::FingerRecord& finger, uint32_t widt
 
 std::string encode(const Canvas& canvas, uint32_t width, uint32_t height) {
     uint8_t palette[3 * kColors];
-    for (int level = 0; level < kColors; ++level) {
+    for (size_t level = 0; level < kColors; ++level) {
         const Color color =
                 level == kMark ? Color{255, 255, 255} : heatColor(static_cast<uint8_t>(level));
         palette[3 * level] = color.red;

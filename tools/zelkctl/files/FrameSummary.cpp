@@ -181,7 +181,9 @@ std::string summaryText(const RecordingFile& file, const FrameSummary& summary) 
 
 std::string summaryJson(const RecordingFile& file, const FrameSummary& summary) {
     JsonObject object;
-    object.add("file", file.path()).add("bytes", file.size()).add("frames", summary.frames);
+    object.add("file", file.path());
+    object.add("bytes", static_cast<int64_t>(file.size()));
+    object.add("frames", static_cast<int64_t>(summary.frames));
     if (summary.frames != 0) {
         addExtent(object, "lengths", summary.lengths);
         addExtent(object, "columns", summary.columns);
@@ -195,9 +197,9 @@ std::string summaryJson(const RecordingFile& file, const FrameSummary& summary) 
     JsonArray gaps;
     for (const FrameSummary::Gap& gap : summary.gaps) {
         gaps.add(JsonObject()
-                         .add("frame", gap.frame)
-                         .add("offset", gap.offset)
-                         .add("lost", gap.lost));
+                         .add("frame", static_cast<int64_t>(gap.frame))
+                         .add("offset", static_cast<int64_t>(gap.offset))
+                         .add("lost", static_cast<int64_t>(gap.lost)));
     }
     JsonArray corrupt;
     for (const RecordingFile::Part& part : summary.corrupt) {
@@ -205,7 +207,9 @@ std::string summaryJson(const RecordingFile& file, const FrameSummary& summary) 
         addPart(where, part);
         corrupt.add(where);
     }
-    object.add("lost", summary.lost).add("gaps", gaps).add("corrupt", corrupt);
+    object.add("lost", static_cast<int64_t>(summary.lost))
+            .add("gaps", gaps)
+            .add("corrupt", corrupt);
     if (summary.truncated) {
         JsonObject truncated;
         addPart(truncated, *summary.truncated);

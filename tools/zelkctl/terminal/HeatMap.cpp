@@ -40,11 +40,12 @@ int pixelsOf(int count, int room, int cells) {
 
 uint8_t hottest(const frames::FrameContent& frame, int full, int left, int right, int top,
                 int bottom) {
-    const int columns = frame.header.columns;
+    const size_t columns = frame.header.columns;
     int value = INT16_MIN;
     for (int row = top; row < bottom; ++row) {
+        const size_t first = static_cast<size_t>(row) * columns;
         for (int column = left; column < right; ++column) {
-            value = std::max<int>(value, frame.image[static_cast<size_t>(row * columns + column)]);
+            value = std::max<int>(value, frame.image[first + static_cast<size_t>(column)]);
         }
     }
     return heatLevel(value, full);

@@ -69,8 +69,10 @@ class Sheet {
     int down(const StrokePoint& point) const { return place(point.y, mStyle.height, mDown); }
 
     size_t indexOf(int x, int y) const {
-        return static_cast<size_t>(y * mStyle.rows / mDown * mStyle.columns +
-                                   x * mStyle.columns / mAcross);
+        const int row = y * mStyle.rows / mDown;
+        const int column = x * mStyle.columns / mAcross;
+        return static_cast<size_t>(row) * static_cast<size_t>(mStyle.columns) +
+               static_cast<size_t>(column);
     }
 
     void set(int x, int y) { mDots[indexOf(x, y)] |= kDotBits[y % kDotsDown][x % kDotsAcross]; }

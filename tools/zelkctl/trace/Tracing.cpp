@@ -73,7 +73,7 @@ std::string tracingProblem() {
     }
     std::vector<std::string> missing;
     for (const std::string& event : readEvents()) {
-        if (!isThere(events + "/" + event)) {
+        if (!isThere(fmt::format("{}/{}", events, event))) {
             missing.push_back(event);
         }
     }

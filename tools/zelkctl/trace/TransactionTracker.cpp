@@ -238,15 +238,19 @@ void TransactionTracker::learnFrom(const Entry& entry) {
     if (operation == nullptr) {
         return;
     }
-    // Learning goes through all entries, and learns again.
-    const std::vector<int> handed = operation->handed ? entry.handed : std::vector<int>();
-    const std::vector<int> returned = operation->returned ? entry.returned : std::vector<int>();
-    for (const int object : handed) {
-        learn(object, *operation->handed);
-    }
-    for (const int object : returned) {
-        learn(object, *operation->returned);
-    }
+    // Learning goes through all entries, and learns again: the lists are copied before.
+    const auto learnAll = [this](const std::vector<int>& objects, const KnownInterface* interface) {
+        if (interface == nullptr) {
+            return;
+        }
+        for (const int object : objects) {
+            learn(object, *interface);
+        }
+    };
+    const std::vector<int> handed = entry.handed;
+    const std::vector<int> returned = entry.returned;
+    learnAll(handed, operation->handed);
+    learnAll(returned, operation->returned);
 }
 
 // ---- ends ----------------------------------------------------------------------------------------
