@@ -4,46 +4,30 @@
 //
 //     gesture_service          until it is killed; needs the Binder driver and a service manager
 
-// Ours come first: the platform's headers use standard ones without including them.
-#include "pemaro/BnGestureManagerService.h"
-#include "pemaro/Status.h"
-
-#include <binder/IPCThreadState.h>
-#include <binder/IServiceManager.h>
-#include <binder/ProcessState.h>
-
-#include <algorithm>
 #include <atomic>
 #include <chrono>
+#include <cstdlib>
 #include <mutex>
 #include <set>
 #include <thread>
-#include <vector>
+
+#include "pemaro/BasicGestureManagerService.h"
+#include "pemaro/Serve.h"
+#include "pemaro/Status.h"
 
 namespace {
 
 using namespace pemaro;
-using android::sp;
-using Client = IGestureManagerClient;
+using Gesture = IGestureManagerClient::GestureData;
 
-class GestureService : public BnGestureManagerService {
+class GestureService : public BasicGestureManagerService {
   public:
-    int subscribe(const sp<Client>& client) override {
-        const std::lock_guard<std::mutex> guard(mLock);
-        mClients.push_back(client);
-        return STATUS_NO_ERROR;
-    }
-    int unsubscribe(const sp<Client>& client) override {
-        remove(client);
-        return STATUS_NO_ERROR;
-    }
-    int enableWakeup() override { return STATUS_NO_ERROR; }
-    int disableWakeup() override { return STATUS_NO_ERROR; }
     int startGestureDetection() override { return detect(true); }
     int stopGestureDetection() override { return detect(false); }
-    int addGesture(int count, Client::GestureData* samples, int& result) override {
-        const std::lock_guard<std::mutex> guard(mLock);
+    int addGesture(int count, Gesture* samples, int& result) override {
+        result = 0;
         if (count <= 0 || samples == nullptr) return STATUS_BAD_PARAMETER;
+        const std::lock_guard<std::mutex> guard(mLock);
         mGestures.insert(result = ++mLastGesture);
         return STATUS_NO_ERROR;
     }
@@ -51,9 +35,6 @@ class GestureService : public BnGestureManagerService {
         const std::lock_guard<std::mutex> guard(mLock);
         return mGestures.erase(gesture) == 1 ? STATUS_NO_ERROR : STATUS_BAD_PARAMETER;
     }
-    int enableGesture(int) override { return STATUS_UNSUPPORTED; }
-    int disableGesture(int) override { return STATUS_UNSUPPORTED; }
-    int improveGestureTraining(Client::GestureData*, int&) override { return STATUS_UNSUPPORTED; }
     int getMaxPreDefinedGesture(unsigned int& count) override {
         count = 1;
         return STATUS_NO_ERROR;
@@ -63,37 +44,21 @@ class GestureService : public BnGestureManagerService {
         return STATUS_NO_ERROR;
     }
 
-    // No lock is held while a client is called, which may take its time, or call back.
-    [[noreturn]] void report() {
-        static Client::GestureData gesture = {};
+    [[noreturn]] void work() {
+        static Gesture gesture = {};
         for (;; std::this_thread::sleep_for(std::chrono::milliseconds(100))) {
             gesture.bytes[0] += 1;
-            for (const sp<Client>& client : mDetecting ? clients() : std::vector<sp<Client>>()) {
-                if (client->gestureCallback(&gesture) != STATUS_NO_ERROR) remove(client);
-            }
+            if (mDetecting) report(gesture);
         }
     }
 
   private:
-    std::vector<sp<Client>> clients() {
-        const std::lock_guard<std::mutex> guard(mLock);
-        return mClients;
-    }
-    // A client comes as another proxy each time, around the same binder.
-    void remove(const sp<Client>& client) {
-        const std::lock_guard<std::mutex> guard(mLock);
-        const auto same = [&](const sp<Client>& other) {
-            return Client::asBinder(other) == Client::asBinder(client);
-        };
-        mClients.erase(std::remove_if(mClients.begin(), mClients.end(), same), mClients.end());
-    }
     int detect(bool on) {
         mDetecting = on;
         return STATUS_NO_ERROR;
     }
 
     std::mutex mLock;  // operations come on several of Binder's threads
-    std::vector<sp<Client>> mClients;
     std::set<int> mGestures;
     int mLastGesture = 0;
     std::atomic<bool> mDetecting{false};
@@ -102,9 +67,7 @@ class GestureService : public BnGestureManagerService {
 }  // namespace
 
 int main() {
-    const sp<GestureService> service = new GestureService;
-    android::ProcessState::self()->startThreadPool();
-    android::defaultServiceManager()->addService(android::String16("pemaro.GestureManagerService"),
-                                                 service);
-    service->report();
+    const android::sp<GestureService> service = new GestureService;
+    if (publish(service) != android::OK) return EXIT_FAILURE;
+    service->work();
 }

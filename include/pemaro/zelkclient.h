@@ -3,6 +3,10 @@
 
 /// All of libzelkclient's exported headers.
 
+#include "pemaro/BasicGestureManagerService.h"
+#include "pemaro/BasicHandBiometricManagerService.h"
+#include "pemaro/BasicTouchCompanionService.h"
+#include "pemaro/BasicTouchManagerService.h"
 #include "pemaro/BnGestureManagerClient.h"
 #include "pemaro/BnGestureManagerService.h"
 #include "pemaro/BnHandBiometricManagerClient.h"
@@ -34,12 +38,15 @@
 #include "pemaro/ITouchManagerClient.h"
 #include "pemaro/ITouchManagerService.h"
 #include "pemaro/ManagerFactories.h"
+#include "pemaro/RingRecorder.h"
 #include "pemaro/RingWriter.h"
 #include "pemaro/SerializableBlob.h"
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/SerializableValue.h"
+#include "pemaro/Serve.h"
 #include "pemaro/Status.h"
+#include "pemaro/Subscribers.h"
 #include "pemaro/TextReader.h"
 #include "pemaro/TouchCompanionClient.h"
 #include "pemaro/TouchCompanionFactory.h"
