@@ -19,18 +19,18 @@ using ::testing::IsEmpty;
 constexpr char kDescriptor[] = "interface";
 constexpr status_t kFallback = 99;
 
-struct Service {
+struct StubbedService {
     int plain() { return 11; }
     int number(int value) { return value + 1; }
 };
 
-status_t onRefused(Service&, const Parcel&, Parcel&) {
+status_t onRefused(StubbedService&, const Parcel&, Parcel&) {
     return -5;
 }
 
-constexpr StubRow<Service> kRows[] = {
-        {replyPlain<&Service::plain>},
-        {replyInt<&Service::number>, "received", "finished"},
+constexpr StubRow<StubbedService> kRows[] = {
+        {replyPlain<&StubbedService::plain>},
+        {replyInt<&StubbedService::number>, "received", "finished"},
         {onRefused, "received"},
 };
 
@@ -48,7 +48,7 @@ class Stub : public android::BBinder {
         return dispatch("Tag", kRows, *this, service, code, data, reply, [] { return kFallback; });
     }
 
-    Service service;
+    StubbedService service;
 };
 
 class StubDispatch : public ::testing::Test {

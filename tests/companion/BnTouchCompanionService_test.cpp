@@ -15,6 +15,7 @@
 #include "pemaro/BnTouchCompanionClient.h"
 #include "pemaro/Status.h"
 #include "pemaro/testkit/FakeTouchCompanionService.h"
+#include "tests/companion/CompanionInterface.h"
 #include "tests/support/LocalMemory.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/ParcelBytes.h"
@@ -29,11 +30,7 @@ using android::status_t;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-constexpr char kDescriptor[] = "pemaro.TouchService";
-constexpr char kTag[] = "ITouchCompanionService";
 constexpr uint32_t kLastCode = 28;
-
-void nothing(Parcel&) {}
 
 class TouchCompanionStub : public ::testing::Test {
   protected:
@@ -63,7 +60,7 @@ class TouchCompanionStub : public ::testing::Test {
     Parcel mReply;
 };
 
-struct Row {
+struct StubRow {
     const char* name;
     uint32_t code;
     ParcelWriter arguments;  // what follows the token
@@ -72,7 +69,7 @@ struct Row {
     ParcelWriter results;    // what follows the status in the reply
 };
 
-const Row kRows[] = {
+const StubRow kStubRows[] = {
         {"registerClient", 1, [](Parcel& p) { p.writeStrongBinder(nullptr); }, "registerClient",
          "registerClient", nothing},
         {"open", 3, nothing, "open", "open", nothing},
@@ -127,9 +124,9 @@ const Row kRows[] = {
 };
 
 class TouchCompanionStubRow : public TouchCompanionStub,
-                              public ::testing::WithParamInterface<Row> {};
+                              public ::testing::WithParamInterface<StubRow> {};
 
-INSTANTIATE_TEST_SUITE_P(EveryTransaction, TouchCompanionStubRow, ::testing::ValuesIn(kRows),
+INSTANTIATE_TEST_SUITE_P(EveryTransaction, TouchCompanionStubRow, ::testing::ValuesIn(kStubRows),
                          [](const auto& info) { return info.param.name; });
 
 TEST_P(TouchCompanionStubRow, CallsTheOperationAndRepliesWithItsStatus) {

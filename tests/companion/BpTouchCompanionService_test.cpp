@@ -18,6 +18,7 @@
 #include "pemaro/BnTouchCompanionClient.h"
 #include "pemaro/Status.h"
 #include "pemaro/testkit/FakeTouchCompanionService.h"
+#include "tests/companion/CompanionInterface.h"
 #include "tests/support/LocalMemory.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/ParcelBytes.h"
@@ -29,9 +30,6 @@ namespace {
 using android::Parcel;
 using android::sp;
 using ::testing::ElementsAre;
-
-constexpr char kDescriptor[] = "pemaro.TouchService";
-constexpr char kTag[] = "ITouchCompanionService";
 
 SerializableMap mapOf(const std::string& key, int value) {
     SerializableMap map;
@@ -45,7 +43,7 @@ const sp<ITouchCompanionClient>& callbackObject() {
     return object;
 }
 
-struct Row {
+struct ProxyRow {
     const char* name;
     uint32_t code;
     std::function<int(ITouchCompanionService&)> call;
@@ -58,13 +56,11 @@ struct Row {
     const char* resultLine = nullptr;
 };
 
-void nothing(Parcel&) {}
-
 void mapText(Parcel& parcel) {
     writeString8(parcel, R"({"a":1})");
 }
 
-const Row kRows[] = {
+const ProxyRow kProxyRows[] = {
         {"registerClient", 1, [](auto& s) { return s.registerClient(callbackObject()); },
          [](Parcel& p) { p.writeStrongBinder(android::IInterface::asBinder(callbackObject())); },
          "Bp::registerClient", "registerClient() error: %s", nullptr, false},
@@ -191,7 +187,7 @@ const Row kRows[] = {
          [](Parcel& p) { writeString8(p, "secret"); }, nullptr, nullptr, nullptr},
 };
 
-std::string nameOf(const ::testing::TestParamInfo<Row>& info) {
+std::string nameOf(const ::testing::TestParamInfo<ProxyRow>& info) {
     return info.param.name;
 }
 
@@ -210,7 +206,7 @@ class TouchCompanionProxy : public ::testing::Test {
 };
 
 class TouchCompanionProxyRow : public TouchCompanionProxy,
-                               public ::testing::WithParamInterface<Row> {
+                               public ::testing::WithParamInterface<ProxyRow> {
   protected:
     static Lines entryLine() {
         const char* entry = GetParam().entry;
@@ -227,7 +223,7 @@ class TouchCompanionProxyRow : public TouchCompanionProxy,
     }
 };
 
-INSTANTIATE_TEST_SUITE_P(EveryOperation, TouchCompanionProxyRow, ::testing::ValuesIn(kRows),
+INSTANTIATE_TEST_SUITE_P(EveryOperation, TouchCompanionProxyRow, ::testing::ValuesIn(kProxyRows),
                          nameOf);
 
 TEST_P(TouchCompanionProxyRow, SendsItsRequestAndReturnsSuccess) {

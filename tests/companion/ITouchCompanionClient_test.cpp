@@ -16,10 +16,10 @@ using android::IBinder;
 using android::Parcel;
 using android::sp;
 
-constexpr char kDescriptor[] = "pemaro.TouchServiceClient";
+constexpr char kClientDescriptor[] = "pemaro.TouchServiceClient";
 
 TEST(ITouchCompanionClient, HasADescriptorOfItsOwn) {
-    EXPECT_STREQ(kDescriptor, android::String8(ITouchCompanionClient::descriptor).c_str());
+    EXPECT_STREQ(kClientDescriptor, android::String8(ITouchCompanionClient::descriptor).c_str());
 }
 
 TEST(ITouchCompanionClient, CastsNullToNull) {
@@ -55,11 +55,11 @@ TEST(ITouchCompanionClient, RefusesRequestsWithoutTheToken) {
 TEST(ITouchCompanionClient, LeavesRequestsWithTheTokenToThePlatform) {
     const sp<BnTouchCompanionClient> client = new BnTouchCompanionClient;
     Parcel data;
-    writeToken(data, kDescriptor);
+    writeToken(data, kClientDescriptor);
     Parcel reply;
     EXPECT_EQ(android::NO_ERROR, client->transact(IBinder::PING_TRANSACTION, data, &reply));
     EXPECT_EQ(android::NO_ERROR, client->transact(IBinder::INTERFACE_TRANSACTION, data, &reply));
-    EXPECT_EQ(parcelBytes([](Parcel& p) { p.writeString16(android::String16(kDescriptor)); }),
+    EXPECT_EQ(parcelBytes([](Parcel& p) { p.writeString16(android::String16(kClientDescriptor)); }),
               bytesOf(reply));
     EXPECT_EQ(android::UNKNOWN_TRANSACTION, client->transact(1, data, &reply));
 }

@@ -14,6 +14,7 @@
 #include "pemaro/TouchCompanionClient.h"
 #include "pemaro/testkit/FakeServiceManager.h"
 #include "pemaro/testkit/FakeTouchCompanionService.h"
+#include "tests/companion/CompanionInterface.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LocalMemory.h"
 #include "tests/support/LogLines.h"
@@ -22,6 +23,10 @@ namespace pemaro::test {
 
 constexpr char kClientTag[] = "TouchCompanionClient";
 
+// Of the rings that the tests make.
+constexpr uint32_t kFrameSize = 64;
+constexpr uint32_t kBufferFrames = 8;
+
 /// How long a test waits for what should happen at once before it gives up.
 constexpr std::chrono::seconds kPatience{60};
 
@@ -29,7 +34,7 @@ constexpr std::chrono::seconds kPatience{60};
 class TouchCompanionClientTest : public ::testing::Test {
   protected:
     void SetUp() override {
-        mServices->add("pemaro.TouchService", mService);
+        mServices->add(kDescriptor, mService);
         clearLog();
     }
 

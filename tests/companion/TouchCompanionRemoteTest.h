@@ -3,18 +3,13 @@
 
 #include <string>
 
+#include "tests/companion/CompanionInterface.h"
 #include "tests/companion/TouchCompanionClientTest.h"
+#include "tests/support/MapText.h"
 #include "tests/support/ParcelBytes.h"
 #include "tests/support/RecordingBinder.h"
 
 namespace pemaro::test {
-
-/// The map that `text` holds.
-inline SerializableMap mapOf(const std::string& text) {
-    SerializableMap map;
-    EXPECT_EQ(0, map.unserialize(text)) << text;
-    return map;
-}
 
 /// A connected client whose calls cross a proxy and a stub, as to another process: `mRemote` keeps
 /// the transactions.
@@ -23,7 +18,7 @@ class TouchCompanionRemoteTest : public TouchCompanionClientTest {
     void SetUp() override {
         TouchCompanionClientTest::SetUp();
         mRemote->forwardTo(mService);
-        mServices->add("pemaro.TouchService", mRemote);
+        mServices->add(kDescriptor, mRemote);
         mClient = connect();
         mRemote->clearTransactions();
     }
@@ -33,8 +28,7 @@ class TouchCompanionRemoteTest : public TouchCompanionClientTest {
         ASSERT_EQ(1u, mRemote->transactions().size());
         EXPECT_EQ(code, mRemote->lastTransaction().code);
         EXPECT_EQ(0u, mRemote->lastTransaction().flags);
-        EXPECT_EQ(requestBytes("pemaro.TouchService", arguments),
-                  mRemote->lastTransaction().request);
+        EXPECT_EQ(requestBytes(kDescriptor, arguments), mRemote->lastTransaction().request);
     }
 
     void expectSentText(uint32_t code, const std::string& text) {
@@ -43,7 +37,7 @@ class TouchCompanionRemoteTest : public TouchCompanionClientTest {
 
     void expectNothingSent() { EXPECT_EQ(0u, mRemote->transactions().size()); }
 
-    const android::sp<RecordingBinder> mRemote = new RecordingBinder("pemaro.TouchService");
+    const android::sp<RecordingBinder> mRemote = new RecordingBinder(kDescriptor);
     android::sp<TouchCompanionClient> mClient;
 };
 

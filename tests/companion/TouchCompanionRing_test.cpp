@@ -19,9 +19,6 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using FrameBuffer = TouchCompanionClient::FrameBuffer;
 
-constexpr uint32_t kFrameSize = 64;
-constexpr uint32_t kBufferFrames = 8;
-
 std::string dataLine(const FrameBuffer& buffer) {
     char text[100];
     snprintf(text, sizeof(text), "D acquireBuffer: data = %p, size = %zu, frameCount = %u",

@@ -65,7 +65,7 @@ Order answering(const ParcelWriter& write, uint32_t code = Order::kAnyCall) {
     return order;
 }
 
-ParcelWriter number(int status) {
+ParcelWriter statusReply(int status) {
     return [status](android::Parcel& reply) { reply.writeInt32(status); };
 }
 
@@ -347,7 +347,7 @@ TEST_P(InitFaults, PassesEveryRefusalOn) {
     const Traces traces(binder());
     for (int n = 0; n < kStatuses; ++n) {
         const int status = STATUS_UNKNOWN_ERROR + n;
-        mPeer.order(answering(number(status), mRow.code));
+        mPeer.order(answering(statusReply(status), mRow.code));
         if (!mRow.canRefuse) {
             EXPECT_EQ(0, init());
             expectConnected();
@@ -480,7 +480,7 @@ TEST_P(DeinitFaults, TakesNoRefusalAndEveryShortReply) {
     const Traces traces(binder());
     for (int n = 0; n <= kStatuses; ++n) {
         ASSERT_NO_FATAL_FAILURE(connect());
-        mPeer.order(n < kStatuses ? answering(number(STATUS_UNKNOWN_ERROR + n), kUnsubscribe)
+        mPeer.order(n < kStatuses ? answering(statusReply(STATUS_UNKNOWN_ERROR + n), kUnsubscribe)
                                   : answering([](android::Parcel&) {}, kUnsubscribe));
         EXPECT_EQ(0, mRow.deinit(*mClients));
         expectIdle({});
@@ -601,7 +601,7 @@ TEST_P(RecordFaults, PassesEveryRefusalOn) {
     ASSERT_NO_FATAL_FAILURE(connect());
     for (int n = 0; n < kStatuses; ++n) {
         const int status = STATUS_UNKNOWN_ERROR + n;
-        mPeer.order(ringBut(number(status), mRow.code));
+        mPeer.order(ringBut(statusReply(status), mRow.code));
         EXPECT_EQ(mRow.refused(status), mClients->companion->startRecord());
         expectErrors(errorLines(mRow.refusedInProxy, errStr(status)), mRow.refusedInClient);
         expectRing(mRow.hasRing || mRow.refused(status) == 0);
@@ -671,7 +671,7 @@ TEST(PingFaults, TellWhetherTheServiceLives) {
         EXPECT_EQ(0, clients.companion->pingService());
         ASSERT_EQ(0, clients.companion->init());
         for (int n = 0; n < kStatuses; ++n) {
-            peer.order(answering(number(STATUS_UNKNOWN_ERROR + n)));
+            peer.order(answering(statusReply(STATUS_UNKNOWN_ERROR + n)));
             EXPECT_EQ(1, clients.companion->pingService());
         }
         clearLog();

@@ -26,7 +26,7 @@ using android::String16;
 using android::wp;
 
 template <typename I, typename M, const char* kName>
-struct Case {
+struct InterfaceCase {
     using Interface = I;
     using Mock = M;
     static constexpr const char* kDescriptor = kName;
@@ -40,12 +40,12 @@ constexpr char kHandService[] = "pemaro.HandBiometricManagerService";
 constexpr char kHandClient[] = "pemaro.HandBiometricManagerClient";
 
 using Interfaces = ::testing::Types<
-        Case<ITouchManagerService, MockTouchManagerService, kTouchService>,
-        Case<ITouchManagerClient, MockTouchManagerClient, kTouchClient>,
-        Case<IGestureManagerService, MockGestureManagerService, kGestureService>,
-        Case<IGestureManagerClient, MockGestureManagerClient, kGestureClient>,
-        Case<IHandBiometricManagerService, MockHandBiometricManagerService, kHandService>,
-        Case<IHandBiometricManagerClient, MockHandBiometricManagerClient, kHandClient>>;
+        InterfaceCase<ITouchManagerService, MockTouchManagerService, kTouchService>,
+        InterfaceCase<ITouchManagerClient, MockTouchManagerClient, kTouchClient>,
+        InterfaceCase<IGestureManagerService, MockGestureManagerService, kGestureService>,
+        InterfaceCase<IGestureManagerClient, MockGestureManagerClient, kGestureClient>,
+        InterfaceCase<IHandBiometricManagerService, MockHandBiometricManagerService, kHandService>,
+        InterfaceCase<IHandBiometricManagerClient, MockHandBiometricManagerClient, kHandClient>>;
 
 template <typename T>
 class ManagerInterface : public ::testing::Test {};

@@ -36,12 +36,7 @@ struct Clients {
     const sp<HandBiometricManagerClient> hand = new HandBiometricManagerClient;
 };
 
-bool gAnswer;
-int gResult;
-unsigned int gCount;
-std::vector<std::string> gNames;
-
-struct Row {
+struct OperationRow {
     const char* name;
     const char* manager;
     std::function<int(Clients&)> call;
@@ -51,41 +46,44 @@ struct Row {
     const char* failure;  // up to the message
 };
 
-void PrintTo(const Row& row, std::ostream* out) {
+void PrintTo(const OperationRow& row, std::ostream* out) {
     *out << row.name;
 }
 
-const char kTouch[] = "TouchManager";
-const char kGesture[] = "GestureManager";
-const char kHand[] = "HandBiometricManager";
+const char kTouchManager[] = "TouchManager";
+const char kGestureManager[] = "GestureManager";
+const char kHandManager[] = "HandBiometricManager";
 
-const Row kRows[] = {
-        {"touchIsSupported", kTouch, [](Clients& c) { return c.touch->isSupported(7, gAnswer); }, 3,
-         numbers({7}), numbers({1}), "isSupported failed: "},
-        {"touchIsEnabled", kTouch, [](Clients& c) { return c.touch->isEnabled(8, gAnswer); }, 4,
-         numbers({8}), numbers({1}), "isEnabled failed: "},
-        {"touchEnable", kTouch, [](Clients& c) { return c.touch->enable(9); }, 5, numbers({9}),
-         nothing, "enable failed: "},
-        {"touchDisable", kTouch, [](Clients& c) { return c.touch->disable(10); }, 6, numbers({10}),
-         nothing, "disable failed: "},
-        {"touchConfigureVmRegion", kTouch,
+const OperationRow kOperationRows[] = {
+        {"touchIsSupported", kTouchManager,
+         [](Clients& c) { return c.touch->isSupported(7, gAnswer); }, 3, numbers({7}), numbers({1}),
+         "isSupported failed: "},
+        {"touchIsEnabled", kTouchManager, [](Clients& c) { return c.touch->isEnabled(8, gAnswer); },
+         4, numbers({8}), numbers({1}), "isEnabled failed: "},
+        {"touchEnable", kTouchManager, [](Clients& c) { return c.touch->enable(9); }, 5,
+         numbers({9}), nothing, "enable failed: "},
+        {"touchDisable", kTouchManager, [](Clients& c) { return c.touch->disable(10); }, 6,
+         numbers({10}), nothing, "disable failed: "},
+        {"touchConfigureVmRegion", kTouchManager,
          [](Clients& c) {
              Rect region(1, 2, 3, 4);
              return c.touch->configure_vm_region(region, true);
          },
          7, numbers({2, 1, 4, 3, 1}), nothing, "disable failed: "},
 
-        {"gestureEnableWakeup", kGesture, [](Clients& c) { return c.gesture->enableWakeup(); }, 3,
-         nothing, nothing, "enable failed: "},
-        {"gestureDisableWakeup", kGesture, [](Clients& c) { return c.gesture->disableWakeup(); }, 4,
-         nothing, nothing, "disable failed: "},
-        {"gestureStartDetection", kGesture,
+        {"gestureEnableWakeup", kGestureManager,
+         [](Clients& c) { return c.gesture->enableWakeup(); }, 3, nothing, nothing,
+         "enable failed: "},
+        {"gestureDisableWakeup", kGestureManager,
+         [](Clients& c) { return c.gesture->disableWakeup(); }, 4, nothing, nothing,
+         "disable failed: "},
+        {"gestureStartDetection", kGestureManager,
          [](Clients& c) { return c.gesture->startGestureDetection(); }, 5, nothing, nothing,
          "enable failed: "},
-        {"gestureStopDetection", kGesture,
+        {"gestureStopDetection", kGestureManager,
          [](Clients& c) { return c.gesture->stopGestureDetection(); }, 6, nothing, nothing,
          "enable failed: "},
-        {"gestureAdd", kGesture,
+        {"gestureAdd", kGestureManager,
          [](Clients& c) {
              return c.gesture->addGesture(2, makeRecords<Gesture>(2).data(), gResult);
          },
@@ -95,59 +93,62 @@ const Row kRows[] = {
              writeRecords<Gesture>(p, 2);
          },
          numbers({4}), "addGesture failed: "},
-        {"gestureDelete", kGesture, [](Clients& c) { return c.gesture->deleteGesture(3); }, 8,
-         numbers({3}), nothing, "deleteGesture failed: "},
-        {"gestureEnable", kGesture, [](Clients& c) { return c.gesture->enableGesture(4); }, 9,
-         numbers({4}), nothing, "enableGesture failed: "},
-        {"gestureDisable", kGesture, [](Clients& c) { return c.gesture->disableGesture(5); }, 10,
-         numbers({5}), nothing, "disableGesture failed: "},
-        {"gestureVerify", kGesture,
+        {"gestureDelete", kGestureManager, [](Clients& c) { return c.gesture->deleteGesture(3); },
+         8, numbers({3}), nothing, "deleteGesture failed: "},
+        {"gestureEnable", kGestureManager, [](Clients& c) { return c.gesture->enableGesture(4); },
+         9, numbers({4}), nothing, "enableGesture failed: "},
+        {"gestureDisable", kGestureManager, [](Clients& c) { return c.gesture->disableGesture(5); },
+         10, numbers({5}), nothing, "disableGesture failed: "},
+        {"gestureVerify", kGestureManager,
          [](Clients& c) {
              return c.gesture->verifyGesture(makeRecords<Gesture>(1).data(), gResult);
          },
          11, [](Parcel& p) { writeRecords<Gesture>(p, 1); }, numbers({2}),
          "improveGestureTraining failed: "},
-        {"gestureMaxPreDefined", kGesture,
+        {"gestureMaxPreDefined", kGestureManager,
          [](Clients& c) { return c.gesture->getMaxPreDefinedGesture(gCount); }, 12, nothing,
          numbers({8}), "getMaxPreDefinedGesture failed: "},
-        {"gestureMaxUserDefined", kGesture,
+        {"gestureMaxUserDefined", kGestureManager,
          [](Clients& c) { return c.gesture->getMaxUserDefinedGesture(gCount); }, 13, nothing,
          numbers({8}), "getMaxUserDefinedGesture failed: "},
 
-        {"handStartEnrollment", kHand, [](Clients& c) { return c.hand->startEnrollment(); }, 3,
-         nothing, nothing, "startEnrollment failed: "},
-        {"handStopEnrollment", kHand, [](Clients& c) { return c.hand->stopEnrollment(); }, 4,
+        {"handStartEnrollment", kHandManager, [](Clients& c) { return c.hand->startEnrollment(); },
+         3, nothing, nothing, "startEnrollment failed: "},
+        {"handStopEnrollment", kHandManager, [](Clients& c) { return c.hand->stopEnrollment(); }, 4,
          nothing, nothing, "stopEnrollment failed: "},
-        {"handScan", kHand, [](Clients& c) { return c.hand->scan(); }, 5, nothing, nothing,
+        {"handScan", kHandManager, [](Clients& c) { return c.hand->scan(); }, 5, nothing, nothing,
          "scan failed: "},
-        {"handStartMatching", kHand, [](Clients& c) { return c.hand->startMatching(); }, 6, nothing,
-         nothing, "startMatching failed: "},
-        {"handStopMatching", kHand, [](Clients& c) { return c.hand->stopMatching(); }, 7, nothing,
-         nothing, "stopMatching failed: "},
-        {"handCancelScan", kHand, [](Clients& c) { return c.hand->cancelScan(); }, 8, nothing,
-         nothing, "cancelScan failed: "},
-        {"handSetSecurity", kHand, [](Clients& c) { return c.hand->setSecurity(2); }, 9,
+        {"handStartMatching", kHandManager, [](Clients& c) { return c.hand->startMatching(); }, 6,
+         nothing, nothing, "startMatching failed: "},
+        {"handStopMatching", kHandManager, [](Clients& c) { return c.hand->stopMatching(); }, 7,
+         nothing, nothing, "stopMatching failed: "},
+        {"handCancelScan", kHandManager, [](Clients& c) { return c.hand->cancelScan(); }, 8,
+         nothing, nothing, "cancelScan failed: "},
+        {"handSetSecurity", kHandManager, [](Clients& c) { return c.hand->setSecurity(2); }, 9,
          numbers({2}), nothing, "setSecurity failed: "},
-        {"handSetProfileName", kHand, [](Clients& c) { return c.hand->setProfileName("alice"); },
-         10, names({"alice"}), nothing, "setProfileName failed: "},
-        {"handDeleteProfile", kHand, [](Clients& c) { return c.hand->deleteProfile("bob"); }, 11,
-         names({"bob"}), nothing, "setProfileName failed: "},
-        {"handRenameProfile", kHand, [](Clients& c) { return c.hand->renameProfile("A", "B"); }, 12,
-         names({"A", "B"}), nothing, "setProfileName failed: "},
-        {"handGetMaxUser", kHand, [](Clients& c) { return c.hand->getMaxUser(gCount); }, 13,
+        {"handSetProfileName", kHandManager,
+         [](Clients& c) { return c.hand->setProfileName("alice"); }, 10, names({"alice"}), nothing,
+         "setProfileName failed: "},
+        {"handDeleteProfile", kHandManager, [](Clients& c) { return c.hand->deleteProfile("bob"); },
+         11, names({"bob"}), nothing, "setProfileName failed: "},
+        {"handRenameProfile", kHandManager,
+         [](Clients& c) { return c.hand->renameProfile("A", "B"); }, 12, names({"A", "B"}), nothing,
+         "setProfileName failed: "},
+        {"handGetMaxUser", kHandManager, [](Clients& c) { return c.hand->getMaxUser(gCount); }, 13,
          nothing, numbers({5}), "getMaxUser failed: "},
-        {"handGetProfileList", kHand, [](Clients& c) { return c.hand->getProfileList(gNames); }, 14,
-         nothing, numbers({0}), "getProfileList failed: "},
-        {"handEnableWakeup", kHand, [](Clients& c) { return c.hand->enableWakeup(); }, 15, nothing,
-         nothing, "enable failed: "},
-        {"handDisableWakeup", kHand, [](Clients& c) { return c.hand->disableWakeup(); }, 16,
+        {"handGetProfileList", kHandManager,
+         [](Clients& c) { return c.hand->getProfileList(gNames); }, 14, nothing, numbers({0}),
+         "getProfileList failed: "},
+        {"handEnableWakeup", kHandManager, [](Clients& c) { return c.hand->enableWakeup(); }, 15,
+         nothing, nothing, "enable failed: "},
+        {"handDisableWakeup", kHandManager, [](Clients& c) { return c.hand->disableWakeup(); }, 16,
          nothing, nothing, "disable failed: "},
 };
 
 class ManagerOperations : public ::testing::Test {
   protected:
     ManagerOperations() {
-        for (const char* manager : {kTouch, kGesture, kHand}) {
+        for (const char* manager : {kTouchManager, kGestureManager, kHandManager}) {
             mServices->add(std::string("pemaro.") + manager + "Service", mRemote);
         }
     }
@@ -166,7 +167,8 @@ class ManagerOperations : public ::testing::Test {
     Clients mClients;
 };
 
-class ManagerOperationRow : public ManagerOperations, public ::testing::WithParamInterface<Row> {
+class ManagerOperationRow : public ManagerOperations,
+                            public ::testing::WithParamInterface<OperationRow> {
   protected:
     std::string tag() const { return std::string(GetParam().manager) + "Client"; }
 
@@ -182,7 +184,7 @@ class ManagerOperationRow : public ManagerOperations, public ::testing::WithPara
     }
 };
 
-INSTANTIATE_TEST_SUITE_P(EveryOperation, ManagerOperationRow, ::testing::ValuesIn(kRows),
+INSTANTIATE_TEST_SUITE_P(EveryOperation, ManagerOperationRow, ::testing::ValuesIn(kOperationRows),
                          [](const auto& info) { return info.param.name; });
 
 TEST_P(ManagerOperationRow, ReachesTheService) {

@@ -6,6 +6,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <string>
 #include <type_traits>
 #include <vector>
 
@@ -16,7 +17,15 @@ namespace pemaro::test {
 
 // What the managers' requests and replies are made of.
 
-inline void nothing(android::Parcel&) {}
+inline constexpr char kTouch[] = "TouchManagerService";
+inline constexpr char kGesture[] = "GestureManagerService";
+inline constexpr char kHand[] = "HandBiometricManagerService";
+
+// Where an operation leaves what it answers, when only its result counts.
+inline bool gAnswer;
+inline int gResult;
+inline unsigned int gCount;
+inline std::vector<std::string> gNames;
 
 inline ParcelWriter numbers(std::vector<int32_t> values) {
     return [values](android::Parcel& parcel) {

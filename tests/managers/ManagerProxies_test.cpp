@@ -40,17 +40,17 @@ Call on(Operation operation) {
 }
 
 template <typename Operation>
-Call touch(Operation operation) {
+Call touchCall(Operation operation) {
     return on<ITouchManagerService>(operation);
 }
 
 template <typename Operation>
-Call gesture(Operation operation) {
+Call gestureCall(Operation operation) {
     return on<IGestureManagerService>(operation);
 }
 
 template <typename Operation>
-Call hand(Operation operation) {
+Call handCall(Operation operation) {
     return on<IHandBiometricManagerService>(operation);
 }
 
@@ -80,7 +80,7 @@ ParcelWriter binderOf(const sp<Client>& (*client)()) {
     };
 }
 
-struct Row {
+struct ProxyRow {
     const char* name;
     const char* interface;
     uint32_t code;
@@ -91,40 +91,33 @@ struct Row {
     const char* failure;  // up to the reason
 };
 
-void PrintTo(const Row& row, std::ostream* out) {
+void PrintTo(const ProxyRow& row, std::ostream* out) {
     *out << row.name;
 }
 
-const char kTouch[] = "TouchManagerService";
-const char kGesture[] = "GestureManagerService";
-const char kHand[] = "HandBiometricManagerService";
-
-bool gAnswer;
-int gResult;
-unsigned int gCount;
-std::vector<std::string> gNames;
-
-const Row kRows[] = {
-        {"touchSubscribe", kTouch, 1, touch([](auto& s) { return s.subscribe(touchClient()); }),
+const ProxyRow kProxyRows[] = {
+        {"touchSubscribe", kTouch, 1, touchCall([](auto& s) { return s.subscribe(touchClient()); }),
          binderOf(touchClient), nothing, "Bp::subscribe", "subscribe() error: "},
-        {"touchUnsubscribe", kTouch, 2, touch([](auto& s) { return s.unsubscribe(touchClient()); }),
-         binderOf(touchClient), nothing, "Bp: unsubscribe", "unsubscribe() error: "},
-        {"touchIsSupported", kTouch, 3, touch([](auto& s) { return s.isSupported(-7, gAnswer); }),
-         numbers({-7}), numbers({1}), "Bp::isSupported", "isSupported() error: "},
-        {"touchIsEnabled", kTouch, 4, touch([](auto& s) { return s.isEnabled(8, gAnswer); }),
+        {"touchUnsubscribe", kTouch, 2,
+         touchCall([](auto& s) { return s.unsubscribe(touchClient()); }), binderOf(touchClient),
+         nothing, "Bp: unsubscribe", "unsubscribe() error: "},
+        {"touchIsSupported", kTouch, 3,
+         touchCall([](auto& s) { return s.isSupported(-7, gAnswer); }), numbers({-7}), numbers({1}),
+         "Bp::isSupported", "isSupported() error: "},
+        {"touchIsEnabled", kTouch, 4, touchCall([](auto& s) { return s.isEnabled(8, gAnswer); }),
          numbers({8}), numbers({1}), "Bp::isEnabled", "isEnabled() error: "},
-        {"touchEnable", kTouch, 5, touch([](auto& s) { return s.enable(9); }), numbers({9}),
+        {"touchEnable", kTouch, 5, touchCall([](auto& s) { return s.enable(9); }), numbers({9}),
          nothing, "Bp::enable", "enable() error: "},
-        {"touchDisable", kTouch, 6, touch([](auto& s) { return s.disable(10); }), numbers({10}),
+        {"touchDisable", kTouch, 6, touchCall([](auto& s) { return s.disable(10); }), numbers({10}),
          nothing, "Bp::disable", "disable() error: "},
         // Left 1, top 2, right 3, bottom 4 travel as top, left, bottom, right.
-        {"touchConfigureVmRegionOn", kTouch, 7, touch([](auto& s) {
+        {"touchConfigureVmRegionOn", kTouch, 7, touchCall([](auto& s) {
              Rect region(1, 2, 3, 4);
              return s.configure_vm_region(region, true);
          }),
          numbers({2, 1, 4, 3, 1}), nothing, "Bp::configure_vm_region",
          "configure_vm_region() error: "},
-        {"touchConfigureVmRegionOff", kTouch, 7, touch([](auto& s) {
+        {"touchConfigureVmRegionOff", kTouch, 7, touchCall([](auto& s) {
              Rect region(-1, -2, 0x7fffffff, 4);
              return s.configure_vm_region(region, false);
          }),
@@ -137,66 +130,70 @@ const Row kRows[] = {
          "gestureCallback() error: "},
 
         {"gestureSubscribe", kGesture, 1,
-         gesture([](auto& s) { return s.subscribe(gestureClient()); }), binderOf(gestureClient),
+         gestureCall([](auto& s) { return s.subscribe(gestureClient()); }), binderOf(gestureClient),
          nothing, "Bp::subscribe", "subscribe() error: "},
         {"gestureUnsubscribe", kGesture, 2,
-         gesture([](auto& s) { return s.unsubscribe(gestureClient()); }), binderOf(gestureClient),
-         nothing, "Bp: unsubscribe", "unsubscribe() error: "},
-        {"gestureEnableWakeup", kGesture, 3, gesture([](auto& s) { return s.enableWakeup(); }),
+         gestureCall([](auto& s) { return s.unsubscribe(gestureClient()); }),
+         binderOf(gestureClient), nothing, "Bp: unsubscribe", "unsubscribe() error: "},
+        {"gestureEnableWakeup", kGesture, 3, gestureCall([](auto& s) { return s.enableWakeup(); }),
          nothing, nothing, "Bp::enableWakeup", "enable() error: "},
-        {"gestureDisableWakeup", kGesture, 4, gesture([](auto& s) { return s.disableWakeup(); }),
-         nothing, nothing, "Bp::disableWakeup", "disable() error: "},
+        {"gestureDisableWakeup", kGesture, 4,
+         gestureCall([](auto& s) { return s.disableWakeup(); }), nothing, nothing,
+         "Bp::disableWakeup", "disable() error: "},
         {"gestureStartDetection", kGesture, 5,
-         gesture([](auto& s) { return s.startGestureDetection(); }), nothing, nothing,
+         gestureCall([](auto& s) { return s.startGestureDetection(); }), nothing, nothing,
          "Bp::startGestureDetection", "startGestureDetection() error: "},
         {"gestureStopDetection", kGesture, 6,
-         gesture([](auto& s) { return s.stopGestureDetection(); }), nothing, nothing,
+         gestureCall([](auto& s) { return s.stopGestureDetection(); }), nothing, nothing,
          "Bp::stopGestureDetection", "stopGestureDetection() error: "},
-        {"gestureAddThree", kGesture, 7,
-         gesture([](auto& s) { return s.addGesture(3, makeRecords<Gesture>(3).data(), gResult); }),
+        {"gestureAddThree", kGesture, 7, gestureCall([](auto& s) {
+             return s.addGesture(3, makeRecords<Gesture>(3).data(), gResult);
+         }),
          [](Parcel& p) {
              p.writeInt32(3);
              writeRecords<Gesture>(p, 3);
          },
          numbers({4}), "Bp::addGesture", "addGesture() error: "},
-        {"gestureAddNone", kGesture, 7,
-         gesture([](auto& s) { return s.addGesture(0, makeRecords<Gesture>(1).data(), gResult); }),
+        {"gestureAddNone", kGesture, 7, gestureCall([](auto& s) {
+             return s.addGesture(0, makeRecords<Gesture>(1).data(), gResult);
+         }),
          numbers({0}), numbers({4}), "Bp::addGesture", "addGesture() error: "},
         // More bytes than any request: the count travels alone.
-        {"gestureAddNegative", kGesture, 7,
-         gesture([](auto& s) { return s.addGesture(-1, makeRecords<Gesture>(1).data(), gResult); }),
+        {"gestureAddNegative", kGesture, 7, gestureCall([](auto& s) {
+             return s.addGesture(-1, makeRecords<Gesture>(1).data(), gResult);
+         }),
          numbers({-1}), numbers({4}), "Bp::addGesture", "addGesture() error: "},
-        {"gestureAddMostNegative", kGesture, 7, gesture([](auto& s) {
+        {"gestureAddMostNegative", kGesture, 7, gestureCall([](auto& s) {
              return s.addGesture(INT32_MIN, makeRecords<Gesture>(1).data(), gResult);
          }),
          numbers({INT32_MIN}), numbers({4}), "Bp::addGesture", "addGesture() error: "},
-        {"gestureAddTwoGibibytes", kGesture, 7, gesture([](auto& s) {
+        {"gestureAddTwoGibibytes", kGesture, 7, gestureCall([](auto& s) {
              return s.addGesture(29767, makeRecords<Gesture>(1).data(), gResult);
          }),
          numbers({29767}), numbers({4}), "Bp::addGesture", "addGesture() error: "},
         {"gestureAddWithoutSamples", kGesture, 7,
-         gesture([](auto& s) { return s.addGesture(2, nullptr, gResult); }), numbers({2}),
+         gestureCall([](auto& s) { return s.addGesture(2, nullptr, gResult); }), numbers({2}),
          numbers({4}), "Bp::addGesture", "addGesture() error: "},
-        {"gestureDelete", kGesture, 8, gesture([](auto& s) { return s.deleteGesture(-3); }),
+        {"gestureDelete", kGesture, 8, gestureCall([](auto& s) { return s.deleteGesture(-3); }),
          numbers({-3}), nothing, "Bp::deleteGesture", "deleteGesture() error: "},
-        {"gestureEnable", kGesture, 9, gesture([](auto& s) { return s.enableGesture(4); }),
+        {"gestureEnable", kGesture, 9, gestureCall([](auto& s) { return s.enableGesture(4); }),
          numbers({4}), nothing, "Bp::enableGesture", "enableGesture() error: "},
-        {"gestureDisable", kGesture, 10, gesture([](auto& s) { return s.disableGesture(5); }),
+        {"gestureDisable", kGesture, 10, gestureCall([](auto& s) { return s.disableGesture(5); }),
          numbers({5}), nothing, "Bp::disableGesture", "disableGesture() error: "},
-        {"gestureVerify", kGesture, 11, gesture([](auto& s) {
+        {"gestureVerify", kGesture, 11, gestureCall([](auto& s) {
              return s.improveGestureTraining(makeRecords<Gesture>(1).data(), gResult);
          }),
          [](Parcel& p) { writeRecords<Gesture>(p, 1); }, numbers({2}), "Bp::improveGestureTraining",
          "improveGestureTraining() error: "},
         {"gestureVerifyWithoutSample", kGesture, 11,
-         gesture([](auto& s) { return s.improveGestureTraining(nullptr, gResult); }), nothing,
+         gestureCall([](auto& s) { return s.improveGestureTraining(nullptr, gResult); }), nothing,
          numbers({2}), "Bp::improveGestureTraining", "improveGestureTraining() error: "},
         {"gestureMaxPreDefined", kGesture, 12,
-         gesture([](auto& s) { return s.getMaxPreDefinedGesture(gCount); }), nothing, numbers({8}),
-         "Bp::getMaxPreDefinedGesture enter", "getMaxPreDefinedGesture error: "},
+         gestureCall([](auto& s) { return s.getMaxPreDefinedGesture(gCount); }), nothing,
+         numbers({8}), "Bp::getMaxPreDefinedGesture enter", "getMaxPreDefinedGesture error: "},
         {"gestureMaxUserDefined", kGesture, 13,
-         gesture([](auto& s) { return s.getMaxUserDefinedGesture(gCount); }), nothing, numbers({8}),
-         "Bp::getMaxUserDefinedGesture enter", "getMaxUserDefinedGesture error: "},
+         gestureCall([](auto& s) { return s.getMaxUserDefinedGesture(gCount); }), nothing,
+         numbers({8}), "Bp::getMaxUserDefinedGesture enter", "getMaxUserDefinedGesture error: "},
         {"gestureGestureCallback", "GestureManagerClient", 1,
          on<IGestureManagerClient>(
                  [](auto& c) { return c.gestureCallback(makeRecords<Gesture>(1).data()); }),
@@ -206,39 +203,41 @@ const Row kRows[] = {
          on<IGestureManagerClient>([](auto& c) { return c.gestureCallback(nullptr); }), nothing,
          nothing, "Bp::gestureCallback", "gestureCallback() error: "},
 
-        {"handSubscribe", kHand, 1, hand([](auto& s) { return s.subscribe(handClient()); }),
+        {"handSubscribe", kHand, 1, handCall([](auto& s) { return s.subscribe(handClient()); }),
          binderOf(handClient), nothing, "Bp::subscribe", "subscribe() error: "},
-        {"handUnsubscribe", kHand, 2, hand([](auto& s) { return s.unsubscribe(handClient()); }),
+        {"handUnsubscribe", kHand, 2, handCall([](auto& s) { return s.unsubscribe(handClient()); }),
          binderOf(handClient), nothing, "Bp: unsubscribe", "unsubscribe() error: "},
-        {"handStartEnrollment", kHand, 3, hand([](auto& s) { return s.startEnrollment(); }),
+        {"handStartEnrollment", kHand, 3, handCall([](auto& s) { return s.startEnrollment(); }),
          nothing, nothing, "Bp::startEnrollment", "startEnrollment error: "},
-        {"handStopEnrollment", kHand, 4, hand([](auto& s) { return s.stopEnrollment(); }), nothing,
-         nothing, "Bp::stopEnrollment", "stopEnrollment error: "},
-        {"handScan", kHand, 5, hand([](auto& s) { return s.scan(); }), nothing, nothing, "Bp::scan",
-         "scan error: "},
-        {"handStartMatching", kHand, 6, hand([](auto& s) { return s.startMatching(); }), nothing,
-         nothing, "Bp::startMatching", "startMatching error: "},
-        {"handStopMatching", kHand, 7, hand([](auto& s) { return s.stopMatching(); }), nothing,
+        {"handStopEnrollment", kHand, 4, handCall([](auto& s) { return s.stopEnrollment(); }),
+         nothing, nothing, "Bp::stopEnrollment", "stopEnrollment error: "},
+        {"handScan", kHand, 5, handCall([](auto& s) { return s.scan(); }), nothing, nothing,
+         "Bp::scan", "scan error: "},
+        {"handStartMatching", kHand, 6, handCall([](auto& s) { return s.startMatching(); }),
+         nothing, nothing, "Bp::startMatching", "startMatching error: "},
+        {"handStopMatching", kHand, 7, handCall([](auto& s) { return s.stopMatching(); }), nothing,
          nothing, "Bp::stopMatching", "stopMatching error: "},
-        {"handCancelScan", kHand, 8, hand([](auto& s) { return s.cancelScan(); }), nothing, nothing,
-         "Bp::cancelScan", "cancelScan error: "},
-        {"handSetSecurity", kHand, 9, hand([](auto& s) { return s.setSecurity(-2); }),
+        {"handCancelScan", kHand, 8, handCall([](auto& s) { return s.cancelScan(); }), nothing,
+         nothing, "Bp::cancelScan", "cancelScan error: "},
+        {"handSetSecurity", kHand, 9, handCall([](auto& s) { return s.setSecurity(-2); }),
          numbers({-2}), nothing, "Bp::setSecurity", "setSecurity error: "},
-        {"handSetProfileName", kHand, 10, hand([](auto& s) { return s.setProfileName("alice"); }),
-         names({"alice"}), nothing, "Bp::setProfileName", "setProfileName error: "},
-        {"handDeleteProfile", kHand, 11, hand([](auto& s) { return s.deleteProfile(""); }),
+        {"handSetProfileName", kHand, 10,
+         handCall([](auto& s) { return s.setProfileName("alice"); }), names({"alice"}), nothing,
+         "Bp::setProfileName", "setProfileName error: "},
+        {"handDeleteProfile", kHand, 11, handCall([](auto& s) { return s.deleteProfile(""); }),
          names({""}), nothing, "Bp::deleteProfile", "deleteProfile error: "},
-        {"handRenameProfile", kHand, 12, hand([](auto& s) { return s.renameProfile("A", "B"); }),
-         names({"A", "B"}), nothing, "Bp::renameProfile", "renameProfile error: "},
-        {"handGetMaxUser", kHand, 13, hand([](auto& s) { return s.getMaxUser(gCount); }), nothing,
-         numbers({5}), "Bp::getMaxUser enter", "getMaxUser error: "},
+        {"handRenameProfile", kHand, 12,
+         handCall([](auto& s) { return s.renameProfile("A", "B"); }), names({"A", "B"}), nothing,
+         "Bp::renameProfile", "renameProfile error: "},
+        {"handGetMaxUser", kHand, 13, handCall([](auto& s) { return s.getMaxUser(gCount); }),
+         nothing, numbers({5}), "Bp::getMaxUser enter", "getMaxUser error: "},
         {"handGetProfileListOfNone", kHand, 14,
-         hand([](auto& s) { return s.getProfileList(gNames); }), nothing, numbers({0}),
+         handCall([](auto& s) { return s.getProfileList(gNames); }), nothing, numbers({0}),
          "Bp::getProfileList enter", "getProfileList error: "},
-        {"handEnableWakeup", kHand, 15, hand([](auto& s) { return s.enableWakeup(); }), nothing,
+        {"handEnableWakeup", kHand, 15, handCall([](auto& s) { return s.enableWakeup(); }), nothing,
          nothing, "Bp::enableWakeup", "enable() error: "},
-        {"handDisableWakeup", kHand, 16, hand([](auto& s) { return s.disableWakeup(); }), nothing,
-         nothing, "Bp::disableWakeup", "disable() error: "},
+        {"handDisableWakeup", kHand, 16, handCall([](auto& s) { return s.disableWakeup(); }),
+         nothing, nothing, "Bp::disableWakeup", "disable() error: "},
         {"handCallback", "HandBiometricManagerClient", 1,
          on<IHandBiometricManagerClient>(
                  [](auto& c) { return c.handBiometricCallback(makeRecords<HandEvent>(1).data()); }),
@@ -253,14 +252,14 @@ class ManagerProxy : public ::testing::Test {
     const sp<RecordingBinder> mRemote = new RecordingBinder;
 };
 
-class ManagerProxyRow : public ManagerProxy, public ::testing::WithParamInterface<Row> {
+class ManagerProxyRow : public ManagerProxy, public ::testing::WithParamInterface<ProxyRow> {
   protected:
     std::string tag() const { return std::string("I") + GetParam().interface; }
     std::string descriptor() const { return std::string("pemaro.") + GetParam().interface; }
     std::string entry() const { return std::string("D ") + GetParam().entry; }
 };
 
-INSTANTIATE_TEST_SUITE_P(EveryOperation, ManagerProxyRow, ::testing::ValuesIn(kRows),
+INSTANTIATE_TEST_SUITE_P(EveryOperation, ManagerProxyRow, ::testing::ValuesIn(kProxyRows),
                          [](const auto& info) { return info.param.name; });
 
 TEST_P(ManagerProxyRow, SendsItsRequestAndPassesTheStatusOnUnlogged) {

@@ -45,8 +45,9 @@ void noBinder(Parcel& parcel) {
 /// A stub that expects exactly one call, which returns `status`.
 using Expecting = std::function<sp<IBinder>(int status)>;
 
-template <typename Mock, typename Expect>
-Expecting stub(Expect expect) {
+// A plain pointer: one instance of this for each kind of stub, not one for each row.
+template <typename Mock>
+Expecting stub(void (*expect)(Mock& mock, int status)) {
     return [expect](int status) -> sp<IBinder> {
         sp<Mock> mock = new StrictMock<Mock>;
         expect(*mock, status);
@@ -54,19 +55,16 @@ Expecting stub(Expect expect) {
     };
 }
 
-template <typename Expect>
-Expecting touch(Expect expect) {
-    return stub<MockTouchManagerService>(expect);
+Expecting touchStub(void (*expect)(MockTouchManagerService& service, int status)) {
+    return stub(expect);
 }
 
-template <typename Expect>
-Expecting gesture(Expect expect) {
-    return stub<MockGestureManagerService>(expect);
+Expecting gestureStub(void (*expect)(MockGestureManagerService& service, int status)) {
+    return stub(expect);
 }
 
-template <typename Expect>
-Expecting hand(Expect expect) {
-    return stub<MockHandBiometricManagerService>(expect);
+Expecting handStub(void (*expect)(MockHandBiometricManagerService& service, int status)) {
+    return stub(expect);
 }
 
 MATCHER_P4(IsRegion, left, top, right, bottom, "") {
@@ -79,7 +77,7 @@ auto answers(Value value, int status) {
     return DoAll(SetArgReferee<kArgument>(value), Return(status));
 }
 
-struct Row {
+struct StubRow {
     const char* name;
     const char* interface;
     uint32_t code;
@@ -89,20 +87,16 @@ struct Row {
     Lines log;
 };
 
-void PrintTo(const Row& row, std::ostream* out) {
+void PrintTo(const StubRow& row, std::ostream* out) {
     *out << row.name;
 }
 
-const char kTouch[] = "TouchManagerService";
-const char kGesture[] = "GestureManagerService";
-const char kHand[] = "HandBiometricManagerService";
-
-const Row kRows[] = {
+const StubRow kStubRows[] = {
         {"touchSubscribe",
          kTouch,
          1,
          noBinder,
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, subscribe(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -111,7 +105,7 @@ const Row kRows[] = {
          kTouch,
          2,
          noBinder,
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, unsubscribe(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -120,7 +114,7 @@ const Row kRows[] = {
          kTouch,
          3,
          numbers({-7}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, isSupported(-7, _)).WillOnce(answers<1>(true, status));
          }),
          numbers({1}),
@@ -129,7 +123,7 @@ const Row kRows[] = {
          kTouch,
          3,
          numbers({7}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, isSupported(7, _)).WillOnce(answers<1>(false, status));
          }),
          numbers({0}),
@@ -138,7 +132,7 @@ const Row kRows[] = {
          kTouch,
          4,
          numbers({8}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, isEnabled(8, _)).WillOnce(answers<1>(true, status));
          }),
          numbers({1}),
@@ -147,7 +141,7 @@ const Row kRows[] = {
          kTouch,
          4,
          numbers({8}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, isEnabled(8, _)).WillOnce(answers<1>(false, status));
          }),
          numbers({0}),
@@ -156,14 +150,15 @@ const Row kRows[] = {
          kTouch,
          5,
          numbers({9}),
-         touch([](auto& s, int status) { EXPECT_CALL(s, enable(9)).WillOnce(Return(status)); }),
+         touchStub([](auto& s, int status) { EXPECT_CALL(s, enable(9)).WillOnce(Return(status)); }),
          nothing,
          {"D ENABLE transact received..."}},
         {"touchDisable",
          kTouch,
          6,
          numbers({10}),
-         touch([](auto& s, int status) { EXPECT_CALL(s, disable(10)).WillOnce(Return(status)); }),
+         touchStub(
+                 [](auto& s, int status) { EXPECT_CALL(s, disable(10)).WillOnce(Return(status)); }),
          nothing,
          {"D DISABLE transact received..."}},
         // Top, left, bottom, right.
@@ -171,7 +166,7 @@ const Row kRows[] = {
          kTouch,
          7,
          numbers({2, 1, 4, 3, 1}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, configure_vm_region(IsRegion(1, 2, 3, 4), true))
                      .WillOnce(Return(status));
          }),
@@ -181,7 +176,7 @@ const Row kRows[] = {
          kTouch,
          7,
          numbers({-2, -1, -4, -3, 0}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, configure_vm_region(IsRegion(-1, -2, -3, -4), false))
                      .WillOnce(Return(status));
          }),
@@ -191,7 +186,7 @@ const Row kRows[] = {
          kTouch,
          7,
          numbers({2, 1, 4, 3, 7}),
-         touch([](auto& s, int status) {
+         touchStub([](auto& s, int status) {
              EXPECT_CALL(s, configure_vm_region(_, true)).WillOnce(Return(status));
          }),
          nothing,
@@ -210,7 +205,7 @@ const Row kRows[] = {
          kGesture,
          1,
          noBinder,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, subscribe(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -219,7 +214,7 @@ const Row kRows[] = {
          kGesture,
          2,
          noBinder,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, unsubscribe(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -228,7 +223,7 @@ const Row kRows[] = {
          kGesture,
          3,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, enableWakeup()).WillOnce(Return(status));
          }),
          nothing,
@@ -237,7 +232,7 @@ const Row kRows[] = {
          kGesture,
          4,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, disableWakeup()).WillOnce(Return(status));
          }),
          nothing,
@@ -246,7 +241,7 @@ const Row kRows[] = {
          kGesture,
          5,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, startGestureDetection()).WillOnce(Return(status));
          }),
          nothing,
@@ -255,7 +250,7 @@ const Row kRows[] = {
          kGesture,
          6,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, stopGestureDetection()).WillOnce(Return(status));
          }),
          nothing,
@@ -267,7 +262,7 @@ const Row kRows[] = {
              p.writeInt32(3);
              writeRecords<Gesture>(p, 3);
          },
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, addGesture(3, HoldsRecords(3u), _)).WillOnce(answers<2>(-4, status));
          }),
          numbers({-4}),
@@ -276,7 +271,7 @@ const Row kRows[] = {
          kGesture,
          7,
          numbers({0}),
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, addGesture(0, _, _)).WillOnce(answers<2>(4, status));
          }),
          numbers({4}),
@@ -288,7 +283,7 @@ const Row kRows[] = {
              p.writeInt32(-1);
              writeRecords<Gesture>(p, 1);
          },
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, addGesture(-1, IsNull(), _)).WillOnce(answers<2>(4, status));
          }),
          numbers({4}),
@@ -297,7 +292,7 @@ const Row kRows[] = {
          kGesture,
          7,
          numbers({INT32_MIN}),
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, addGesture(INT32_MIN, IsNull(), _)).WillOnce(answers<2>(4, status));
          }),
          numbers({4}),
@@ -309,7 +304,7 @@ const Row kRows[] = {
              p.writeInt32(4);
              writeRecords<Gesture>(p, 3);
          },
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, addGesture(4, IsNull(), _)).WillOnce(answers<2>(4, status));
          }),
          numbers({4}),
@@ -321,7 +316,7 @@ const Row kRows[] = {
              p.writeInt32(INT32_MAX);
              writeRecords<Gesture>(p, 1);
          },
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, addGesture(INT32_MAX, IsNull(), _)).WillOnce(answers<2>(4, status));
          }),
          numbers({4}),
@@ -330,7 +325,7 @@ const Row kRows[] = {
          kGesture,
          8,
          numbers({-3}),
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, deleteGesture(-3)).WillOnce(Return(status));
          }),
          nothing,
@@ -339,7 +334,7 @@ const Row kRows[] = {
          kGesture,
          9,
          numbers({4}),
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, enableGesture(4)).WillOnce(Return(status));
          }),
          nothing,
@@ -348,7 +343,7 @@ const Row kRows[] = {
          kGesture,
          10,
          numbers({5}),
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, disableGesture(5)).WillOnce(Return(status));
          }),
          nothing,
@@ -357,7 +352,7 @@ const Row kRows[] = {
          kGesture,
          11,
          [](Parcel& p) { writeRecords<Gesture>(p, 1); },
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, improveGestureTraining(HoldsRecords(1u), _))
                      .WillOnce(answers<1>(2, status));
          }),
@@ -367,7 +362,7 @@ const Row kRows[] = {
          kGesture,
          11,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, improveGestureTraining(IsNull(), _)).WillOnce(answers<1>(2, status));
          }),
          numbers({2}),
@@ -376,7 +371,7 @@ const Row kRows[] = {
          kGesture,
          12,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, getMaxPreDefinedGesture(_)).WillOnce(answers<0>(0xffffffffu, status));
          }),
          numbers({-1}),
@@ -386,7 +381,7 @@ const Row kRows[] = {
          kGesture,
          13,
          nothing,
-         gesture([](auto& s, int status) {
+         gestureStub([](auto& s, int status) {
              EXPECT_CALL(s, getMaxUserDefinedGesture(_)).WillOnce(answers<0>(8u, status));
          }),
          numbers({8}),
@@ -406,7 +401,7 @@ const Row kRows[] = {
          kHand,
          1,
          noBinder,
-         hand([](auto& s, int status) {
+         handStub([](auto& s, int status) {
              EXPECT_CALL(s, subscribe(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -415,7 +410,7 @@ const Row kRows[] = {
          kHand,
          2,
          noBinder,
-         hand([](auto& s, int status) {
+         handStub([](auto& s, int status) {
              EXPECT_CALL(s, unsubscribe(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -424,80 +419,86 @@ const Row kRows[] = {
          kHand,
          3,
          nothing,
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, startEnrollment()).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, startEnrollment()).WillOnce(Return(status));
+         }),
          nothing,
          {"D START_ENROLLMENT transact received..."}},
         {"handStopEnrollment",
          kHand,
          4,
          nothing,
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, stopEnrollment()).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, stopEnrollment()).WillOnce(Return(status));
+         }),
          nothing,
          {"D STOP_ENROLLMENT transact received..."}},
         {"handScan",
          kHand,
          5,
          nothing,
-         hand([](auto& s, int status) { EXPECT_CALL(s, scan()).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) { EXPECT_CALL(s, scan()).WillOnce(Return(status)); }),
          nothing,
          {"D SCAN transact received..."}},
         {"handStartMatching",
          kHand,
          6,
          nothing,
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, startMatching()).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, startMatching()).WillOnce(Return(status));
+         }),
          nothing,
          {"D START_MATCHING transact received..."}},
         {"handStopMatching",
          kHand,
          7,
          nothing,
-         hand([](auto& s, int status) { EXPECT_CALL(s, stopMatching()).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, stopMatching()).WillOnce(Return(status));
+         }),
          nothing,
          {"D STOP_MATCHING transact received..."}},
         {"handCancelScan",
          kHand,
          8,
          nothing,
-         hand([](auto& s, int status) { EXPECT_CALL(s, cancelScan()).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, cancelScan()).WillOnce(Return(status));
+         }),
          nothing,
          {"D CANCEL_SCAN transact received..."}},
         {"handSetSecurity",
          kHand,
          9,
          numbers({-2}),
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, setSecurity(-2)).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, setSecurity(-2)).WillOnce(Return(status));
+         }),
          nothing,
          {"D SET_SECURITY transact received..."}},
         {"handSetProfileName",
          kHand,
          10,
          names({"alice"}),
-         hand(
-                 [](auto& s, int status) {
-                     EXPECT_CALL(s, setProfileName(StrEq("alice"))).WillOnce(Return(status));
-                 }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, setProfileName(StrEq("alice"))).WillOnce(Return(status));
+         }),
          nothing,
          {"D SET_PROFILENAME transact received..."}},
         {"handSetNoProfileName",
          kHand,
          10,
          nothing,
-         hand(
-                 [](auto& s, int status) {
-                     EXPECT_CALL(s, setProfileName(IsNull())).WillOnce(Return(status));
-                 }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, setProfileName(IsNull())).WillOnce(Return(status));
+         }),
          nothing,
          {"D SET_PROFILENAME transact received..."}},
         {"handSetProfileNameThatDoesNotEnd",
          kHand,
          10,
          numbers({0x41414141}),
-         hand([](auto& s, int status) {
+         handStub([](auto& s, int status) {
              EXPECT_CALL(s, setProfileName(IsNull())).WillOnce(Return(status));
          }),
          nothing,
@@ -506,53 +507,53 @@ const Row kRows[] = {
          kHand,
          11,
          names({""}),
-         hand(
-                 [](auto& s, int status) {
-                     EXPECT_CALL(s, deleteProfile(StrEq(""))).WillOnce(Return(status));
-                 }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, deleteProfile(StrEq(""))).WillOnce(Return(status));
+         }),
          nothing,
          {"D DELETE_PROFILE transact received..."}},
         {"handDeleteNoProfile",
          kHand,
          11,
          nothing,
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, deleteProfile(IsNull())).WillOnce(Return(status)); }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, deleteProfile(IsNull())).WillOnce(Return(status));
+         }),
          nothing,
          {"D DELETE_PROFILE transact received..."}},
         {"handRenameProfile",
          kHand,
          12,
          names({"A", "B"}),
-         hand(
-                 [](auto& s, int status) {
-                     EXPECT_CALL(s, renameProfile(StrEq("A"), StrEq("B"))).WillOnce(Return(status));
-                 }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, renameProfile(StrEq("A"), StrEq("B"))).WillOnce(Return(status));
+         }),
          nothing,
          {"D RENAME_PROFILE transact received..."}},
         {"handRenameProfileToNothing",
          kHand,
          12,
          names({"A"}),
-         hand(
-                 [](auto& s, int status) {
-                     EXPECT_CALL(s, renameProfile(StrEq("A"), IsNull())).WillOnce(Return(status));
-                 }),
+         handStub([](auto& s, int status) {
+             EXPECT_CALL(s, renameProfile(StrEq("A"), IsNull())).WillOnce(Return(status));
+         }),
          nothing,
          {"D RENAME_PROFILE transact received..."}},
         {"handGetMaxUser",
          kHand,
          13,
          nothing,
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, getMaxUser(_)).WillOnce(answers<0>(5u, status)); }),
+         handStub(
+                 [](auto& s, int status) {
+                     EXPECT_CALL(s, getMaxUser(_)).WillOnce(answers<0>(5u, status));
+                 }),
          numbers({5}),
          {"D GET_MAXUSER transact received...", "D GET_MAXUSER transact finished..."}},
         {"handGetProfileListOfNone",
          kHand,
          14,
          nothing,
-         hand(
+         handStub(
                  [](auto& s, int status) {
                      EXPECT_CALL(s, getProfileList(IsEmpty())).WillOnce(Return(status));
                  }),
@@ -562,7 +563,7 @@ const Row kRows[] = {
          kHand,
          14,
          nothing,
-         hand(
+         handStub(
                  [](auto& s, int status) {
                      const std::vector<std::string> list = {"alice", "bob"};
                      EXPECT_CALL(s, getProfileList(IsEmpty())).WillOnce(answers<0>(list, status));
@@ -578,15 +579,16 @@ const Row kRows[] = {
          kHand,
          15,
          nothing,
-         hand([](auto& s, int status) { EXPECT_CALL(s, enableWakeup()).WillOnce(Return(status)); }),
+         handStub([](auto& s,
+                     int status) { EXPECT_CALL(s, enableWakeup()).WillOnce(Return(status)); }),
          nothing,
          {"D ENABLE_WAKEUP transact received..."}},
         {"handDisableWakeup",
          kHand,
          16,
          nothing,
-         hand([](auto& s,
-                 int status) { EXPECT_CALL(s, disableWakeup()).WillOnce(Return(status)); }),
+         handStub([](auto& s,
+                     int status) { EXPECT_CALL(s, disableWakeup()).WillOnce(Return(status)); }),
          nothing,
          {"D DISABLE_WAKEUP transact received..."}},
         {"handCallback",
@@ -600,7 +602,7 @@ const Row kRows[] = {
          {"D INJECT_HANDBIOMETRIC transact received..."}},
 };
 
-class ManagerStubRow : public ::testing::TestWithParam<Row> {
+class ManagerStubRow : public ::testing::TestWithParam<StubRow> {
   protected:
     void fill(Parcel& data) const {
         writeToken(data, std::string("pemaro.") + GetParam().interface);
@@ -608,7 +610,7 @@ class ManagerStubRow : public ::testing::TestWithParam<Row> {
     }
 };
 
-INSTANTIATE_TEST_SUITE_P(EveryTransaction, ManagerStubRow, ::testing::ValuesIn(kRows),
+INSTANTIATE_TEST_SUITE_P(EveryTransaction, ManagerStubRow, ::testing::ValuesIn(kStubRows),
                          [](const auto& info) { return info.param.name; });
 
 TEST_P(ManagerStubRow, CallsTheOperationAndRepliesWithValuesThenStatus) {
@@ -638,16 +640,15 @@ TEST_P(ManagerStubRow, AnswersACallerThatWantsNoReply) {
 // ---- the token and the range of codes ----
 
 template <typename M, uint32_t kLast>
-struct Case {
+struct StubCase {
     using Mock = M;
     static constexpr uint32_t kLastCode = kLast;
 };
 
-using Stubs =
-        ::testing::Types<Case<MockTouchManagerService, 7>, Case<MockTouchManagerClient, 1>,
-                         Case<MockGestureManagerService, 13>, Case<MockGestureManagerClient, 1>,
-                         Case<MockHandBiometricManagerService, 16>,
-                         Case<MockHandBiometricManagerClient, 1>>;
+using StubCases = ::testing::Types<
+        StubCase<MockTouchManagerService, 7>, StubCase<MockTouchManagerClient, 1>,
+        StubCase<MockGestureManagerService, 13>, StubCase<MockGestureManagerClient, 1>,
+        StubCase<MockHandBiometricManagerService, 16>, StubCase<MockHandBiometricManagerClient, 1>>;
 
 template <typename T>
 class ManagerStub : public ::testing::Test {
@@ -656,7 +657,7 @@ class ManagerStub : public ::testing::Test {
     const sp<typename T::Mock> mStub = new StrictMock<typename T::Mock>;
     Parcel mReply;
 };
-TYPED_TEST_SUITE(ManagerStub, Stubs);
+TYPED_TEST_SUITE(ManagerStub, StubCases);
 
 TYPED_TEST(ManagerStub, RefusesEveryRequestWithoutTheToken) {
     std::vector<uint32_t> codes = {0, TypeParam::kLastCode + 1, IBinder::LAST_CALL_TRANSACTION,

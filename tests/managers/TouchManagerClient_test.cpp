@@ -27,7 +27,7 @@ using ::testing::IsEmpty;
 using ::testing::NiceMock;
 using ::testing::SizeIs;
 
-using Gesture = ITouchManagerClient::GestureData;
+using TouchGesture = ITouchManagerClient::GestureData;
 
 constexpr char kService[] = "pemaro.TouchManagerService";
 constexpr char kTag[] = "TouchManagerClient";
@@ -36,7 +36,7 @@ constexpr uint32_t kUnsubscribe = 2;
 
 struct Event {
     char callback;
-    Gesture* record;
+    TouchGesture* record;
     void* context;
 };
 
@@ -44,14 +44,14 @@ bool operator==(const Event& a, const Event& b) {
     return a.callback == b.callback && a.record == b.record && a.context == b.context;
 }
 
-std::vector<Event> gEvents;
+std::vector<Event> gTouchEvents;
 
-void callbackA(Gesture* record, void* context) {
-    gEvents.push_back({'A', record, context});
+void callbackA(TouchGesture* record, void* context) {
+    gTouchEvents.push_back({'A', record, context});
 }
 
-void callbackB(Gesture* record, void* context) {
-    gEvents.push_back({'B', record, context});
+void callbackB(TouchGesture* record, void* context) {
+    gTouchEvents.push_back({'B', record, context});
 }
 
 std::string eventLine(const TouchManagerClient* client) {
@@ -63,7 +63,7 @@ class TouchManagerClientTest : public ::testing::Test {
     void SetUp() override {
         // The callback and the context outlive the clients of other tests.
         const sp<TouchManagerClient> forget = new TouchManagerClient(nullptr, nullptr);
-        gEvents.clear();
+        gTouchEvents.clear();
         mRemote->answer(numbers({0}));
         clearLog();
     }
@@ -259,10 +259,10 @@ TEST_F(TouchManagerClientTest, DoesNotUnsubscribeWhenDestroyed) {
 
 TEST_F(TouchManagerClientTest, HandsGesturesToTheCallback) {
     const sp<TouchManagerClient> client = connect(callbackA, &mContext);
-    Gesture record;
+    TouchGesture record;
     EXPECT_EQ(0, client->gestureCallback(&record));
     EXPECT_EQ(0, client->gestureCallback(nullptr));
-    EXPECT_THAT(gEvents,
+    EXPECT_THAT(gTouchEvents,
                 ElementsAre(Event{'A', &record, &mContext}, Event{'A', nullptr, &mContext}));
     EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()), eventLine(client.get())));
     EXPECT_THAT(mRemote->transactions(), IsEmpty());
@@ -273,12 +273,12 @@ TEST_F(TouchManagerClientTest, HandsOnTheRecordThatLiesInTheRequest) {
     Parcel data;
     Parcel reply;
     writeToken(data, "pemaro.TouchManagerClient");
-    writeRecords<Gesture>(data, 1);
+    writeRecords<TouchGesture>(data, 1);
     EXPECT_EQ(android::NO_ERROR, client->transact(1, data, &reply));
-    ASSERT_THAT(gEvents, SizeIs(1));
-    EXPECT_EQ(data.data() + data.dataSize() - sizeof(Gesture),
-              reinterpret_cast<const uint8_t*>(gEvents[0].record));
-    EXPECT_THAT(gEvents[0].record, HoldsRecords(1u));
+    ASSERT_THAT(gTouchEvents, SizeIs(1));
+    EXPECT_EQ(data.data() + data.dataSize() - sizeof(TouchGesture),
+              reinterpret_cast<const uint8_t*>(gTouchEvents[0].record));
+    EXPECT_THAT(gTouchEvents[0].record, HoldsRecords(1u));
     EXPECT_EQ(parcelBytes(numbers({0})), bytesOf(reply));
 }
 
@@ -287,11 +287,11 @@ TEST_F(TouchManagerClientTest, SharesTheCallbackOfTheLastClient) {
     const sp<TouchManagerClient> first = new TouchManagerClient(callbackA, &mContext);
     const sp<TouchManagerClient> second = new TouchManagerClient(callbackB, &contextB);
     const sp<TouchManagerClient> third = new TouchManagerClient;
-    Gesture record;
+    TouchGesture record;
     for (const sp<TouchManagerClient>& client : {first, second, third}) {
-        gEvents.clear();
+        gTouchEvents.clear();
         EXPECT_EQ(0, client->gestureCallback(&record));
-        EXPECT_THAT(gEvents, ElementsAre(Event{'B', &record, &contextB}));
+        EXPECT_THAT(gTouchEvents, ElementsAre(Event{'B', &record, &contextB}));
     }
 }
 
@@ -311,7 +311,7 @@ TEST_F(TouchManagerClientTest, UnsubscribesAtEveryGestureWithoutAContext) {
                                                "E JNI context is null...unsubscribing client"));
         EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
     }
-    EXPECT_THAT(gEvents, IsEmpty());
+    EXPECT_THAT(gTouchEvents, IsEmpty());
     // The client does not count itself as unsubscribed.
     client->deinit();
     EXPECT_THAT(codes(), ElementsAre(kUnsubscribe, kUnsubscribe, kUnsubscribe));

@@ -15,6 +15,9 @@ using Bytes = std::vector<uint8_t>;
 /// Writes a parcel by hand, field after field.
 using ParcelWriter = std::function<void(android::Parcel&)>;
 
+/// The writer of a request without arguments, or of a reply without values.
+inline void nothing(android::Parcel&) {}
+
 /// All bytes of a parcel, wherever it is read.
 Bytes bytesOf(const android::Parcel& parcel);
 

@@ -7,15 +7,12 @@
 
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
+#include "tests/support/MapText.h"
 
 namespace pemaro {
 namespace {
 
-SerializableMap read(const std::string& text) {
-    SerializableMap map;
-    EXPECT_EQ(map.unserialize(text), 0) << text;
-    return map;
-}
+using test::mapOf;
 
 int intUnder(SerializableMap& map, const std::string& key) {
     int value = -1;
@@ -59,7 +56,7 @@ TEST(SerializableMap, AnAbsentKeyHasTheNullItem) {
 }
 
 TEST(SerializableMap, CopiesKeysAndValuesOutByPosition) {
-    SerializableMap map = read("{\"a\":1,\"b\":2}");
+    SerializableMap map = mapOf("{\"a\":1,\"b\":2}");
     std::string key = "untouched";
     SerializableValue value(std::string("untouched"));
     EXPECT_EQ(map.keyAt(2, key), STATUS_BAD_PARAMETER);
@@ -74,7 +71,7 @@ TEST(SerializableMap, CopiesKeysAndValuesOutByPosition) {
 }
 
 TEST(SerializableMap, ContainsExactKeysOnly) {
-    SerializableMap map = read("{\"a.b\":{\"c\":1}}");
+    SerializableMap map = mapOf("{\"a.b\":{\"c\":1}}");
     EXPECT_TRUE(map.contains("a.b"));
     EXPECT_TRUE(map.contains(std::string("a.b")));
     EXPECT_FALSE(map.contains("a"));
@@ -89,7 +86,7 @@ TEST(SerializableMapDeathTest, EditingAnAbsentKeyIsFatal) {
 }
 
 TEST(SerializableMap, ClearRemovesEverything) {
-    SerializableMap map = read("{\"a\":1,\"b\":{\"c\":[1]}}");
+    SerializableMap map = mapOf("{\"a\":1,\"b\":{\"c\":[1]}}");
     EXPECT_EQ(map.clear(), 0);
     EXPECT_EQ(map.size(), 0u);
     map.add("a", 1);
@@ -115,8 +112,8 @@ const Merge kMerges[] = {
 TEST(SerializableMap, MergesTheOthersEntriesIn) {
     for (const Merge& merge : kMerges) {
         SCOPED_TRACE(merge.merged);
-        SerializableMap left = read(merge.left);
-        const SerializableMap right = read(merge.right);
+        SerializableMap left = mapOf(merge.left);
+        const SerializableMap right = mapOf(merge.right);
         EXPECT_EQ((left + right).serialize(), merge.merged);
         EXPECT_EQ(left.serialize(), merge.left);
         EXPECT_EQ(&(left += right), &left);
@@ -126,7 +123,7 @@ TEST(SerializableMap, MergesTheOthersEntriesIn) {
 }
 
 TEST(SerializableMap, MergesWithEmptyMapsAndWithItself) {
-    SerializableMap map = read("{\"a\":1,\"b\":{\"c\":2}}");
+    SerializableMap map = mapOf("{\"a\":1,\"b\":{\"c\":2}}");
     map += SerializableMap();
     map += map;
     EXPECT_EQ(map.serialize(), "{\"a\":1,\"b\":{\"c\":2}}");
@@ -136,13 +133,13 @@ TEST(SerializableMap, MergesWithEmptyMapsAndWithItself) {
 }
 
 TEST(SerializableMap, MergesWithAMapThatItHolds) {
-    SerializableMap map = read("{\"b\":{\"a\":1,\"b\":2}}");
+    SerializableMap map = mapOf("{\"b\":{\"a\":1,\"b\":2}}");
     map += map.editValueFor("b").getValue<SerializableMap>();
     EXPECT_EQ(map.serialize(), "{\"a\":1,\"b\":2}");
 }
 
 TEST(SerializableMap, MergedEntriesAreCopies) {
-    SerializableMap other = read("{\"n\":{\"k\":1}}");
+    SerializableMap other = mapOf("{\"n\":{\"k\":1}}");
     SerializableMap& inner = other.editValueFor("n").getValue<SerializableMap>();
     SerializableMap map;
     map += other;
@@ -153,12 +150,12 @@ TEST(SerializableMap, MergedEntriesAreCopies) {
 }
 
 TEST(SerializableMap, CopiesShareNothing) {
-    SerializableMap original = read("{\"flat\":1,\"nested\":{\"k\":1}}");
+    SerializableMap original = mapOf("{\"flat\":1,\"nested\":{\"k\":1}}");
     SerializableValue& flat = original.editValueFor("flat");
     SerializableMap& nested = original.editValueFor("nested").getValue<SerializableMap>();
     SerializableValue& nestedFlat = nested.editValueFor("k");
     SerializableMap copy(original);
-    SerializableMap assigned = read("{\"old\":1}");
+    SerializableMap assigned = mapOf("{\"old\":1}");
     assigned = original;
     const SerializableMap copyOfNested(nested);
     flat = 2;
@@ -170,14 +167,14 @@ TEST(SerializableMap, CopiesShareNothing) {
 }
 
 TEST(SerializableMap, OutlivesWhatItWasCopiedFrom) {
-    auto original = std::make_unique<SerializableMap>(read("{\"a\":[1,{\"b\":2}],\"c\":3}"));
+    auto original = std::make_unique<SerializableMap>(mapOf("{\"a\":[1,{\"b\":2}],\"c\":3}"));
     SerializableMap copy(*original);
     original.reset();
     EXPECT_EQ(copy.serialize(), "{\"a\":[1,{\"b\":2}],\"c\":3}");
 }
 
 TEST(SerializableMap, MayBeAssignedToItselfOrAMapThatItHolds) {
-    SerializableMap map = read("{\"a\":{\"b\":1}}");
+    SerializableMap map = mapOf("{\"a\":{\"b\":1}}");
     map = *&map;
     EXPECT_EQ(map.serialize(), "{\"a\":{\"b\":1}}");
     map = map.editValueFor("a").getValue<SerializableMap>();
@@ -185,7 +182,7 @@ TEST(SerializableMap, MayBeAssignedToItselfOrAMapThatItHolds) {
 }
 
 TEST(SerializableMap, AddsAValueThatItHolds) {
-    SerializableMap map = read("{\"a\":{\"b\":1}}");
+    SerializableMap map = mapOf("{\"a\":{\"b\":1}}");
     map.add("c", map.valueFor("a"));
     EXPECT_EQ(map.serialize(), "{\"a\":{\"b\":1},\"c\":{\"b\":1}}");
 }
@@ -193,7 +190,7 @@ TEST(SerializableMap, AddsAValueThatItHolds) {
 // What a caller copies of the base class shares its buffer with the map, until one of them is edited.
 TEST(SerializableMap, ToleratesCopiesOfItsBaseClass) {
     using Entries = android::KeyedVector<std::string, SerializableValue>;
-    auto map = std::make_unique<SerializableMap>(read("{\"a\":{\"b\":[1]},\"c\":2}"));
+    auto map = std::make_unique<SerializableMap>(mapOf("{\"a\":{\"b\":[1]},\"c\":2}"));
     Entries entries = *map;
     map->editValueFor("a").getValue<SerializableMap>().add("d", 3);
     EXPECT_EQ(map->serialize(), "{\"a\":{\"b\":[1],\"d\":3},\"c\":2}");
@@ -209,14 +206,14 @@ TEST(SerializableMap, ToleratesCopiesOfItsBaseClass) {
 
 TEST(SerializableMap, CarriesItsNullItemAlong) {
     using DefaultEntries = android::DefaultKeyedVector<std::string, SerializableValue>;
-    SerializableMap map = read("{\"a\":1}");
+    SerializableMap map = mapOf("{\"a\":1}");
     static_cast<DefaultEntries&>(map) = DefaultEntries(SerializableValue(7));
     EXPECT_EQ(intUnder(map, "absent"), 7);
     EXPECT_EQ(map.getType("absent"), VALUE_TYPE_INT32);
 
     SerializableMap copy(map);
     EXPECT_EQ(intUnder(copy, "absent"), 7);
-    const SerializableMap other = read("{\"b\":2}");
+    const SerializableMap other = mapOf("{\"b\":2}");
     SerializableMap sum = map + other;
     EXPECT_EQ(intUnder(sum, "absent"), 7);
     SerializableMap got;

@@ -10,8 +10,11 @@
 
 #include "frames/Checksum.h"
 #include "pemaro/Status.h"
+#include "tests/support/MapText.h"
 
 namespace pemaro::simulator {
+
+using test::mapOf;
 
 namespace {
 
@@ -20,12 +23,6 @@ SerializableMap wanted(std::initializer_list<const char*> keys) {
     for (const char* key : keys) {
         map.add(key, std::string());
     }
-    return map;
-}
-
-SerializableMap parse(const std::string& text) {
-    SerializableMap map;
-    EXPECT_EQ(0, map.unserialize(text));
     return map;
 }
 
@@ -80,17 +77,17 @@ TEST(Configuration, KnowsNoOtherKeys) {
 
 TEST(Configuration, TakesAllChangesOrNone) {
     Configuration configuration;
-    EXPECT_EQ(0, configuration.set(parse("{\"gain\":2.5}")));
+    EXPECT_EQ(0, configuration.set(mapOf("{\"gain\":2.5}")));
     EXPECT_EQ("{\"gain\":2.5}", textOf(configuration, "gain"));
     EXPECT_EQ(STATUS_ERROR_PARSING_CONFIGURATION_SETTING,
-              configuration.set(parse("{\"gain\":3,\"volume\":1}")));
+              configuration.set(mapOf("{\"gain\":3,\"volume\":1}")));
     EXPECT_EQ("{\"gain\":2.5}", textOf(configuration, "gain"));
 }
 
 TEST(Configuration, IsSavedAndLoaded) {
     File file("");
     Configuration configuration;
-    ASSERT_EQ(0, configuration.set(parse("{\"gain\":2.5,\"device.name\":\"glass\"}")));
+    ASSERT_EQ(0, configuration.set(mapOf("{\"gain\":2.5,\"device.name\":\"glass\"}")));
     ASSERT_EQ(0, configuration.save(file.path));
     Configuration other;
     EXPECT_EQ(0, other.load(file.path));
@@ -128,7 +125,7 @@ TEST(Configuration, TellsWhatKeepsItFromBeingSaved) {
 
 TEST(Configuration, GoesThroughItsBinaryForm) {
     Configuration configuration;
-    ASSERT_EQ(0, configuration.set(parse("{\"gain\":2.5}")));
+    ASSERT_EQ(0, configuration.set(mapOf("{\"gain\":2.5}")));
     configuration.calibrate(77);
     const std::string binary = configuration.toBinary();
     EXPECT_GT(binary.size(), 4096u);

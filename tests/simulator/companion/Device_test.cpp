@@ -6,23 +6,16 @@
 #include <string>
 
 #include "pemaro/Status.h"
+#include "tests/support/MapText.h"
 
 namespace pemaro::simulator {
 
-namespace {
-
-SerializableMap parse(const std::string& text) {
-    SerializableMap map;
-    EXPECT_EQ(0, map.unserialize(text));
-    return map;
-}
-
-}  // namespace
+using test::mapOf;
 
 TEST(Device, RestoresASessionWithAllItsSettings) {
     Device device("secret");
     device.setFilter(frames::kFilterImage);
-    ASSERT_EQ(0, device.setAfe(parse("{\"frequency\":300000}")));
+    ASSERT_EQ(0, device.setAfe(mapOf("{\"frequency\":300000}")));
     device.configuration().calibrate(5);
     const std::string afe = device.afe().serialize();
     const std::string configuration = device.configuration().toBinary();
@@ -30,7 +23,7 @@ TEST(Device, RestoresASessionWithAllItsSettings) {
     EXPECT_EQ(1, session);
 
     device.setFilter(0);
-    ASSERT_EQ(0, device.setAfe(parse("{\"frequency\":1}")));
+    ASSERT_EQ(0, device.setAfe(mapOf("{\"frequency\":1}")));
     device.configuration().calibrate(6);
     EXPECT_EQ(2, device.saveSession());
 
@@ -77,9 +70,9 @@ TEST(Device, TakesParametersOfTheFrontEndAllOrNone) {
     const std::string before = device.afe().serialize();
     EXPECT_EQ("{\"drive.voltage\":3.300000,\"frequency\":250000,\"integration.cycles\":16}",
               before);
-    EXPECT_EQ(STATUS_BAD_PARAMETER, device.setAfe(parse("{\"frequency\":1,\"colour\":2}")));
+    EXPECT_EQ(STATUS_BAD_PARAMETER, device.setAfe(mapOf("{\"frequency\":1,\"colour\":2}")));
     EXPECT_EQ(before, device.afe().serialize());
-    EXPECT_EQ(0, device.setAfe(parse("{\"frequency\":1}")));
+    EXPECT_EQ(0, device.setAfe(mapOf("{\"frequency\":1}")));
     EXPECT_EQ("{\"drive.voltage\":3.300000,\"frequency\":1,\"integration.cycles\":16}",
               device.afe().serialize());
 }

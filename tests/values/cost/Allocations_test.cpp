@@ -8,6 +8,7 @@
 #include "bench/Payloads.h"
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
+#include "tests/support/MapText.h"
 #include "tests/values/cost/AllocationCounter.h"
 #include "values/ValueAccess.h"
 
@@ -16,6 +17,7 @@ namespace {
 
 using A = ValueAccess;
 using test::Allocations;
+using test::mapOf;
 using test::startCounting;
 using test::stopCounting;
 
@@ -50,12 +52,6 @@ size_t blocksOf(const SerializableMap& map) {
         if (A::array(value) != nullptr) blocks += 1 + blocksOf(*A::array(value));
     }
     return blocks + (A::size(map) == 0 ? 0 : 1);
-}
-
-SerializableMap mapOf(const std::string& text) {
-    SerializableMap map;
-    EXPECT_EQ(map.unserialize(text), 0);
-    return map;
 }
 
 class PayloadAllocations : public testing::TestWithParam<bench::Payload> {};

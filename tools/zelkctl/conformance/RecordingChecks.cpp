@@ -52,7 +52,7 @@ constexpr milliseconds kSettleTime(100);
 constexpr milliseconds kSignalPatience(300);
 constexpr int kWaits = 4;
 
-void none(Parcel&) {}
+void noArguments(Parcel&) {}
 
 /// The client's side of a shared block.
 struct Block {
@@ -243,7 +243,7 @@ void checkFrames(const Subject& subject, const Block& block) {
             subject.tell(kSignals, signalled ? "" : "frames came, and no signal");
         }
     }
-    if (step(subject, "stops a recording", kStopRecord, none)) {
+    if (step(subject, "stops a recording", kStopRecord, noArguments)) {
         const uint32_t written = reader.written();
         std::this_thread::sleep_for(kSettleTime);
         const uint32_t more = reader.written() - written;
@@ -253,7 +253,7 @@ void checkFrames(const Subject& subject, const Block& block) {
 
 void checkBlock(const Subject& subject, int32_t packetSize) {
     Parcel reply;
-    const android::status_t result = subject.call(kGetCblk, none, &reply);
+    const android::status_t result = subject.call(kGetCblk, noArguments, &reply);
     Block block;
     std::string problem =
             result == android::OK ? "" : fmt::format("the transaction ended with {}", result);
@@ -261,7 +261,7 @@ void checkBlock(const Subject& subject, int32_t packetSize) {
         problem = readBlock(subject, reply.readStrongBinder(), packetSize, &block);
     }
     subject.tell("shares a control block with a ring that fits", problem);
-    if (problem.empty() && step(subject, "starts a recording", kStartRecord, none)) {
+    if (problem.empty() && step(subject, "starts a recording", kStartRecord, noArguments)) {
         checkFrames(subject, block);
     }
 }
@@ -278,17 +278,17 @@ void checkRecording(const Subject& subject) {
     const sp<android::IBinder> client = new android::BBinder();
     const bool ready = step(subject, "registers a client", kRegisterClient,
                             [&client](Parcel& request) { request.writeStrongBinder(client); }) &&
-                       step(subject, "opens", kOpen, none) &&
+                       step(subject, "opens", kOpen, noArguments) &&
                        step(subject, "records to shared memory", kSetRecordParameter,
                             [](Parcel& request) { request.writeInt32(kOutputMemory); }) &&
-                       step(subject, "prepares a recording", kPrepareRecord, none);
+                       step(subject, "prepares a recording", kPrepareRecord, noArguments);
     if (ready) {
         Parcel reply;
-        subject.call(kGetPacketSize, none, &reply);
+        subject.call(kGetPacketSize, noArguments, &reply);
         checkBlock(subject, reply.readInt32());
     }
     Parcel reply;
-    const android::status_t result = subject.call(kUnregisterClient, none, &reply);
+    const android::status_t result = subject.call(kUnregisterClient, noArguments, &reply);
     subject.tell("lets a client go",
                  result == android::OK ? "" : fmt::format("the transaction ended with {}", result));
 }

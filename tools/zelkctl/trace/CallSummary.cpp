@@ -9,14 +9,6 @@
 #include "tools/zelkctl/trace/CallText.h"
 
 namespace pemaro::zelkctl {
-namespace {
-
-double seconds(int64_t nanoseconds) {
-    return static_cast<double>(nanoseconds) / 1e9;
-}
-
-}  // namespace
-
 // ---- durations -----------------------------------------------------------------------------------
 
 // Below 64 a slot for each number; above, 64 slots from each power of two to the next.
@@ -93,7 +85,7 @@ std::vector<std::string> CallSummary::table() const {
                                                   "received", "operation")};
     for (const Row* row : sorted()) {
         const auto shown = [row](int64_t nanoseconds) {
-            return row->took.isEmpty() ? "-" : milliseconds(nanoseconds);
+            return row->took.isEmpty() ? "-" : millisecondsText(nanoseconds);
         };
         lines.push_back(fmt::format("{:>8}{:>8}{:>14}{:>14}{:>14}{:>12}{:>12}  {}", row->calls,
                                     row->failed, shown(row->took.percentile(50)),
@@ -116,9 +108,9 @@ std::vector<std::string> CallSummary::jsonLines() const {
                 .add("request", static_cast<int64_t>(row->requestBytes))
                 .add("reply", static_cast<int64_t>(row->replyBytes));
         if (!row->took.isEmpty()) {
-            object.addReal("p50", seconds(row->took.percentile(50)))
-                    .addReal("p99", seconds(row->took.percentile(99)))
-                    .addReal("max", seconds(row->took.longest()));
+            object.addReal("p50", secondsOf(row->took.percentile(50)))
+                    .addReal("p99", secondsOf(row->took.percentile(99)))
+                    .addReal("max", secondsOf(row->took.longest()));
         }
         lines.push_back(object.text());
     }

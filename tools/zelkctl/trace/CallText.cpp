@@ -29,10 +29,6 @@ const EndText& textOf(CallEnd end) {
                          [end](const EndText& row) { return row.end == end; });
 }
 
-double seconds(int64_t nanoseconds) {
-    return static_cast<double>(nanoseconds) / 1e9;
-}
-
 std::string partyText(const Party& party) {
     return party.process == 0 ? fmt::format("{} (thread {})", party.name, party.thread)
                               : fmt::format("{} {}", party.name, party.process);
@@ -60,7 +56,11 @@ const char* callEndWord(CallEnd end) {
     return textOf(end).word;
 }
 
-std::string milliseconds(int64_t nanoseconds) {
+double secondsOf(int64_t nanoseconds) {
+    return static_cast<double>(nanoseconds) / 1e9;
+}
+
+std::string millisecondsText(int64_t nanoseconds) {
     return fmt::format("{:.3f} ms", static_cast<double>(nanoseconds) / 1e6);
 }
 
@@ -70,7 +70,7 @@ std::string callLine(const TracedCall& call, std::chrono::system_clock::time_poi
                                    partyText(callee), callName(call), call.requestBytes);
     line += call.end == CallEnd::kAnswered ? fmt::format(" > {} bytes", call.replyBytes) : " bytes";
     if (call.isTimed()) {
-        line += "  " + milliseconds(call.took());
+        line += "  " + millisecondsText(call.took());
     }
     const std::string sentence = textOf(call.end).sentence;
     return sentence.empty() ? line : line + "  " + sentence;
@@ -92,10 +92,10 @@ std::string callJson(const TracedCall& call, std::chrono::system_clock::time_poi
         object.add("reply", static_cast<int64_t>(call.replyBytes));
     }
     if (call.isTimed()) {
-        object.addReal("seconds", seconds(call.took()));
+        object.addReal("seconds", secondsOf(call.took()));
     }
     if (call.received != 0 && call.replied != 0) {
-        object.addReal("serving", seconds(call.replied - call.received));
+        object.addReal("serving", secondsOf(call.replied - call.received));
     }
     return object.text();
 }

@@ -15,7 +15,9 @@ std::string callName(const TracedCall& call);
 /// The end as one word: answered, refused, one-way, dead, undelivered, open.
 const char* callEndWord(CallEnd end);
 
-std::string milliseconds(int64_t nanoseconds);
+double secondsOf(int64_t nanoseconds);
+
+std::string millisecondsText(int64_t nanoseconds);
 
 /// One line about a call, for people or as a JSON object. `when` is the time of its request.
 ///

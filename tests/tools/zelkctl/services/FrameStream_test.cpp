@@ -16,17 +16,17 @@ namespace pemaro::zelkctl {
 
 namespace {
 
-constexpr uint32_t kPacket = 4096;
+constexpr uint32_t kPacketSize = 4096;
 
 class LatestFrameTest : public ::testing::Test {
   protected:
-    LatestFrameTest() { latest.receiver().setPacketSize(kPacket); }
+    LatestFrameTest() { latest.receiver().setPacketSize(kPacketSize); }
 
     void give(std::vector<uint8_t>& frame) {
         LatestFrame::onFrame(0, frame.data(), frame.size(), &latest);
     }
 
-    frames::FrameGenerator generator{kPacket, 2};
+    frames::FrameGenerator generator{kPacketSize, 2};
     LatestFrame latest;
 };
 

@@ -9,7 +9,7 @@
 namespace pemaro::zelkctl {
 namespace {
 
-using Client = HandBiometricManagerClient;
+using HandClient = HandBiometricManagerClient;
 
 struct ActivityOptions {
     bool stop = false;
@@ -22,9 +22,10 @@ int act(const HandActivity& activity, const ActivityOptions& options) {
     if (options.wait) {
         watch.goal = activity.goal;
     }
-    const auto operateOnce = [&](const char* name, int (Client::*operation)(), const char* state) {
+    const auto operateOnce = [&](const char* name, int (HandClient::*operation)(),
+                                 const char* state) {
         return operate<HandManager>(
-                name, [&](Client& client) { return (client.*operation)(); },
+                name, [&](HandClient& client) { return (client.*operation)(); },
                 fmt::format("{} {}", activity.done, state),
                 JsonObject().add(activity.done, std::string(state)));
     };
@@ -32,7 +33,7 @@ int act(const HandActivity& activity, const ActivityOptions& options) {
         return operateOnce(activity.stopName, activity.stop, "stopped");
     }
     if (watch.isLimited()) {
-        WatchSteps<Client> steps;
+        WatchSteps<HandClient> steps;
         steps.beginName = activity.startName;
         steps.begin = activity.start;
         steps.endName = activity.endName;
@@ -73,12 +74,12 @@ void addHandActivityCommand(CLI::App& hand, Action& action, const HandActivity& 
 
 void addHandProfileCommand(CLI::App& hand, Action& action, const char* name, const char* help,
                            const char* operand, const char* operationName,
-                           int (Client::*operation)(const char*), const char* done) {
+                           int (HandClient::*operation)(const char*), const char* done) {
     auto profile = std::make_shared<std::string>();
     Command(hand, action, name, help).operand(operand, *profile, "The profile's name").runs([=] {
         return operate<HandManager>(
                 operationName,
-                [&](Client& client) { return (client.*operation)(profile->c_str()); },
+                [&](HandClient& client) { return (client.*operation)(profile->c_str()); },
                 fmt::format("profile {} {}", printable(*profile), done),
                 JsonObject().add("profile", *profile).addFlag(done, true), printable(*profile));
     });
