@@ -4,11 +4,13 @@
 
 usage_mutate() {
     cat <<'TEXT'
-usage: ./dev mutate [--count N] [--seed SEED]
+usage: ./dev mutate [--count N] [--seed SEED] [--at FILE:LINE ...]
 
 Breaks N statements of values/, binder/, companion/ and managers/, 100 if not told, one at a time, chosen at
 random, in a copy of the tree, and runs the native tests of the folder. Prints each with the program that noticed
 it, and the seed, with which the same are chosen again. Fails when fewer than 95 % are noticed.
+
+  --at FILE:LINE    only the statements of that line, in each way in which they can be broken
 TEXT
 }
 
@@ -18,6 +20,11 @@ command_mutate() {
         case $1 in
         --count | --seed)
             [[ ${2:-} =~ ^[0-9]{1,9}$ ]] || die_usage "mutate: $1 needs a number"
+            options+=("$1" "$2")
+            shift
+            ;;
+        --at)
+            [[ ${2:-} =~ ^[a-z]+/[A-Za-z]+\.(cpp|h):[0-9]+$ ]] || die_usage "mutate: --at needs FILE:LINE"
             options+=("$1" "$2")
             shift
             ;;

@@ -23,8 +23,6 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::Not;
 
-constexpr uint32_t kFrameSize = 64;
-constexpr uint32_t kBufferFrames = 8;
 constexpr nsecs_t kSecond = 1000000000;
 
 class TouchCompanionRecording : public TouchCompanionClientTest {
@@ -369,6 +367,18 @@ TEST_F(TouchCompanionRecording, StopsAlthoughTheThreadsWaitDoesNotEnd) {
     ASSERT_TRUE(stuck.release());
     EXPECT_TRUE(isLetGo(mRing.memory(), 1));
     EXPECT_EQ(0u, mFrames.count());
+}
+
+// Far less than a wait may be overdue.
+TEST_F(TouchCompanionRecording, LeavesNoThreadBehindWhoseWaitEndsInTime) {
+    StuckWait stuck(mWaits);
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    ASSERT_TRUE(stuck.waitUntilEntered());
+    std::thread stopping([&] { EXPECT_EQ(0, client->stopRecord()); });
+    usleep(50000);
+    EXPECT_TRUE(stuck.release());
+    stopping.join();
+    EXPECT_THAT(clientLines(), Not(Contains(kLeftBehind)));
 }
 
 TEST_F(TouchCompanionRecording, IsDestroyedAlthoughTheThreadsWaitDoesNotEnd) {
