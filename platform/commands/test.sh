@@ -7,10 +7,10 @@
 # or "".
 TEST_STAGES=(
     'native||in one process, without the driver (release build)'
-    'asan||the native tests with AddressSanitizer and UndefinedBehaviorSanitizer'
-    'tsan|thread|the native tests with ThreadSanitizer'
     'driver|vm|over the real Binder driver (release build; see ./dev vm)'
     'dev|vm|of ./dev itself'
+    'asan||the native tests with AddressSanitizer and UndefinedBehaviorSanitizer'
+    'tsan|thread|the native tests with ThreadSanitizer'
     'lint|lint|what ./dev lint looks at'
 )
 
@@ -51,11 +51,21 @@ command_test() {
         needs+=("$(stage_needs "$stage")")
     done
     begin "${needs[@]}" -- "${stages[@]}"
+    start_ahead "${stages[@]}"
     for stage in "${stages[@]}"; do
         [[ $(stage_needs "$stage") != vm ]] || await_background || true
         run_stage "$stage" "$regex"
     done
     report_stages
+}
+
+# Tests wait for each other and for time to pass. What that leaves of the processors goes into the later stages'
+# builds; such a stage then waits for the rest of its own.
+start_ahead() {
+    if [[ " $* " == *" native "* ]] && (($# > 1)) && (build_preset release); then
+        setpriv --pdeathsig TERM setsid "$ROOT/platform/ahead" "$@" </dev/null >"$ROOT/build/ahead.log" 2>&1 &
+        disown
+    fi
 }
 
 stage_needs() {
