@@ -21,6 +21,10 @@ inline constexpr char kTouch[] = "TouchManagerService";
 inline constexpr char kGesture[] = "GestureManagerService";
 inline constexpr char kHand[] = "HandBiometricManagerService";
 
+// The codes that the managers have in common.
+inline constexpr uint32_t kSubscribe = 1;
+inline constexpr uint32_t kUnsubscribe = 2;
+
 // Where an operation leaves what it answers, when only its result counts.
 inline bool gAnswer;
 inline int gResult;

@@ -31,8 +31,6 @@ using TouchGesture = ITouchManagerClient::GestureData;
 
 constexpr char kService[] = "pemaro.TouchManagerService";
 constexpr char kTag[] = "TouchManagerClient";
-constexpr uint32_t kSubscribe = 1;
-constexpr uint32_t kUnsubscribe = 2;
 
 struct Event {
     char callback;

@@ -78,8 +78,6 @@ struct HandCase {
     }
 };
 
-constexpr uint32_t kSubscribe = 1;
-constexpr uint32_t kUnsubscribe = 2;
 constexpr char kContextMissing[] = "E JNI context is null...unsubscribing client";
 
 // What the caller's functions were called with; the context is the one that they are told.
