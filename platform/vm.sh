@@ -11,6 +11,9 @@ VM_PROCESSORS=2
 # How long the guest may take to boot, on a very busy machine.
 VM_BOOT_SECONDS=180
 
+# Programs that the command starts often: see vm_pack_memory.
+VM_MEMORY=()
+
 # What of the caller's environment a guest's command sees.
 VM_ENVIRONMENT='^(PATH|HOME|USER|LOGNAME|SHELL|TERM|LANG|LC_.*|TZ|COLUMNS|LD_LIBRARY_PATH|ZELK_.*|CTEST_.*|GTEST_.*|BENCHMARK_.*|ANDROID_.*|[A-Z]*SAN_OPTIONS|GCOV_.*)$'
 
@@ -180,6 +183,7 @@ vm_start_qemu() {
     mkdir -p -- "$VM_EXCHANGE" "$ROOT/build"
     vm_write_command "$@" >"$VM_EXCHANGE/command"
     vm_write_folders "$PWD"
+    vm_pack_memory
     : >"$VM_EXCHANGE/stdout"
     if ! [[ /dev/fd/1 -ef /dev/fd/2 ]]; then
         : >"$VM_EXCHANGE/stderr"
@@ -203,6 +207,49 @@ vm_start_qemu() {
 vm_write_folders() {
     realpath -- "$ROOT/build" >"$VM_EXCHANGE/build"
     realpath -- "$ROOT" "$ZELK_CACHE" "$@" | sort -u >"$VM_EXCHANGE/folders"
+}
+
+# Of a start's time most goes into asking the host where the libraries are. So the guest is to start the programs
+# of VM_MEMORY from files that are put into its memory along with the initramfs: the programs, and their libraries
+# as the folder in which the tree's programs look first, build/release/lib, and where they belong.
+vm_pack_memory() {
+    local folder
+    local -a libraries
+    ((${#VM_MEMORY[@]} > 0)) || return 0
+    mapfile -t libraries < <(ldd "${VM_MEMORY[@]}" | awk '$2 == "=>" { print $3 }' | sort -u)
+    folder=$(realpath -- "$ROOT/build/release/lib")
+    mkdir -p -- "$VM_SCRATCH/memory$folder"
+    ln -sf -t "$VM_SCRATCH/memory$folder" -- "${libraries[@]}"
+    printf '%s\n' "$folder" >"$VM_EXCHANGE/memory"
+    realpath -- "${libraries[@]}" | sort -u | vm_pack_libraries
+    realpath -- "${VM_MEMORY[@]}" /lib64/ld-linux-x86-64.so.2 /etc/ld.so.cache | sort -u | vm_pack_files
+    cp -- "$VM_INITRAMFS" "$VM_SCRATCH/initramfs"
+    (cd -- "$VM_SCRATCH" && find memory | cpio --quiet --dereference -o -H newc) >>"$VM_SCRATCH/initramfs"
+    VM_INITRAMFS=$VM_SCRATCH/initramfs
+}
+
+# Of a folder that holds nothing but libraries of one kind all are wanted, of the system's those of the list.
+vm_pack_libraries() {
+    local library folder
+    while read -r library; do
+        folder=${library%/*}
+        if [[ $folder == /usr/lib/x86_64-linux-gnu ]]; then
+            vm_pack_files <<<"$library"
+        elif ! [[ -d $VM_SCRATCH/memory$folder ]]; then
+            mkdir -p -- "$VM_SCRATCH/memory$folder"
+            ln -s -t "$VM_SCRATCH/memory$folder" -- "$folder"/*.so*
+            printf '%s\n' "$folder" >>"$VM_EXCHANGE/memory"
+        fi
+    done
+}
+
+vm_pack_files() {
+    local file
+    while read -r file; do
+        mkdir -p -- "$VM_SCRATCH/memory${file%/*}"
+        ln -s -t "$VM_SCRATCH/memory${file%/*}" -- "$file"
+        printf '%s\n' "$file" >>"$VM_EXCHANGE/memory"
+    done
 }
 
 vm_follow() {

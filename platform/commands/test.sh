@@ -17,6 +17,10 @@ TEST_STAGES=(
 # The slowest that the tests over the driver may be, in seconds, on a busy machine.
 DRIVER_TESTS_TIMEOUT=1800
 
+# What these start again and again.
+DRIVER_TESTS_PROGRAMS=("$ROOT"/build/platform/bin/servicemanager
+    "$ROOT"/build/release/bin/{zelkctl,zelk-touchstack,broken-service,faulty-services,garbage-service} /bin/bash)
+
 usage_test() {
     local stage names=("${TEST_STAGES[@]%%|*}")
     printf 'usage: ./dev test%s [-R REGEX]\n\n' "$(printf ' [--%s]' "${names[@]}")"
@@ -117,10 +121,15 @@ stage_dev() {
 }
 
 stage_driver() {
+    local program
+    local -a options=(--timeout "$DRIVER_TESTS_TIMEOUT")
     build_preset release
     ctest_arguments release driver "$1"
     CTEST_ARGUMENTS+=(--parallel "$VM_PROCESSORS")
-    "$ROOT/dev" vm --timeout "$DRIVER_TESTS_TIMEOUT" ctest "${CTEST_ARGUMENTS[@]}"
+    for program in "${DRIVER_TESTS_PROGRAMS[@]}"; do
+        options+=(--in-memory "$program")
+    done
+    "$ROOT/dev" vm "${options[@]}" ctest "${CTEST_ARGUMENTS[@]}"
 }
 
 stage_lint() {

@@ -46,6 +46,8 @@ vm --|no command is given
 vm --timeout|--timeout needs a number
 vm --timeout 0 true|'0' is not a number of seconds
 vm --timeout=1h true|'1h' is not a number of seconds
+vm --in-memory|--in-memory needs a program
+vm --in-memory nothing true|'nothing' is not a program
 vm --verbose true|unknown option '--verbose'
 fuzz nothing|unknown target 'nothing'
 fuzz --seconds|--seconds needs a number

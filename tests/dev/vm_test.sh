@@ -107,6 +107,18 @@ test_qemu_shows_a_current_folder_that_holds_the_tree() {
     [[ -e tree/build/can ]] || fail "build/ is not the host's"
 }
 
+test_qemu_starts_programs_from_memory() {
+    export ZELK_VM=qemu TMPDIR=$SCRATCH
+    local program=$ROOT/build/release/bin/zelkctl
+    # Where each file that it runs from lies, and that it runs.
+    # shellcheck disable=SC2016 # expanded in the guest
+    expect_status 0 vm --in-memory "$program" bash -c '
+        ldd "$1" | grep -o "/[^ ]*" | xargs stat -L -f -c %T "$1" | sort -u
+        "$1" --version' bash "$program"
+    expect_equal "$(printf 'tmpfs\n%s' "$("$program" --version)")" "$OUTPUT"
+    wait_until no_leftovers
+}
+
 test_qemu_hands_ctrl_c_to_the_command() {
     export ZELK_VM=qemu
     start_vm bash -c "$handles_int"
