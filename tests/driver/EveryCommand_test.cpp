@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
-// What holds of each command of zelkctl, those included that come later: the help tells which there are.
+// What holds of each command of zelkctl, those included that come later: the command line tells which there are.
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <CLI/CLI.hpp>
 #include <algorithm>
+#include <map>
 #include <set>
 #include <sstream>
 #include <string>
@@ -12,7 +14,7 @@
 
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
-#include "tests/tools/HelpTree.h"
+#include "tools/zelkctl/commands/CommandTree.h"
 #include "tools/zelkctl/terminal/Json.h"
 
 using testing::StartsWith;
@@ -36,13 +38,35 @@ Words wordsOf(const std::string& line, const std::string& folder) {
     return words;
 }
 
+// The words of each command, and whether others follow them. What its help tells, tools_tests looks at.
+using CommandGroups = std::map<std::string, bool>;
+
+void addGroups(CommandGroups& groups, const CLI::App& app, const std::string& path) {
+    const auto shown = [](const CLI::App* command) { return !command->get_group().empty(); };
+    const std::vector<const CLI::App*> commands = app.get_subcommands(shown);
+    groups[path] = !commands.empty();
+    for (const CLI::App* command : commands) {
+        addGroups(groups, *command,
+                  path.empty() ? command->get_name() : path + " " + command->get_name());
+    }
+}
+
+CommandGroups readCommands() {
+    CLI::App app;
+    zelkctl::Action action;
+    zelkctl::addCommandTree(app, action);
+    CommandGroups groups;
+    addGroups(groups, app, "");
+    return groups;
+}
+
 // The command that a line begins with, of one word or two.
-std::string commandOf(const std::string& line, const HelpTree& tree) {
+std::string commandOf(const std::string& line, const CommandGroups& groups) {
     std::istringstream stream(line);
     std::string path;
     stream >> path;
     std::string second;
-    if (!tree.at(path).commands.empty() && stream >> second) {
+    if (groups.at(path) && stream >> second) {
         path += " " + second;
     }
     return path;
@@ -123,18 +147,18 @@ TEST(EveryCommand, PrintsObjectsOnRequest) {
             "hand cancel",
             "hand delete Bert",
     };
-    HelpTree tree = readHelpTree("zelkctl");
-    if (tree.count("trace") == 0) {  // a build without libtracefs
+    const CommandGroups groups = readCommands();
+    if (groups.count("trace") == 0) {  // a build without libtracefs
         lines.erase(std::find(lines.begin(), lines.end(), kTrace));
     }
     std::set<std::string> left;
-    for (const auto& [path, entry] : tree) {
-        if (entry.commands.empty()) {
+    for (const auto& [path, isGroup] : groups) {
+        if (!isGroup) {
             left.insert(path);
         }
     }
     for (const std::string& line : lines) {
-        left.erase(commandOf(line, tree));
+        left.erase(commandOf(line, groups));
         SCOPED_TRACE(line);
         Words words = wordsOf(line, files.folder());
         words.emplace_back("--json");
