@@ -43,6 +43,9 @@ std::function<void()> operationOn(const std::string& name, const std::string& te
             if (copy.size() != map.size()) abort();
         };
     }
+    if (name == "merge") {
+        return [] { map += map; };
+    }
     if (name == "lookup") {
         return [] {
             if (map.contains("no such key") || map.getType("no such key") != 0) abort();
@@ -57,7 +60,7 @@ std::function<void()> operationOn(const std::string& name, const std::string& te
 
 int main(int argc, char** argv) {
     if (argc != 3) {
-        fprintf(stderr, "usage: values_cost read|floor|write|copy|lookup PAYLOAD\n");
+        fprintf(stderr, "usage: values_cost read|floor|write|copy|merge|lookup PAYLOAD\n");
         return 2;
     }
     const std::string text = pemaro::bench::payload(argv[2]).text;

@@ -3,6 +3,7 @@
 
 #include "pemaro/SerializableMap.h"
 
+#include <algorithm>
 #include <string_view>
 
 #include "pemaro/Status.h"
@@ -23,10 +24,9 @@ struct Place {
     bool found;
 };
 
-/// Looks in [from, map.size()), where `key` has to be if anywhere.
-Place find(const SerializableMap& map, std::string_view key, size_t from = 0) {
+/// Looks in [from, end), where `key` has to be if anywhere.
+Place find(const SerializableMap& map, std::string_view key, size_t from, size_t end) {
     const EntryView entries = viewOf(map);
-    size_t end = ValueAccess::size(map);
     while (from < end) {
         const size_t middle = from + (end - from) / 2;
         const int order = key.compare(entries.key(middle));
@@ -40,7 +40,11 @@ Place find(const SerializableMap& map, std::string_view key, size_t from = 0) {
     return {from, false};
 }
 
-/// find(), fast where the key is close to `from`: looks one, two, four … entries ahead first.
+Place find(const SerializableMap& map, std::string_view key) {
+    return find(map, key, 0, ValueAccess::size(map));
+}
+
+/// Looks in [from, map.size()), fast where the key is close to `from`: one, two, four … entries ahead first.
 Place findAhead(const SerializableMap& map, std::string_view key, size_t from) {
     const EntryView entries = viewOf(map);
     const size_t size = ValueAccess::size(map);
@@ -49,7 +53,7 @@ Place findAhead(const SerializableMap& map, std::string_view key, size_t from) {
         from = end + 1;
         end = from + step;
     }
-    return find(map, key, from);
+    return find(map, key, from, std::min(end + 1, size));
 }
 
 /// An entry that a map lacks: the index it has in the other one, and the one it will stand before.
