@@ -409,8 +409,11 @@ TEST_F(TouchCompanionRecording, WaitsForACallbackThatTakesItsTime) {
         }
     };
     Slow slow;
+    // The first wait is over long before the callback is.
+    mWaits.onWait([this](int number) {
+        if (number == 1) mRing.put();
+    });
     const sp<TouchCompanionClient> client = record(mRing, Slow::callback, &slow);
-    mRing.put();
     const auto giveUp = std::chrono::steady_clock::now() + kPatience;
     while (!slow.entered && std::chrono::steady_clock::now() < giveUp) {
         usleep(1000);
