@@ -146,8 +146,8 @@ class WatchedManagerClient : public ::testing::Test {
     Caller mCaller;
 };
 
-using Clients = ::testing::Types<GestureCase, HandCase>;
-TYPED_TEST_SUITE(WatchedManagerClient, Clients);
+using WatchedCases = ::testing::Types<GestureCase, HandCase>;
+TYPED_TEST_SUITE(WatchedManagerClient, WatchedCases);
 
 // ---- init ----
 
@@ -495,7 +495,7 @@ TYPED_TEST(WatchedManagerClient, NeitherUnsubscribesNorUnlinksWhenDestroyed) {
 
 template <typename T>
 class WatchedManagerClientAlone : public ::testing::Test {};
-TYPED_TEST_SUITE(WatchedManagerClientAlone, Clients);
+TYPED_TEST_SUITE(WatchedManagerClientAlone, WatchedCases);
 
 TYPED_TEST(WatchedManagerClientAlone, NeedsAServiceManager) {
     FakeWaits waits;

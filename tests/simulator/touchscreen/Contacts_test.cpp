@@ -27,9 +27,9 @@ struct Event {
 };
 
 // A device as the kernel would describe it, without one.
-class Device {
+class DescribedDevice {
   public:
-    Device(const std::vector<Range>& axes, const std::vector<unsigned int>& keys = {}) {
+    DescribedDevice(const std::vector<Range>& axes, const std::vector<unsigned int>& keys = {}) {
         for (const Range& axis : axes) {
             const input_absinfo info{0, axis.least, axis.most, 0, 0, 0};
             libevdev_enable_event_code(mDevice.get(), EV_ABS, axis.code, &info);
@@ -39,7 +39,7 @@ class Device {
         }
     }
 
-    Device with(unsigned int property) && {
+    DescribedDevice with(unsigned int property) && {
         libevdev_enable_property(mDevice.get(), property);
         return std::move(*this);
     }
@@ -60,7 +60,7 @@ class Device {
 
 using Finger = std::tuple<int, int, int, int>;  // number, x, y, peak
 
-std::vector<Finger> fingersOf(const Device& device) {
+std::vector<Finger> fingersOf(const DescribedDevice& device) {
     std::vector<Finger> fingers;
     for (const frames::FingerRecord& finger : contactsOf(device.get())) {
         fingers.emplace_back(finger.id, finger.x, finger.y, finger.peak);
@@ -78,7 +78,7 @@ const std::vector<Range> kOneAxis = {{ABS_X, 100, 4000}, {ABS_Y, 100, 4000}};
 
 // Each row goes on from where the one before it ended.
 TEST(Contacts, OfSeveralFollowTheSlots) {
-    Device device(kSeveralAxes);
+    DescribedDevice device(kSeveralAxes);
     ASSERT_EQ("", touchScreenFault(device.get()));
     EXPECT_EQ(5u, contactLimit(device.get()));
     const struct {
@@ -129,7 +129,7 @@ TEST(Contacts, OfSeveralFollowTheSlots) {
 }
 
 TEST(Contacts, OfOneFollowTheTouch) {
-    Device device(kOneAxis, {BTN_TOUCH});
+    DescribedDevice device(kOneAxis, {BTN_TOUCH});
     ASSERT_EQ("", touchScreenFault(device.get()));
     EXPECT_EQ(1u, contactLimit(device.get()));
     const struct {
@@ -152,7 +152,7 @@ TEST(Contacts, AreThoseOfTouchScreensAlone) {
     const std::vector<Range> noRange = {{ABS_X, 0, 0}, {ABS_Y, 0, 100}};
     const std::vector<Range> noSlots = {{ABS_MT_POSITION_X, 0, 100}, {ABS_MT_POSITION_Y, 0, 100}};
     const struct {
-        Device device;
+        DescribedDevice device;
         const char* fault;
     } rows[] = {
             {{{}, {KEY_A, KEY_B}}, "it tells no positions"},
@@ -161,8 +161,8 @@ TEST(Contacts, AreThoseOfTouchScreensAlone) {
             {{noSlots, {BTN_TOUCH}}, "it tells no positions"},
             // A joystick.
             {{kOneAxis, {BTN_TRIGGER}}, "it does not tell when it is touched"},
-            {Device(kSeveralAxes).with(INPUT_PROP_POINTER), "it moves a pointer"},
-            {Device(kSeveralAxes).with(INPUT_PROP_DIRECT), ""},
+            {DescribedDevice(kSeveralAxes).with(INPUT_PROP_POINTER), "it moves a pointer"},
+            {DescribedDevice(kSeveralAxes).with(INPUT_PROP_DIRECT), ""},
     };
     for (const auto& row : rows) {
         EXPECT_EQ(row.fault, touchScreenFault(row.device.get()));

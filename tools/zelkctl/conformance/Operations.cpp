@@ -19,8 +19,6 @@ namespace {
 constexpr int32_t kNoSuchNumber = -77;
 constexpr const char* kNoSuchName = "\x01no profile has this name";
 
-void none(Parcel&) {}
-
 void writeText(Parcel& request, const std::string& text) {
     request.writeString8(android::String8(text.data(), text.size()));
 }
@@ -128,19 +126,19 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
             {CheckedService::kCompanion,
              knownService("companion"),
              {
-                     {14, "getProperties", none, "Sm", Harm::kNone},
-                     {15, "getAFEParams", none, "Sm", Harm::kNone},
-                     {17, "getAFEParams of all channels", none, "Sa", Harm::kNone},
-                     {20, "getPacketSize", none, "p", Harm::kNone},
+                     {14, "getProperties", noArguments, "Sm", Harm::kNone},
+                     {15, "getAFEParams", noArguments, "Sm", Harm::kNone},
+                     {17, "getAFEParams of all channels", noArguments, "Sa", Harm::kNone},
+                     {20, "getPacketSize", noArguments, "p", Harm::kNone},
                      {22, "getConfigParams of no bytes", noLength, "u", Harm::kNone},
                      {22, "getConfigParams of all bytes", wholeConfiguration, "B", Harm::kNone},
-                     {23, "inspect", none, "Si", Harm::kNone},
+                     {23, "inspect", noArguments, "Si", Harm::kNone},
                      {24, "getConfigParams of no key", emptyMap, "Sm", Harm::kNone},
                      {9, "sendEvent", noEvent, "S", Harm::kState},
                      {13, "setRecordParameter of no output", noSuch, "S", Harm::kState},
                      {16, "setAFEParams of nothing", emptyMap, "S", Harm::kState},
                      {25, "sendCommand of none", emptyMap, "Sm", Harm::kState},
-                     {26, "saveSession", none, "Si", Harm::kState},
+                     {26, "saveSession", noArguments, "Si", Harm::kState},
                      {27, "restoreSession of none", noSuch, "S", Harm::kState},
                      // Parts of a recording, which has checks of its own (RecordingChecks.cpp):
                      // 1 registerClient, 2 unregisterClient, 3 open, 4 getCblk, 5 prepareRecord,
@@ -165,8 +163,8 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
             {CheckedService::kGesture,
              knownService("gesture"),
              {
-                     {12, "getMaxPreDefinedGesture", none, "uS", Harm::kNone},
-                     {13, "getMaxUserDefinedGesture", none, "uS", Harm::kNone},
+                     {12, "getMaxPreDefinedGesture", noArguments, "uS", Harm::kNone},
+                     {13, "getMaxUserDefinedGesture", noArguments, "uS", Harm::kNone},
                      {7, "addGesture of a negative count", noSuch, "iS", Harm::kState},
                      {8, "deleteGesture of none", noSuch, "S", Harm::kState},
                      {9, "enableGesture of none", noSuch, "S", Harm::kState},
@@ -179,8 +177,8 @@ const std::vector<CheckedInterface>& checkedInterfaces() {
             {CheckedService::kHand,
              knownService("hand"),
              {
-                     {13, "getMaxUser", none, "uS", Harm::kNone},
-                     {14, "getProfileList", none, "nS", Harm::kNone},
+                     {13, "getMaxUser", noArguments, "uS", Harm::kNone},
+                     {14, "getProfileList", noArguments, "nS", Harm::kNone},
                      {9, "setSecurity of no level", noSuch, "S", Harm::kState},
                      {11, "deleteProfile of none", noName, "S", Harm::kState},
                      // In SubscriptionChecks.cpp: 1 subscribe, 2 unsubscribe.

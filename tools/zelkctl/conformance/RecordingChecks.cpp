@@ -48,11 +48,9 @@ constexpr uint32_t kFrames = 40;
 constexpr milliseconds kFramePatience(3000);
 /// How long nothing is read, to see the ring fill up.
 constexpr milliseconds kFillTime(500);
-constexpr milliseconds kSettleTime(100);
+constexpr milliseconds kStopTime(100);
 constexpr milliseconds kSignalPatience(300);
 constexpr int kWaits = 4;
-
-void noArguments(Parcel&) {}
 
 /// The client's side of a shared block.
 struct Block {
@@ -245,7 +243,7 @@ void checkFrames(const Subject& subject, const Block& block) {
     }
     if (step(subject, "stops a recording", kStopRecord, noArguments)) {
         const uint32_t written = reader.written();
-        std::this_thread::sleep_for(kSettleTime);
+        std::this_thread::sleep_for(kStopTime);
         const uint32_t more = reader.written() - written;
         subject.tell(kStops, more == 0 ? "" : fmt::format("{} frames came after that", more));
     }

@@ -21,8 +21,6 @@ constexpr uint32_t kReadBinaryConfiguration = 22;
 constexpr uint32_t kReadConfiguration = 24;
 constexpr uint32_t kWriteBinaryConfiguration = 21;
 
-void none(Parcel&) {}
-
 /// Whether a request without the token was refused, which leaves its code unseen.
 std::string acceptance(const Subject& subject, uint32_t code, const char* token) {
     Parcel request;
@@ -69,7 +67,7 @@ void checkUnknownCodes(const Subject& subject) {
     std::string problem;
     for (const uint32_t code : {subject.interface().lastCode + 1, kFarCode}) {
         Parcel reply;
-        const status_t result = subject.call(code, none, &reply);
+        const status_t result = subject.call(code, noArguments, &reply);
         if (result != android::UNKNOWN_TRANSACTION && problem.empty()) {
             problem = fmt::format("code {} ended with {} instead of {}", code, result,
                                   static_cast<int>(android::UNKNOWN_TRANSACTION));
@@ -80,7 +78,7 @@ void checkUnknownCodes(const Subject& subject) {
 
 void checkDescriptor(const Subject& subject) {
     Parcel reply;
-    const status_t result = subject.call(IBinder::INTERFACE_TRANSACTION, none, &reply);
+    const status_t result = subject.call(IBinder::INTERFACE_TRANSACTION, noArguments, &reply);
     const std::string told(android::String8(reply.readString16()).c_str());
     subject.tell("tells its descriptor",
                  result == android::OK && told == subject.interface().descriptor
@@ -90,7 +88,8 @@ void checkDescriptor(const Subject& subject) {
 
 std::string callProblem(const Subject& subject, const CheckedCall& call, bool withArguments) {
     Parcel reply;
-    const status_t result = subject.call(call.code, withArguments ? call.arguments : none, &reply);
+    const status_t result =
+            subject.call(call.code, withArguments ? call.arguments : noArguments, &reply);
     return result == android::OK ? replyProblem(reply, call.layout)
                                  : fmt::format("the transaction ended with {}", result);
 }
