@@ -19,7 +19,8 @@ namespace pemaro::test {
 using android::sp;
 
 TEST(BasicTouchCompanionService, OffersNothing) {
-    BasicTouchCompanionService service;
+    const sp<BasicTouchCompanionService> held = new BasicTouchCompanionService;
+    BasicTouchCompanionService& service = *held;
     SerializableMap map;
     SerializableMapArray array;
     unsigned int value = 0;

@@ -52,7 +52,8 @@ sp<Client> proxyOf(const sp<Client>& client) {
 }  // namespace
 
 TEST(BasicTouchManagerService, OffersNothing) {
-    BasicTouchManagerService service;
+    const sp<BasicTouchManagerService> held = new BasicTouchManagerService;
+    BasicTouchManagerService& service = *held;
     bool is = true;
     android::Rect region(0, 0, 1, 1);
     expectUnsupported({
@@ -68,7 +69,8 @@ TEST(BasicTouchManagerService, OffersNothing) {
 }
 
 TEST(BasicGestureManagerService, OffersNothing) {
-    BasicGestureManagerService service;
+    const sp<BasicGestureManagerService> held = new BasicGestureManagerService;
+    BasicGestureManagerService& service = *held;
     IGestureManagerClient::GestureData* const none = nullptr;
     int added = 7;
     int verified = 7;
@@ -97,7 +99,8 @@ TEST(BasicGestureManagerService, OffersNothing) {
 }
 
 TEST(BasicHandBiometricManagerService, OffersNothing) {
-    BasicHandBiometricManagerService service;
+    const sp<BasicHandBiometricManagerService> held = new BasicHandBiometricManagerService;
+    BasicHandBiometricManagerService& service = *held;
     unsigned int most = 7;
     std::vector<std::string> names = {"left over"};
     expectUnsupported({
@@ -121,15 +124,17 @@ TEST(BasicHandBiometricManagerService, OffersNothing) {
 }
 
 TEST(BasicServices, ReportToTheirSubscribers) {
-    Reporting<BasicTouchManagerService> touch;
-    Reporting<BasicGestureManagerService> gestures;
-    Reporting<BasicHandBiometricManagerService> hands;
+    const sp<Reporting<BasicTouchManagerService>> touch = new Reporting<BasicTouchManagerService>;
+    const sp<Reporting<BasicGestureManagerService>> gestures =
+            new Reporting<BasicGestureManagerService>;
+    const sp<Reporting<BasicHandBiometricManagerService>> hands =
+            new Reporting<BasicHandBiometricManagerService>;
     const sp<MockTouchManagerClient> toucher = new MockTouchManagerClient;
     const sp<MockGestureManagerClient> drawer = new MockGestureManagerClient;
     const sp<MockHandBiometricManagerClient> hand = new MockHandBiometricManagerClient;
-    EXPECT_EQ(STATUS_NO_ERROR, touch.subscribe(toucher));
-    EXPECT_EQ(STATUS_NO_ERROR, gestures.subscribe(drawer));
-    EXPECT_EQ(STATUS_NO_ERROR, hands.subscribe(hand));
+    EXPECT_EQ(STATUS_NO_ERROR, touch->subscribe(toucher));
+    EXPECT_EQ(STATUS_NO_ERROR, gestures->subscribe(drawer));
+    EXPECT_EQ(STATUS_NO_ERROR, hands->subscribe(hand));
 
     static ITouchManagerClient::GestureData touched;
     static IGestureManagerClient::GestureData drawn;
@@ -137,16 +142,16 @@ TEST(BasicServices, ReportToTheirSubscribers) {
     EXPECT_CALL(*toucher, gestureCallback(&touched)).WillOnce(Return(0));
     EXPECT_CALL(*drawer, gestureCallback(&drawn)).WillOnce(Return(0));
     EXPECT_CALL(*hand, handBiometricCallback(&shown)).WillOnce(Return(0));
-    touch.report(touched);
-    gestures.report(drawn);
-    hands.report(shown);
+    touch->report(touched);
+    gestures->report(drawn);
+    hands->report(shown);
 
-    EXPECT_EQ(STATUS_NO_ERROR, touch.unsubscribe(toucher));
-    EXPECT_EQ(STATUS_NO_ERROR, gestures.unsubscribe(drawer));
-    EXPECT_EQ(STATUS_NO_ERROR, hands.unsubscribe(hand));
-    touch.report(touched);
-    gestures.report(drawn);
-    hands.report(shown);
+    EXPECT_EQ(STATUS_NO_ERROR, touch->unsubscribe(toucher));
+    EXPECT_EQ(STATUS_NO_ERROR, gestures->unsubscribe(drawer));
+    EXPECT_EQ(STATUS_NO_ERROR, hands->unsubscribe(hand));
+    touch->report(touched);
+    gestures->report(drawn);
+    hands->report(shown);
 }
 
 TEST(Subscribers, KnowAClientByItsBinder) {
