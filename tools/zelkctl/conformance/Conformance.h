@@ -13,9 +13,6 @@
 
 namespace pemaro::zelkctl {
 
-/// What a request without arguments is filled with.
-inline void noArguments(android::Parcel&) {}
-
 /// A service that is being checked: calls to it as a client makes them, and what is found.
 class Subject {
   public:

@@ -13,6 +13,9 @@
 
 namespace pemaro::zelkctl {
 
+/// What a request without arguments is filled with.
+inline void noArguments(android::Parcel&) {}
+
 /// The four services whose interfaces are known.
 enum class CheckedService { kCompanion, kTouch, kGesture, kHand };
 
