@@ -19,24 +19,13 @@
 #include "frames/RecordingFile.h"
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
+#include "tests/support/DescribedDevice.h"
 
 using testing::HasSubstr;
 
 namespace pemaro::test {
 
 namespace {
-
-struct Range {
-    unsigned int code;
-    int least;
-    int most;
-};
-
-struct Event {
-    unsigned int type;
-    unsigned int code;
-    int value;
-};
 
 constexpr Event kReport{EV_SYN, SYN_REPORT, 0};
 
@@ -45,15 +34,7 @@ class InputDevice {
   public:
     InputDevice(const char* name, const std::vector<Range>& axes,
                 const std::vector<unsigned int>& keys) {
-        const std::unique_ptr<libevdev, void (*)(libevdev*)> device(libevdev_new(), libevdev_free);
-        libevdev_set_name(device.get(), name);
-        for (const Range& axis : axes) {
-            const input_absinfo info{0, axis.least, axis.most, 0, 0, 0};
-            libevdev_enable_event_code(device.get(), EV_ABS, axis.code, &info);
-        }
-        for (const unsigned int key : keys) {
-            libevdev_enable_event_code(device.get(), EV_KEY, key, nullptr);
-        }
+        const DescribedDevice device = DescribedDevice(axes, keys).named(name);
         libevdev_uinput* made = nullptr;
         const int failure = libevdev_uinput_create_from_device(device.get(),
                                                                LIBEVDEV_UINPUT_OPEN_MANAGED, &made);
