@@ -209,6 +209,24 @@ TEST_F(TouchManagerClientTest, SubscribesAgainWhenInitialisedAgain) {
 
 // ---- deinit ----
 
+// While the old service is told, a client is connected to a new one: deinit() ends what it began with.
+TEST_F(TouchManagerClientTest, DeinitLeavesAServiceAloneThatCameMeanwhile) {
+    const sp<TouchManagerClient> client = connect(callbackA, &mContext);
+    const sp<RecordingBinder> successor = new RecordingBinder;
+    successor->answer(numbers({0}));
+    mRemote->handle([&](uint32_t, const Parcel&, Parcel* reply) {
+        mServices->add(kService, successor);
+        EXPECT_EQ(0, client->init());
+        return reply->writeInt32(0);
+    });
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_THAT(codes(), ElementsAre(kUnsubscribe));
+    EXPECT_THAT(codesOf(successor), ElementsAre(kSubscribe));
+
+    EXPECT_EQ(0, client->deinit());
+    EXPECT_THAT(codesOf(successor), ElementsAre(kSubscribe, kUnsubscribe));
+}
+
 TEST_F(TouchManagerClientTest, UnsubscribesItself) {
     const sp<TouchManagerClient> client = connect(callbackA, &mContext);
     EXPECT_EQ(0, client->deinit());
