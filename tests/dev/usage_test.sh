@@ -56,6 +56,7 @@ fuzz --quick|unknown option '--quick'
 coverage values|coverage takes no argument
 mutate --count|--count needs a number
 mutate --count all|--count needs a number
+mutate --at values|--at needs FILE:LINE
 mutate values|unknown option 'values'
 soak --minutes|--minutes needs a number
 soak --minutes 0|--minutes needs a number
