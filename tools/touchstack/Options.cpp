@@ -4,7 +4,10 @@
 #include <fmt/core.h>
 
 #include <CLI/CLI.hpp>
+#include <functional>
 #include <set>
+#include <string>
+#include <vector>
 
 #include "tools/common/NearestWord.h"
 #include "tools/common/Number.h"
@@ -27,39 +30,42 @@ std::vector<std::string> serviceWords() {
 
 namespace {
 
+/// What is wrong with a text, or nothing.
+using Check = std::function<std::string(const std::string&)>;
+
 /// Whole numbers of a range, and numbers with a fraction.
-std::function<std::string(const std::string&)> whole(int64_t least, int64_t most) {
+Check whole(int64_t least, int64_t most) {
     return [=](const std::string& text) { return tools::numberProblem(text, {least, most}); };
 }
 
-std::function<std::string(const std::string&)> decimal(double least, double most) {
+Check decimal(double least, double most) {
     return [=](const std::string& text) { return tools::decimalProblem(text, {least, most}); };
+}
+
+/// A number with a default, which the help tells.
+template <typename Number>
+CLI::Option* addNumber(CLI::App& app, const char* name, Number& number, const char* help,
+                       const Check& check) {
+    return app.add_option(name, number, help)
+            ->type_name("NUMBER")
+            ->check(check, "")
+            ->capture_default_str();
 }
 
 void addCompanionOptions(CLI::App& app, CommandLine& line) {
     SimulatorOptions& options = line.options.companion;
-    app.add_option("--rate", options.rate, "Frames a second; 0 is as fast as the client takes them")
-            ->type_name("NUMBER")
-            ->check(decimal(0, SimulatorOptions::kMaxRate), "")
-            ->capture_default_str();
-    app.add_option("--frame-bytes", options.frameBytes, "Packet size in bytes")
-            ->type_name("NUMBER")
-            ->check(whole(SimulatorOptions::kMinFrameBytes, SimulatorOptions::kMaxFrameBytes), "")
-            ->capture_default_str();
-    app.add_option("--ring-frames", options.ringFrames, "Frames that the shared ring holds")
-            ->type_name("NUMBER")
-            ->check(whole(1, SimulatorOptions::kMaxRingFrames), "")
-            ->capture_default_str();
-    app.add_option("--remind", options.remindUs,
-                   "Microseconds after which a frame that was not taken is signalled again; 0 is "
-                   "never")
-            ->type_name("NUMBER")
-            ->check(whole(0, SimulatorOptions::kMaxRemindUs), "")
-            ->capture_default_str();
-    app.add_option("--fingers", options.fingers, "Fingers on the panel")
-            ->type_name("NUMBER")
-            ->check(whole(0, SimulatorOptions::kMaxFingers), "")
-            ->capture_default_str();
+    addNumber(app, "--rate", options.rate, "Frames a second; 0 is as fast as the client takes them",
+              decimal(0, SimulatorOptions::kMaxRate));
+    addNumber(app, "--frame-bytes", options.frameBytes, "Packet size in bytes",
+              whole(SimulatorOptions::kMinFrameBytes, SimulatorOptions::kMaxFrameBytes));
+    addNumber(app, "--ring-frames", options.ringFrames, "Frames that the shared ring holds",
+              whole(1, SimulatorOptions::kMaxRingFrames));
+    addNumber(app, "--remind", options.remindUs,
+              "Microseconds after which a frame that was not taken is signalled again; 0 is "
+              "never",
+              whole(0, SimulatorOptions::kMaxRemindUs));
+    addNumber(app, "--fingers", options.fingers, "Fingers on the panel",
+              whole(0, SimulatorOptions::kMaxFingers));
     app.add_option("--config-file", options.configPath,
                    "Where the configuration is saved and reloaded when no path is told")
             ->type_name("FILE");
@@ -86,12 +92,10 @@ void addSourceOptions(CLI::App& app, CommandLine& line) {
                                          "A recording to play, bit for bit and at its own pace, "
                                          "instead of drawing frames");
     replay->type_name("FILE")->excludes("--rate")->excludes("--fingers");
-    app.add_option("--speed", options.speed,
-                   "How fast to play it: 2 is twice as fast, 0 as fast as the client takes it")
-            ->needs(replay)
-            ->type_name("NUMBER")
-            ->check(decimal(0, SimulatorOptions::kMaxSpeed), "")
-            ->capture_default_str();
+    addNumber(app, "--speed", options.speed,
+              "How fast to play it: 2 is twice as fast, 0 as fast as the client takes it",
+              decimal(0, SimulatorOptions::kMaxSpeed))
+            ->needs(replay);
     app.add_flag("--loop", options.loop, "Play it again and again")->needs(replay);
     app.add_option("--source", line.source,
                    "Whose fingers to draw instead of moving some: evdev:DEVICE, a touch screen of "
@@ -103,24 +107,16 @@ void addSourceOptions(CLI::App& app, CommandLine& line) {
 }
 
 void addManagerOptions(CLI::App& app, ManagerOptions& options) {
-    app.add_option("--gesture-rate", options.gestureRate,
-                   "Gestures a second of the touch and the gesture manager")
-            ->type_name("NUMBER")
-            ->check(decimal(0, ManagerOptions::kMaxRate), "")
-            ->capture_default_str();
-    app.add_option("--hand-rate", options.handRate,
-                   "Steps a second of an enrollment, a scan or a matching")
-            ->type_name("NUMBER")
-            ->check(decimal(0, ManagerOptions::kMaxRate), "")
-            ->capture_default_str();
-    app.add_option("--user-gestures", options.userGestures, "Gestures that can be defined")
-            ->type_name("NUMBER")
-            ->check(whole(0, ManagerOptions::kMaxUserGestures), "")
-            ->capture_default_str();
-    app.add_option("--hand-profiles", options.handProfiles, "Hands that can be enrolled")
-            ->type_name("NUMBER")
-            ->check(whole(0, ManagerOptions::kMaxHandProfiles), "")
-            ->capture_default_str();
+    addNumber(app, "--gesture-rate", options.gestureRate,
+              "Gestures a second of the touch and the gesture manager",
+              decimal(0, ManagerOptions::kMaxRate));
+    addNumber(app, "--hand-rate", options.handRate,
+              "Steps a second of an enrollment, a scan or a matching",
+              decimal(0, ManagerOptions::kMaxRate));
+    addNumber(app, "--user-gestures", options.userGestures, "Gestures that can be defined",
+              whole(0, ManagerOptions::kMaxUserGestures));
+    addNumber(app, "--hand-profiles", options.handProfiles, "Hands that can be enrolled",
+              whole(0, ManagerOptions::kMaxHandProfiles));
 }
 
 void readServices(const std::vector<std::string>& names, std::set<ServiceKind>& services) {
