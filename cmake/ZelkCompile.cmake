@@ -7,13 +7,10 @@ if(CMAKE_CXX_COMPILER_LAUNCHER MATCHES "ccache")
   set(CMAKE_DISABLE_PRECOMPILE_HEADERS ON)
 endif()
 
-# Most of a source's compile time is spent on the headers that it shares with its neighbours. The library, and in
-# a build that is installed everything but the tests, is compiled source by source all the same, as on Android: so
-# each includes what it uses, and the library's code is the same in every build.
-if(ZELK_BATCHES STREQUAL "all")
+# Most of a source's compile time is spent on the headers that it shares with its neighbours. The library is compiled
+# source by source all the same, as on Android: so its code is the same in every build.
+if(ZELK_BATCHES)
   set(CMAKE_UNITY_BUILD ON)
-endif()
-if(NOT ZELK_BATCHES STREQUAL "none")
   # About headers; what a batch includes are sources.
   add_compile_options($<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wno-subobject-linkage>)
 endif()

@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "tools/common/CommandLine.h"
 #include "tools/common/NearestWord.h"
 #include "tools/common/Number.h"
 #include "tools/touchstack/Source.h"
@@ -153,6 +154,14 @@ void checkRing(const SimulatorOptions& options) {
     }
 }
 
+/// Reads what the options cannot be asked for one by one, once they are parsed.
+void readOptions(const CLI::App& app, CommandLine& line) {
+    line.hasFrameBytes = app.count("--frame-bytes") != 0;
+    readServices(line.serviceTexts, line.options.services);
+    readFaults(line.faultTexts, line.faults);
+    checkRing(line.options.companion);
+}
+
 }  // namespace
 
 void addOptions(CLI::App& app, CommandLine& line) {
@@ -165,11 +174,10 @@ void addOptions(CLI::App& app, CommandLine& line) {
     addManagerOptions(app, line.options.managers);
 }
 
-void readOptions(const CLI::App& app, CommandLine& line) {
-    line.hasFrameBytes = app.count("--frame-bytes") != 0;
-    readServices(line.serviceTexts, line.options.services);
-    readFaults(line.faultTexts, line.faults);
-    checkRing(line.options.companion);
+std::optional<int> readCommandLine(int argc, char** argv, CommandLine& line) {
+    CLI::App app;
+    addOptions(app, line);
+    return tools::parseCommandLine(app, argc, argv, [&] { readOptions(app, line); });
 }
 
 }  // namespace pemaro::touchstack

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -29,9 +30,9 @@ struct CommandLine {
 /// Makes `app` the program's command line, which stores into `line`.
 void addOptions(CLI::App& app, CommandLine& line);
 
-/// Reads what the options cannot be asked for one by one, once they are parsed; throws a
-/// CLI::ValidationError about what is wrong.
-void readOptions(const CLI::App& app, CommandLine& line);
+/// Reads the program's command line into `line`. A value is the exit status of a program that has nothing
+/// more to do; see tools::parseCommandLine().
+std::optional<int> readCommandLine(int argc, char** argv, CommandLine& line);
 
 /// What --services takes.
 std::vector<std::string> serviceWords();

@@ -7,7 +7,6 @@
 #include <signal.h>
 #include <unistd.h>
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <atomic>
 #include <chrono>
@@ -200,12 +199,8 @@ int main(int argc, char** argv) {
     if (!pemaro::tools::outputProblem().empty()) {
         pemaro::tools::leave(fail(pemaro::tools::outputProblem()));
     }
-    CLI::App app;
     CommandLine line;
-    pemaro::touchstack::addOptions(app, line);
-    const auto done = pemaro::tools::parseCommandLine(
-            app, argc, argv, [&] { pemaro::touchstack::readOptions(app, line); });
-    if (done) {
+    if (const auto done = pemaro::touchstack::readCommandLine(argc, argv, line)) {
         return *done;
     }
     if (line.source == "list") {

@@ -4,7 +4,6 @@
 
 #include <signal.h>
 
-#include <CLI/CLI.hpp>
 #include <cstring>
 
 #include "tools/common/CommandLine.h"
@@ -39,23 +38,8 @@ int main(int argc, char** argv) {
         tools::leave(zelkctl::fail(tools::outputProblem()));
     }
 
-    CLI::App app;
     zelkctl::Action action;
-    zelkctl::addCommandTree(app, action);
-    const auto done = tools::parseCommandLine(
-            app, argc, argv,
-            [&] {
-                if (action) {
-                    return;
-                }
-                if (!app.get_subcommands().empty()) {
-                    throw CLI::ValidationError(app.get_subcommands()[0]->get_name() +
-                                               ": a command is required");
-                }
-                throw CLI::CallForHelp();
-            },
-            [](const std::string& problem) { zelkctl::failUsage(problem); });
-    if (done) {
+    if (const auto done = zelkctl::chooseAction(argc, argv, action)) {
         tools::leave(*done);
     }
     tools::showPlatformLog(zelkctl::settings().log);

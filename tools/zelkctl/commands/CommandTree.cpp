@@ -3,7 +3,9 @@
 
 #include <CLI/CLI.hpp>
 
+#include "tools/common/CommandLine.h"
 #include "tools/zelkctl/commands/Commands.h"
+#include "tools/zelkctl/terminal/Report.h"
 #include "tools/zelkctl/terminal/Settings.h"
 
 namespace pemaro::zelkctl {
@@ -15,6 +17,25 @@ void addCommandTree(CLI::App& app, Action& action) {
     app.add_flag("--log", settings().log, "Show the platform's log lines on stderr");
     addCommonOptions(app);
     addAllCommands(app, action);
+}
+
+std::optional<int> chooseAction(int argc, char** argv, Action& action) {
+    // Lives on: to take it apart again would take a program's start a while.
+    static CLI::App app;
+    addCommandTree(app, action);
+    return tools::parseCommandLine(
+            app, argc, argv,
+            [&] {
+                if (action) {
+                    return;
+                }
+                if (!app.get_subcommands().empty()) {
+                    throw CLI::ValidationError(app.get_subcommands()[0]->get_name() +
+                                               ": a command is required");
+                }
+                throw CLI::CallForHelp();
+            },
+            [](const std::string& problem) { failUsage(problem); });
 }
 
 }  // namespace pemaro::zelkctl
