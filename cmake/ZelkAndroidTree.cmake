@@ -5,7 +5,7 @@
 # is not in this table is written as UNKNOWN, which the test refuses.
 set(ZELK_BP_LIBRARIES
   "android::binder=" "android::utils=" "android::log=" "android::ui=" "Threads::Threads=" "zelk::options="
-  "GTest::gtest=" "GTest::gtest_main=" "dl="
+  "GTest::gtest=" "GTest::gtest_main=" "dl=" "zelkclient_objects="
   # Android 10 to 12 have no libtracefs: the tools are built without zelkctl's trace there.
   "zelkctl_trace="
   "android::base=shared_libs:libbase"
@@ -14,6 +14,7 @@ set(ZELK_BP_LIBRARIES
   "PkgConfig::LIBEVDEV=shared_libs:libevdev"
   "fmt::fmt=static_libs:libfmtlib"
   "CLI11::CLI11=header_libs:libcli11_headers"
+  "zelk::rapidjson=header_libs:librapidjson_headers"
   "GTest::gmock=static_libs:libgmock"
   "zelk::zelkclient=shared_libs:libzelkclient"
   "zelkclient_static=static_libs:libzelkclient_static"
@@ -41,19 +42,29 @@ function(zelk_bp_list name)
   endif()
 endfunction()
 
-# zelk_bp_libraries(<library>...): those of the table, and the archives of this tree.
-function(zelk_bp_libraries)
-  foreach(library IN LISTS ARGN)
-    if(library MATCHES "^\\$<")
+# zelk_bp_libraries(<module's type> <library>...): those of the table, and the archives of this tree. In an Android
+# tree a module has what it names itself, nothing by way of another archive. So each names what those need that it
+# names, and what is linked names all archives; an archive takes in no other's objects.
+function(zelk_bp_libraries module)
+  set(libraries ${ARGN})
+  set(seen "")
+  while(libraries)
+    list(POP_FRONT libraries library)
+    if(library MATCHES "^\\$<" OR library IN_LIST seen)
       continue()
     endif()
+    list(APPEND seen ${library})
     set(found "static_libs:UNKNOWN_${library}")
+    set(further "")
     if(TARGET ${library})
       get_target_property(type ${library} TYPE)
-      if(type STREQUAL "OBJECT_LIBRARY")
+      if(type STREQUAL "OBJECT_LIBRARY" AND NOT module STREQUAL "cc_library_static")
         set(found "whole_static_libs:lib${library}")
-      elseif(type STREQUAL "STATIC_LIBRARY")
+      elseif(type MATCHES "^(OBJECT|STATIC)_LIBRARY$")
         set(found "static_libs:lib${library}")
+      endif()
+      if(type MATCHES "^(OBJECT|STATIC)_LIBRARY$")
+        get_target_property(further ${library} LINK_LIBRARIES)
       endif()
     endif()
     foreach(row IN LISTS ZELK_BP_LIBRARIES)
@@ -63,8 +74,11 @@ function(zelk_bp_libraries)
     endforeach()
     if(found MATCHES "^(.*):(.*)$")
       list(APPEND ${CMAKE_MATCH_1} ${CMAKE_MATCH_2})
+      if(further)
+        list(APPEND libraries ${further})
+      endif()
     endif()
-  endforeach()
+  endwhile()
   foreach(kind header_libs shared_libs static_libs whole_static_libs)
     zelk_bp_list(${kind} ${${kind}})
   endforeach()
@@ -84,8 +98,8 @@ function(zelk_bp_paths variable folder)
   set(${variable} "${paths}" PARENT_SCOPE)
 endfunction()
 
-# zelk_bp_target(<target>): what its CMakeLists.txt tells.
-function(zelk_bp_target target)
+# zelk_bp_target(<target> <module's type>): what its CMakeLists.txt tells.
+function(zelk_bp_target target type)
   foreach(property SOURCES SOURCE_DIR COMPILE_DEFINITIONS INCLUDE_DIRECTORIES LINK_LIBRARIES COMPILE_OPTIONS)
     get_target_property(${property} ${target} ${property})
   endforeach()
@@ -110,14 +124,14 @@ function(zelk_bp_target target)
       list(APPEND LINK_LIBRARIES ${CMAKE_MATCH_1})
     endif()
   endforeach()
-  zelk_bp_libraries(${LINK_LIBRARIES})
+  zelk_bp_libraries(${type} ${LINK_LIBRARIES})
 endfunction()
 
 # zelk_bp_module(<type> <name> <target or ""> <line>...): a module, with lines of its own behind the target's.
 function(zelk_bp_module type name target)
   zelk_bp_append("\n${type} {\n    name: \"${name}\",\n")
   if(target)
-    zelk_bp_target(${target})
+    zelk_bp_target(${target} ${type})
   endif()
   foreach(line IN LISTS ARGN)
     zelk_bp_append("    ${line}\n")
@@ -191,10 +205,6 @@ foreach(folder values frames simulator tools examples tests)
       continue()
     elseif(type MATCHES "^(STATIC|OBJECT)_LIBRARY$")
       set(lines "defaults: [\"zelk_around_defaults\"],")
-      if(target STREQUAL "zelkctl_objects")
-        # Debian's compiler finds it without a target.
-        list(APPEND lines "header_libs: [\"librapidjson_headers\"],")
-      endif()
       zelk_bp_module(cc_library_static lib${target} ${target} ${lines})
     elseif(type STREQUAL "EXECUTABLE" AND folder STREQUAL "tests")
       zelk_bp_module(cc_test zelk_${target} ${target} "defaults: [\"zelk_around_defaults\"],"
@@ -229,7 +239,7 @@ function(zelk_bp_fuzz_module type name)
   zelk_bp_append("\n${type} {\n    name: \"${name}\",\n    defaults: [\"zelk_around_defaults\"],\n")
   zelk_bp_paths(sources ${CMAKE_SOURCE_DIR}/fuzz ${ARG_SOURCES})
   zelk_bp_list(srcs ${sources})
-  zelk_bp_libraries(${ARG_LIBS})
+  zelk_bp_libraries(${type} ${ARG_LIBS})
 endfunction()
 
 string(REGEX MATCHALL "\n(zelk_fuzzer|add_library)\\([^)]*\\)" calls "${fuzz_text}")

@@ -1,6 +1,7 @@
 #!/bin/bash
 # SPDX-License-Identifier: Apache-2.0
-# android-bp takes what a build wrote, and refuses a module whose files the Android tree would not have.
+# android-bp takes what a build wrote, and refuses a module whose files or libraries it would not have in the Android
+# tree.
 #
 #   android-bp_test.sh BUILD-FOLDER
 set -euo pipefail
@@ -21,7 +22,7 @@ refuses() {
     if "$here/android-bp" "$folder" >"$folder/log" 2>&1; then
         echo "taken: $2" >&2
         failures=$((failures + 1))
-    elif ! grep -q -x -F "android-bp: $1" "$folder/log"; then
+    elif ! grep -q -x -F "$1" "$folder/log"; then
         echo "not refused with '$1': $2: $(<"$folder/log")" >&2
         failures=$((failures + 1))
     fi
@@ -29,9 +30,12 @@ refuses() {
 
 "$here/android-bp" "$build"
 root=$(realpath -- "$here/../..")
-refuses "values/Nowhere.cpp: not a file of the tree" 'srcs: ["values/Nowhere.cpp"]'
-refuses "${generated#"$root/"}: not a file of the tree" "srcs: [\"${generated#"$root/"}\"]"
-refuses "docs/doxygen/make-reference: no source of a compiler" 'srcs: ["docs/doxygen/make-reference"]'
-refuses "fuzz/corpus/nowhere/*: no such files" 'corpus: ["fuzz/corpus/nowhere/*"]'
-refuses "nowhere: not a folder of the tree" 'local_include_dirs: ["nowhere"]'
+refuses "android-bp: values/Nowhere.cpp: not a file of the tree" 'srcs: ["values/Nowhere.cpp"]'
+refuses "android-bp: ${generated#"$root/"}: not a file of the tree" "srcs: [\"${generated#"$root/"}\"]"
+refuses "android-bp: docs/doxygen/make-reference: no source of a compiler" 'srcs: ["docs/doxygen/make-reference"]'
+refuses "android-bp: fuzz/corpus/nowhere/*: no such files" 'corpus: ["fuzz/corpus/nowhere/*"]'
+refuses "android-bp: nowhere: not a folder of the tree" 'local_include_dirs: ["nowhere"]'
+# What a module has by way of an archive alone it does not have there.
+refuses "complete-modules: zelk_more_test: needs libzelk_frames, for libzelk_records" 'static_libs: ["libzelk_records"]'
+refuses "complete-modules: zelk_more_test: needs libfmtlib, for <fmt/core.h>" 'srcs: ["tools/touchstack/main.cpp"]'
 ((failures == 0))
