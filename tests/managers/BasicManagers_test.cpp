@@ -1,36 +1,21 @@
 // SPDX-License-Identifier: Apache-2.0
 // What managers answer that override nothing, and whom they report to.
 
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <functional>
 #include <string>
 #include <vector>
 
 #include "pemaro/BasicGestureManagerService.h"
 #include "pemaro/BasicHandBiometricManagerService.h"
 #include "pemaro/BasicTouchManagerService.h"
-#include "tests/managers/ManagerMocks.h"
+#include "tests/managers/RecordingManagers.h"
 
 using android::sp;
-using testing::NiceMock;
-using testing::Return;
 
 namespace pemaro::test {
 
 namespace {
-
-struct Row {
-    const char* operation;
-    std::function<int()> call;
-};
-
-void expectUnsupported(const std::vector<Row>& rows) {
-    for (const Row& row : rows) {
-        EXPECT_EQ(STATUS_UNSUPPORTED, row.call()) << row.operation;
-    }
-}
 
 // A service whose reports a test can ask for.
 template <typename Basic>
@@ -52,46 +37,37 @@ sp<Client> proxyOf(const sp<Client>& client) {
 }  // namespace
 
 TEST(BasicTouchManagerService, OffersNothing) {
-    const sp<BasicTouchManagerService> held = new BasicTouchManagerService;
-    BasicTouchManagerService& service = *held;
+    const sp<BasicTouchManagerService> service = new BasicTouchManagerService;
     bool is = true;
     android::Rect region(0, 0, 1, 1);
-    expectUnsupported({
-            {"isSupported", [&] { return service.isSupported(1, is); }},
-            {"enable", [&] { return service.enable(1); }},
-            {"disable", [&] { return service.disable(1); }},
-            {"configure_vm_region", [&] { return service.configure_vm_region(region, true); }},
-    });
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->isSupported(1, is));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->enable(1));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->disable(1));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->configure_vm_region(region, true));
     EXPECT_FALSE(is);
     is = true;
-    EXPECT_EQ(STATUS_UNSUPPORTED, service.isEnabled(1, is));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->isEnabled(1, is));
     EXPECT_FALSE(is);
 }
 
 TEST(BasicGestureManagerService, OffersNothing) {
-    const sp<BasicGestureManagerService> held = new BasicGestureManagerService;
-    BasicGestureManagerService& service = *held;
+    const sp<BasicGestureManagerService> service = new BasicGestureManagerService;
     IGestureManagerClient::GestureData* const none = nullptr;
     int added = 7;
     int verified = 7;
     unsigned int predefined = 7;
     unsigned int userDefined = 7;
-    expectUnsupported({
-            {"enableWakeup", [&] { return service.enableWakeup(); }},
-            {"disableWakeup", [&] { return service.disableWakeup(); }},
-            {"startGestureDetection", [&] { return service.startGestureDetection(); }},
-            {"stopGestureDetection", [&] { return service.stopGestureDetection(); }},
-            {"addGesture", [&] { return service.addGesture(0, none, added); }},
-            {"deleteGesture", [&] { return service.deleteGesture(1); }},
-            {"enableGesture", [&] { return service.enableGesture(1); }},
-            {"disableGesture", [&] { return service.disableGesture(1); }},
-            {"improveGestureTraining",
-             [&] { return service.improveGestureTraining(none, verified); }},
-            {"getMaxPreDefinedGesture",
-             [&] { return service.getMaxPreDefinedGesture(predefined); }},
-            {"getMaxUserDefinedGesture",
-             [&] { return service.getMaxUserDefinedGesture(userDefined); }},
-    });
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->enableWakeup());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->disableWakeup());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->startGestureDetection());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->stopGestureDetection());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->addGesture(0, none, added));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->deleteGesture(1));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->enableGesture(1));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->disableGesture(1));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->improveGestureTraining(none, verified));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->getMaxPreDefinedGesture(predefined));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->getMaxUserDefinedGesture(userDefined));
     EXPECT_EQ(0, added);
     EXPECT_EQ(0, verified);
     EXPECT_EQ(0u, predefined);
@@ -99,26 +75,23 @@ TEST(BasicGestureManagerService, OffersNothing) {
 }
 
 TEST(BasicHandBiometricManagerService, OffersNothing) {
-    const sp<BasicHandBiometricManagerService> held = new BasicHandBiometricManagerService;
-    BasicHandBiometricManagerService& service = *held;
+    const sp<BasicHandBiometricManagerService> service = new BasicHandBiometricManagerService;
     unsigned int most = 7;
     std::vector<std::string> names = {"left over"};
-    expectUnsupported({
-            {"startEnrollment", [&] { return service.startEnrollment(); }},
-            {"stopEnrollment", [&] { return service.stopEnrollment(); }},
-            {"scan", [&] { return service.scan(); }},
-            {"startMatching", [&] { return service.startMatching(); }},
-            {"stopMatching", [&] { return service.stopMatching(); }},
-            {"cancelScan", [&] { return service.cancelScan(); }},
-            {"setSecurity", [&] { return service.setSecurity(1); }},
-            {"setProfileName", [&] { return service.setProfileName("a"); }},
-            {"deleteProfile", [&] { return service.deleteProfile("a"); }},
-            {"renameProfile", [&] { return service.renameProfile("a", "b"); }},
-            {"getMaxUser", [&] { return service.getMaxUser(most); }},
-            {"getProfileList", [&] { return service.getProfileList(names); }},
-            {"enableWakeup", [&] { return service.enableWakeup(); }},
-            {"disableWakeup", [&] { return service.disableWakeup(); }},
-    });
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->startEnrollment());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->stopEnrollment());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->scan());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->startMatching());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->stopMatching());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->cancelScan());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->setSecurity(1));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->setProfileName("a"));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->deleteProfile("a"));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->renameProfile("a", "b"));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->getMaxUser(most));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->getProfileList(names));
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->enableWakeup());
+    EXPECT_EQ(STATUS_UNSUPPORTED, service->disableWakeup());
     EXPECT_EQ(0u, most);
     EXPECT_TRUE(names.empty());
 }
@@ -129,9 +102,9 @@ TEST(BasicServices, ReportToTheirSubscribers) {
             new Reporting<BasicGestureManagerService>;
     const sp<Reporting<BasicHandBiometricManagerService>> hands =
             new Reporting<BasicHandBiometricManagerService>;
-    const sp<MockTouchManagerClient> toucher = new MockTouchManagerClient;
-    const sp<MockGestureManagerClient> drawer = new MockGestureManagerClient;
-    const sp<MockHandBiometricManagerClient> hand = new MockHandBiometricManagerClient;
+    const sp<RecordingTouchManagerClient> toucher = new RecordingTouchManagerClient;
+    const sp<RecordingGestureManagerClient> drawer = new RecordingGestureManagerClient;
+    const sp<RecordingHandBiometricManagerClient> hand = new RecordingHandBiometricManagerClient;
     EXPECT_EQ(STATUS_NO_ERROR, touch->subscribe(toucher));
     EXPECT_EQ(STATUS_NO_ERROR, gestures->subscribe(drawer));
     EXPECT_EQ(STATUS_NO_ERROR, hands->subscribe(hand));
@@ -139,9 +112,6 @@ TEST(BasicServices, ReportToTheirSubscribers) {
     static ITouchManagerClient::GestureData touched;
     static IGestureManagerClient::GestureData drawn;
     static IHandBiometricManagerClient::HandBioData shown;
-    EXPECT_CALL(*toucher, gestureCallback(&touched)).WillOnce(Return(0));
-    EXPECT_CALL(*drawer, gestureCallback(&drawn)).WillOnce(Return(0));
-    EXPECT_CALL(*hand, handBiometricCallback(&shown)).WillOnce(Return(0));
     touch->report(touched);
     gestures->report(drawn);
     hands->report(shown);
@@ -152,12 +122,17 @@ TEST(BasicServices, ReportToTheirSubscribers) {
     touch->report(touched);
     gestures->report(drawn);
     hands->report(shown);
+
+    // Once each, while they were subscribed.
+    EXPECT_EQ(Recording::Addresses{&touched}, toucher->addresses);
+    EXPECT_EQ(Recording::Addresses{&drawn}, drawer->addresses);
+    EXPECT_EQ(Recording::Addresses{&shown}, hand->addresses);
 }
 
 TEST(Subscribers, KnowAClientByItsBinder) {
     Subscribers<IGestureManagerClient> subscribers;
-    const sp<IGestureManagerClient> client = new NiceMock<MockGestureManagerClient>;
-    const sp<IGestureManagerClient> other = new NiceMock<MockGestureManagerClient>;
+    const sp<IGestureManagerClient> client = new RecordingGestureManagerClient;
+    const sp<IGestureManagerClient> other = new RecordingGestureManagerClient;
     EXPECT_EQ(STATUS_BAD_PARAMETER, subscribers.add(nullptr));
     EXPECT_EQ(STATUS_NO_ERROR, subscribers.add(proxyOf(client)));
     EXPECT_EQ(STATUS_NO_ERROR, subscribers.add(proxyOf(client)));
@@ -170,8 +145,8 @@ TEST(Subscribers, KnowAClientByItsBinder) {
 
 TEST(Subscribers, LetGoOfWhoCannotBeReached) {
     Subscribers<IGestureManagerClient> subscribers;
-    const sp<IGestureManagerClient> dead = new NiceMock<MockGestureManagerClient>;
-    const sp<IGestureManagerClient> cross = new NiceMock<MockGestureManagerClient>;
+    const sp<IGestureManagerClient> dead = new RecordingGestureManagerClient;
+    const sp<IGestureManagerClient> cross = new RecordingGestureManagerClient;
     subscribers.add(dead);
     subscribers.add(cross);
     int calls = 0;

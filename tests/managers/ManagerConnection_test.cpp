@@ -43,7 +43,7 @@ TEST(ManagerConnection, RefusesABinderOfAnotherInterface) {
 
     clearLog();
     EXPECT_EQ(STATUS_BAD_PARAMETER, connection.initWatched(nullptr));
-    EXPECT_THAT(linesOf("Tag"), ElementsAre("D init: E", "E wrong service interface?"));
+    EXPECT_EQ((Lines{"D init: E", "E wrong service interface?"}), linesOf("Tag"));
     EXPECT_FALSE(initialized);
     // What was held before is let go, without a call.
     EXPECT_EQ(nullptr, service);
@@ -53,7 +53,7 @@ TEST(ManagerConnection, RefusesABinderOfAnotherInterface) {
     // The step alone, of which the touch manager client makes its init().
     clearLog();
     EXPECT_EQ(nullptr, connection.hold(binder));
-    EXPECT_THAT(linesOf("Tag"), ElementsAre("E wrong service interface?"));
+    EXPECT_EQ((Lines{"E wrong service interface?"}), linesOf("Tag"));
 }
 
 }  // namespace

@@ -13,7 +13,7 @@
 #include "pemaro/GestureManagerClient.h"
 #include "pemaro/HandBiometricManagerClient.h"
 #include "pemaro/TouchManagerClient.h"
-#include "tests/managers/ManagerMocks.h"
+#include "tests/managers/RecordingManagers.h"
 #include "tests/support/RecordingBinder.h"
 #include "tests/support/VirtualSlot.h"
 
@@ -25,10 +25,10 @@ using android::sp;
 using android::String16;
 using android::wp;
 
-template <typename I, typename M, const char* kName>
+template <typename I, typename L, const char* kName>
 struct InterfaceCase {
     using Interface = I;
-    using Mock = M;
+    using Local = L;
     static constexpr const char* kDescriptor = kName;
 };
 
@@ -40,12 +40,14 @@ constexpr char kHandService[] = "pemaro.HandBiometricManagerService";
 constexpr char kHandClient[] = "pemaro.HandBiometricManagerClient";
 
 using Interfaces = ::testing::Types<
-        InterfaceCase<ITouchManagerService, MockTouchManagerService, kTouchService>,
-        InterfaceCase<ITouchManagerClient, MockTouchManagerClient, kTouchClient>,
-        InterfaceCase<IGestureManagerService, MockGestureManagerService, kGestureService>,
-        InterfaceCase<IGestureManagerClient, MockGestureManagerClient, kGestureClient>,
-        InterfaceCase<IHandBiometricManagerService, MockHandBiometricManagerService, kHandService>,
-        InterfaceCase<IHandBiometricManagerClient, MockHandBiometricManagerClient, kHandClient>>;
+        InterfaceCase<ITouchManagerService, RecordingTouchManagerService, kTouchService>,
+        InterfaceCase<ITouchManagerClient, RecordingTouchManagerClient, kTouchClient>,
+        InterfaceCase<IGestureManagerService, RecordingGestureManagerService, kGestureService>,
+        InterfaceCase<IGestureManagerClient, RecordingGestureManagerClient, kGestureClient>,
+        InterfaceCase<IHandBiometricManagerService, RecordingHandBiometricManagerService,
+                      kHandService>,
+        InterfaceCase<IHandBiometricManagerClient, RecordingHandBiometricManagerClient,
+                      kHandClient>>;
 
 template <typename T>
 class ManagerInterface : public ::testing::Test {};
@@ -54,7 +56,7 @@ TYPED_TEST_SUITE(ManagerInterface, Interfaces);
 TYPED_TEST(ManagerInterface, HasItsDescriptor) {
     const String16 expected(TypeParam::kDescriptor);
     EXPECT_EQ(expected, TypeParam::Interface::descriptor);
-    const sp<typename TypeParam::Mock> local = new typename TypeParam::Mock;
+    const sp<typename TypeParam::Local> local = new typename TypeParam::Local;
     EXPECT_EQ(expected, local->getInterfaceDescriptor());
 }
 
@@ -63,7 +65,7 @@ TYPED_TEST(ManagerInterface, CastsNullToNull) {
 }
 
 TYPED_TEST(ManagerInterface, CastsALocalObjectToItself) {
-    const sp<typename TypeParam::Interface> local = new typename TypeParam::Mock;
+    const sp<typename TypeParam::Interface> local = new typename TypeParam::Local;
     EXPECT_EQ(local, TypeParam::Interface::asInterface(android::IInterface::asBinder(local)));
 }
 

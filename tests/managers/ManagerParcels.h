@@ -1,13 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
-#include <gmock/gmock.h>
-
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <string>
-#include <type_traits>
 #include <vector>
 
 #include "tests/support/ParcelBytes.h"
@@ -67,13 +64,14 @@ std::vector<Record> makeRecords(size_t count) {
     return records;
 }
 
-/// Whether `data` points to the first `count` records of makeRecords().
-MATCHER_P(HoldsRecords, count, "") {
-    if (arg == nullptr) {
+/// Whether `records` points to the first `count` records of makeRecords().
+template <typename Record>
+bool holdsRecords(const Record* records, size_t count) {
+    if (records == nullptr) {
         return false;
     }
-    const auto expected = makeRecords<std::decay_t<decltype(*arg)>>(count);
-    return memcmp(arg, expected.data(), count * sizeof(*arg)) == 0;
+    const std::vector<Record> expected = makeRecords<Record>(count);
+    return count == 0 || memcmp(records, expected.data(), count * sizeof(Record)) == 0;
 }
 
 /// Appends makeRecords() as raw bytes.

@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "pemaro/Status.h"
-#include "tests/managers/ManagerMocks.h"
 #include "tests/managers/ManagerParcels.h"
+#include "tests/managers/RecordingManagers.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"
 
@@ -32,44 +32,39 @@ using HandEvent = IHandBiometricManagerClient::HandBioData;
 
 using Call = std::function<int(const sp<IBinder>& remote)>;
 
-template <typename Interface, typename Operation>
-Call on(Operation operation) {
+// Plain pointers: one instance of this for each interface, not one for each row.
+template <typename Interface>
+Call on(int (*operation)(Interface& interface)) {
     return [operation](const sp<IBinder>& remote) {
         return operation(*Interface::asInterface(remote));
     };
 }
 
-template <typename Operation>
-Call touchCall(Operation operation) {
-    return on<ITouchManagerService>(operation);
+Call touchCall(int (*operation)(ITouchManagerService& service)) {
+    return on(operation);
 }
 
-template <typename Operation>
-Call gestureCall(Operation operation) {
-    return on<IGestureManagerService>(operation);
+Call gestureCall(int (*operation)(IGestureManagerService& service)) {
+    return on(operation);
 }
 
-template <typename Operation>
-Call handCall(Operation operation) {
-    return on<IHandBiometricManagerService>(operation);
+Call handCall(int (*operation)(IHandBiometricManagerService& service)) {
+    return on(operation);
 }
 
 // One callback object of each kind, the same for the call and for the expected request.
 const sp<ITouchManagerClient>& touchClient() {
-    static const sp<ITouchManagerClient> client = new MockTouchManagerClient;
-    ::testing::Mock::AllowLeak(static_cast<MockTouchManagerClient*>(client.get()));
+    static const sp<ITouchManagerClient> client = new RecordingTouchManagerClient;
     return client;
 }
 
 const sp<IGestureManagerClient>& gestureClient() {
-    static const sp<IGestureManagerClient> client = new MockGestureManagerClient;
-    ::testing::Mock::AllowLeak(static_cast<MockGestureManagerClient*>(client.get()));
+    static const sp<IGestureManagerClient> client = new RecordingGestureManagerClient;
     return client;
 }
 
 const sp<IHandBiometricManagerClient>& handClient() {
-    static const sp<IHandBiometricManagerClient> client = new MockHandBiometricManagerClient;
-    ::testing::Mock::AllowLeak(static_cast<MockHandBiometricManagerClient*>(client.get()));
+    static const sp<IHandBiometricManagerClient> client = new RecordingHandBiometricManagerClient;
     return client;
 }
 
@@ -276,7 +271,7 @@ TEST_P(ManagerProxyRow, SendsItsRequestAndPassesTheStatusOnUnlogged) {
         EXPECT_EQ(GetParam().code, sent.code);
         EXPECT_EQ(0u, sent.flags);
         EXPECT_TRUE(requestBytes(descriptor(), GetParam().arguments) == sent.request);
-        EXPECT_THAT(linesOf(tag()), ElementsAre(entry()));
+        EXPECT_EQ((Lines{entry()}), linesOf(tag()));
     }
 }
 
@@ -291,8 +286,8 @@ TEST_P(ManagerProxyRow, MakesOneStatusOfEveryTransportFailure) {
         clearLog();
         mRemote->fail(failure.status);
         EXPECT_EQ(STATUS_UNKNOWN_ERROR, GetParam().call(mRemote));
-        EXPECT_THAT(linesOf(tag()),
-                    ElementsAre(entry(), std::string("E ") + GetParam().failure + failure.text));
+        EXPECT_EQ((Lines{entry(), std::string("E ") + GetParam().failure + failure.text}),
+                  linesOf(tag()));
     }
 }
 
@@ -408,9 +403,9 @@ class ProfileListProxy : public ManagerProxy {
 TEST_F(ProfileListProxy, AppendsTheNames) {
     EXPECT_EQ(0, get(2, {"alice", "bob"}, numbers({0})));
     EXPECT_THAT(mNames, ElementsAre("held", "alice", "bob"));
-    EXPECT_THAT(linesOf("IHandBiometricManagerService"),
-                ElementsAre("D Bp::getProfileList enter", "D Bp::getProfileList pName is alice",
-                            "D Bp::getProfileList pName is bob"));
+    EXPECT_EQ((Lines{"D Bp::getProfileList enter", "D Bp::getProfileList pName is alice",
+                     "D Bp::getProfileList pName is bob"}),
+              linesOf("IHandBiometricManagerService"));
 }
 
 TEST_F(ProfileListProxy, AppendsTheNamesWhateverTheStatus) {
@@ -448,9 +443,8 @@ TEST_F(ProfileListProxy, TakesNoStatusForAName) {
         clearLog();
         EXPECT_EQ(STATUS_CORRUPT_DATA, get(2, {"alice"}, numbers({status}))) << status;
         EXPECT_THAT(mNames, ElementsAre("held", "alice"));
-        EXPECT_THAT(
-                linesOf("IHandBiometricManagerService"),
-                ElementsAre("D Bp::getProfileList enter", "D Bp::getProfileList pName is alice"));
+        EXPECT_EQ((Lines{"D Bp::getProfileList enter", "D Bp::getProfileList pName is alice"}),
+                  linesOf("IHandBiometricManagerService"));
     }
 }
 

@@ -10,8 +10,8 @@
 
 #include "pemaro/Status.h"
 #include "pemaro/testkit/FakeServiceManager.h"
-#include "tests/managers/ManagerMocks.h"
 #include "tests/managers/ManagerParcels.h"
+#include "tests/managers/RecordingManagers.h"
 #include "tests/support/FakeWaits.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"
@@ -21,10 +21,8 @@ namespace {
 
 using android::Parcel;
 using android::sp;
-using ::testing::_;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
-using ::testing::NiceMock;
 using ::testing::SizeIs;
 
 using TouchGesture = ITouchManagerClient::GestureData;
@@ -97,10 +95,10 @@ TEST_F(TouchManagerClientTest, LogsItsConstructionAndDestruction) {
                                                      : new TouchManagerClient;
         const void* address = client.get();
         client.clear();
-        EXPECT_THAT(linesOf(kTag),
-                    ElementsAre(withAddress("D TouchManagerClient(): this = %p", address),
-                                withAddress("D ~TouchManagerClient: E: this = %p", address),
-                                "D ~TouchManagerClient(): X"));
+        EXPECT_EQ((Lines{withAddress("D TouchManagerClient(): this = %p", address),
+                         withAddress("D ~TouchManagerClient: E: this = %p", address),
+                         "D ~TouchManagerClient(): X"}),
+                  linesOf(kTag));
     }
 }
 
@@ -124,10 +122,9 @@ TEST_F(TouchManagerClientTest, SubscribesItself) {
     const sp<TouchManagerClient> client = new TouchManagerClient(callbackA, &mContext);
     clearLog();
     EXPECT_EQ(0, client->init());
-    EXPECT_THAT(
-            linesOf(kTag),
-            ElementsAre("D init: E", "D before subscribe: mTchMgrClient ref count = 1",
-                        "D after subscribe: mTchMgrClient ref count = 1", "E Init successful: X"));
+    EXPECT_EQ((Lines{"D init: E", "D before subscribe: mTchMgrClient ref count = 1",
+                     "D after subscribe: mTchMgrClient ref count = 1", "E Init successful: X"}),
+              linesOf(kTag));
     ASSERT_THAT(codes(), ElementsAre(kSubscribe));
     EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
     EXPECT_EQ(1, mServices->lookups(kService));
@@ -135,21 +132,17 @@ TEST_F(TouchManagerClientTest, SubscribesItself) {
 }
 
 TEST_F(TouchManagerClientTest, CountsTheReferenceThatTheServiceKeeps) {
-    const sp<NiceMock<MockTouchManagerService>> service = new NiceMock<MockTouchManagerService>;
-    sp<ITouchManagerClient> kept;
-    EXPECT_CALL(*service, subscribe(_)).WillOnce([&](const sp<ITouchManagerClient>& client) {
-        kept = client;
-        return 0;
-    });
+    const sp<RecordingTouchManagerService> service = new RecordingTouchManagerService;
     mServices->add(kService, service);
     const sp<TouchManagerClient> client = new TouchManagerClient;
     clearLog();
     EXPECT_EQ(0, client->init());
-    EXPECT_EQ(client, kept);
-    EXPECT_THAT(
-            linesOf(kTag),
-            ElementsAre("D init: E", "D before subscribe: mTchMgrClient ref count = 1",
-                        "D after subscribe: mTchMgrClient ref count = 2", "E Init successful: X"));
+    EXPECT_EQ(Recording::Calls{"subscribe(object)"}, service->calls);
+    EXPECT_THAT(service->clients, ElementsAre(client));
+    EXPECT_EQ((Lines{"D init: E", "D before subscribe: mTchMgrClient ref count = 1",
+                     "D after subscribe: mTchMgrClient ref count = 2", "E Init successful: X"}),
+              linesOf(kTag));
+    service->clients.clear();  // the two held each other
 }
 
 TEST_F(TouchManagerClientTest, AsksForTheServiceOnce) {
@@ -157,7 +150,7 @@ TEST_F(TouchManagerClientTest, AsksForTheServiceOnce) {
     const sp<TouchManagerClient> client = new TouchManagerClient;
     clearLog();
     EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->init());
-    EXPECT_THAT(linesOf(kTag), ElementsAre("D init: E", "E couldn't find the service"));
+    EXPECT_EQ((Lines{"D init: E", "E couldn't find the service"}), linesOf(kTag));
     EXPECT_EQ(1, mServices->lookups(kService));
     EXPECT_THAT(waits.sleeps(), IsEmpty());
 }
@@ -166,7 +159,7 @@ TEST(TouchManagerClientAlone, NeedsAServiceManager) {
     const sp<TouchManagerClient> client = new TouchManagerClient;
     clearLog();
     EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->init());
-    EXPECT_THAT(linesOf(kTag), ElementsAre("D init: E", "E couldn't get default service manager"));
+    EXPECT_EQ((Lines{"D init: E", "E couldn't get default service manager"}), linesOf(kTag));
 }
 
 TEST_F(TouchManagerClientTest, KeepsTheServiceThatRefusesIt) {
@@ -175,10 +168,10 @@ TEST_F(TouchManagerClientTest, KeepsTheServiceThatRefusesIt) {
     const sp<TouchManagerClient> client = new TouchManagerClient;
     clearLog();
     EXPECT_EQ(STATUS_BROKEN_PIPE, client->init());
-    EXPECT_THAT(linesOf(kTag),
-                ElementsAre("D init: E", "D before subscribe: mTchMgrClient ref count = 1",
-                            "D after subscribe: mTchMgrClient ref count = 1",
-                            "E subscribing to service failed"));
+    EXPECT_EQ((Lines{"D init: E", "D before subscribe: mTchMgrClient ref count = 1",
+                     "D after subscribe: mTchMgrClient ref count = 1",
+                     "E subscribing to service failed"}),
+              linesOf(kTag));
     // Its features can be used, and nothing is there to unsubscribe.
     mRemote->answer(numbers({0}));
     mRemote->clearTransactions();
@@ -230,7 +223,7 @@ TEST_F(TouchManagerClientTest, DeinitLeavesAServiceAloneThatCameMeanwhile) {
 TEST_F(TouchManagerClientTest, UnsubscribesItself) {
     const sp<TouchManagerClient> client = connect(callbackA, &mContext);
     EXPECT_EQ(0, client->deinit());
-    EXPECT_THAT(linesOf(kTag), ElementsAre("D deinit: E", "D deinit: X"));
+    EXPECT_EQ((Lines{"D deinit: E", "D deinit: X"}), linesOf(kTag));
     ASSERT_THAT(codes(), ElementsAre(kUnsubscribe));
     EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
     // Once: the service was let go.
@@ -251,7 +244,7 @@ TEST_F(TouchManagerClientTest, CallsNobodyWhenItWasNeverInitialised) {
     const sp<TouchManagerClient> client = new TouchManagerClient;
     clearLog();
     EXPECT_EQ(0, client->deinit());
-    EXPECT_THAT(linesOf(kTag), ElementsAre("D deinit: E", "D deinit: X"));
+    EXPECT_EQ((Lines{"D deinit: E", "D deinit: X"}), linesOf(kTag));
     EXPECT_THAT(mRemote->transactions(), IsEmpty());
     EXPECT_EQ(0, mServices->lookups(kService));
 }
@@ -280,7 +273,7 @@ TEST_F(TouchManagerClientTest, HandsGesturesToTheCallback) {
     EXPECT_EQ(0, client->gestureCallback(nullptr));
     EXPECT_THAT(gTouchEvents,
                 ElementsAre(Event{'A', &record, &mContext}, Event{'A', nullptr, &mContext}));
-    EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()), eventLine(client.get())));
+    EXPECT_EQ((Lines{eventLine(client.get()), eventLine(client.get())}), linesOf(kTag));
     EXPECT_THAT(mRemote->transactions(), IsEmpty());
 }
 
@@ -294,7 +287,7 @@ TEST_F(TouchManagerClientTest, HandsOnTheRecordThatLiesInTheRequest) {
     ASSERT_THAT(gTouchEvents, SizeIs(1));
     EXPECT_EQ(data.data() + data.dataSize() - sizeof(TouchGesture),
               reinterpret_cast<const uint8_t*>(gTouchEvents[0].record));
-    EXPECT_THAT(gTouchEvents[0].record, HoldsRecords(1u));
+    EXPECT_TRUE(holdsRecords(gTouchEvents[0].record, 1));
     EXPECT_EQ(parcelBytes(numbers({0})), bytesOf(reply));
 }
 
@@ -314,7 +307,7 @@ TEST_F(TouchManagerClientTest, SharesTheCallbackOfTheLastClient) {
 TEST_F(TouchManagerClientTest, DropsGesturesWithoutACallback) {
     const sp<TouchManagerClient> client = connect(nullptr, &mContext);
     EXPECT_EQ(0, client->gestureCallback(nullptr));
-    EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()), "E callback is null"));
+    EXPECT_EQ((Lines{eventLine(client.get()), "E callback is null"}), linesOf(kTag));
     EXPECT_THAT(mRemote->transactions(), IsEmpty());
 }
 
@@ -323,8 +316,8 @@ TEST_F(TouchManagerClientTest, UnsubscribesAtEveryGestureWithoutAContext) {
     for (int i = 0; i < 2; ++i) {
         clearLog();
         EXPECT_EQ(0, client->gestureCallback(nullptr));
-        EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()),
-                                               "E JNI context is null...unsubscribing client"));
+        EXPECT_EQ((Lines{eventLine(client.get()), "E JNI context is null...unsubscribing client"}),
+                  linesOf(kTag));
         EXPECT_EQ(requestWith(client), mRemote->lastTransaction().request);
     }
     EXPECT_THAT(gTouchEvents, IsEmpty());
@@ -337,8 +330,8 @@ TEST_F(TouchManagerClientTest, IgnoresAGestureWithoutAContextAndAService) {
     const sp<TouchManagerClient> client = new TouchManagerClient(callbackA, nullptr);
     clearLog();
     EXPECT_EQ(0, client->gestureCallback(nullptr));
-    EXPECT_THAT(linesOf(kTag), ElementsAre(eventLine(client.get()),
-                                           "E JNI context is null...unsubscribing client"));
+    EXPECT_EQ((Lines{eventLine(client.get()), "E JNI context is null...unsubscribing client"}),
+              linesOf(kTag));
 }
 
 }  // namespace

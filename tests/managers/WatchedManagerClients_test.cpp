@@ -161,7 +161,7 @@ TYPED_TEST(WatchedManagerClient, SubscribesItselfThenWatchesTheService) {
         return android::NO_ERROR;
     });
     EXPECT_EQ(0, client->init());
-    EXPECT_THAT(this->lines(), ElementsAre("D init: E", TypeParam::kConnected));
+    EXPECT_EQ((Lines{"D init: E", TypeParam::kConnected}), this->lines());
     ASSERT_THAT(this->codes(), ElementsAre(kSubscribe));
     EXPECT_EQ(this->requestWith(client), this->mRemote->lastTransaction().request);
     EXPECT_THAT(linksAtSubscription, ElementsAre(0));
@@ -218,7 +218,7 @@ TYPED_TEST(WatchedManagerClient, ForgetsTheServiceThatRefusesIt) {
     this->mRemote->answer(numbers({STATUS_BROKEN_PIPE}));
     const auto client = this->makeClient();
     EXPECT_EQ(STATUS_BROKEN_PIPE, client->init());
-    EXPECT_THAT(this->lines(), ElementsAre("D init: E", "E subscribing to service failed"));
+    EXPECT_EQ((Lines{"D init: E", "E subscribing to service failed"}), this->lines());
     EXPECT_EQ(0, this->mRemote->linkCalls());
     EXPECT_EQ(STATUS_INVALID_STATE, this->operation(client));
     EXPECT_EQ(0, client->deinit());
@@ -230,7 +230,7 @@ TYPED_TEST(WatchedManagerClient, UnsubscribesFromAServiceThatCannotBeWatched) {
     this->mRemote->setLinkResult(android::INVALID_OPERATION);
     const auto client = this->makeClient();
     EXPECT_EQ(STATUS_UNKNOWN_ERROR, client->init());
-    EXPECT_THAT(this->lines(), ElementsAre("D init: E", TypeParam::kLinkFailed));
+    EXPECT_EQ((Lines{"D init: E", TypeParam::kLinkFailed}), this->lines());
     ASSERT_THAT(this->codes(), ElementsAre(kSubscribe, kUnsubscribe));
     EXPECT_EQ(this->requestWith(client), this->mRemote->lastTransaction().request);
     EXPECT_EQ(STATUS_INVALID_STATE, this->operation(client));
@@ -250,7 +250,7 @@ TYPED_TEST(WatchedManagerClient, CannotWatchAServiceThatDiedMeanwhile) {
     });
     const auto client = this->makeClient();
     EXPECT_EQ(STATUS_UNKNOWN_ERROR, client->init());
-    EXPECT_THAT(this->lines(), ElementsAre("D init: E", TypeParam::kLinkFailed));
+    EXPECT_EQ((Lines{"D init: E", TypeParam::kLinkFailed}), this->lines());
     EXPECT_EQ(0, this->mCaller.deaths);
 }
 
@@ -272,7 +272,7 @@ TYPED_TEST(WatchedManagerClient, UnsubscribesThenEndsTheWatch) {
         return android::NO_ERROR;
     });
     EXPECT_EQ(0, client->deinit());
-    EXPECT_THAT(this->lines(), ElementsAre("D deinit: E", "D deinit: X"));
+    EXPECT_EQ((Lines{"D deinit: E", "D deinit: X"}), this->lines());
     ASSERT_THAT(this->codes(), ElementsAre(kUnsubscribe));
     EXPECT_EQ(this->requestWith(client), this->mRemote->lastTransaction().request);
     EXPECT_THAT(unlinksAtUnsubscription, ElementsAre(0));
@@ -291,7 +291,7 @@ TYPED_TEST(WatchedManagerClient, CallsNobodyWhenItWasNeverInitialised) {
     this->addService();
     const auto client = this->makeClient();
     EXPECT_EQ(0, client->deinit());
-    EXPECT_THAT(this->lines(), ElementsAre("D deinit: E", "D deinit: X"));
+    EXPECT_EQ((Lines{"D deinit: E", "D deinit: X"}), this->lines());
     EXPECT_THAT(this->mRemote->transactions(), IsEmpty());
     EXPECT_EQ(0, this->mRemote->unlinkCalls());
 }
@@ -304,8 +304,8 @@ TYPED_TEST(WatchedManagerClient, HandsEventsToTheCallback) {
     EXPECT_EQ(0, TypeParam::deliver(*client, &record));
     EXPECT_EQ(0, TypeParam::deliver(*client, nullptr));
     EXPECT_THAT(this->mCaller.records, ElementsAre(&record, nullptr));
-    EXPECT_THAT(this->lines(), ElementsAre(TypeParam::eventLine(client.get()),
-                                           TypeParam::eventLine(client.get())));
+    EXPECT_EQ((Lines{TypeParam::eventLine(client.get()), TypeParam::eventLine(client.get())}),
+              this->lines());
     EXPECT_THAT(this->mRemote->transactions(), IsEmpty());
 }
 
@@ -319,7 +319,7 @@ TYPED_TEST(WatchedManagerClient, HandsOnTheRecordThatLiesInTheRequest) {
     EXPECT_EQ(android::NO_ERROR, client->transact(1, data, &reply));
     ASSERT_THAT(this->mCaller.records, SizeIs(1));
     EXPECT_EQ(data.data() + data.dataSize() - sizeof(Record), this->mCaller.records[0]);
-    EXPECT_THAT(static_cast<Record*>(this->mCaller.records[0]), HoldsRecords(1u));
+    EXPECT_TRUE(holdsRecords(static_cast<Record*>(this->mCaller.records[0]), 1));
     EXPECT_EQ(parcelBytes(numbers({0})), bytesOf(reply));
 }
 
@@ -337,8 +337,8 @@ TYPED_TEST(WatchedManagerClient, DropsEventsWithoutACallback) {
     using Client = typename TypeParam::Client;
     const auto client = this->connect(new Client(nullptr, noteDeath, &this->mCaller));
     EXPECT_EQ(0, TypeParam::deliver(*client, nullptr));
-    EXPECT_THAT(this->lines(),
-                ElementsAre(TypeParam::eventLine(client.get()), TypeParam::kCallbackMissing));
+    EXPECT_EQ((Lines{TypeParam::eventLine(client.get()), TypeParam::kCallbackMissing}),
+              this->lines());
     EXPECT_THAT(this->mRemote->transactions(), IsEmpty());
 }
 
@@ -349,8 +349,7 @@ TYPED_TEST(WatchedManagerClient, UnsubscribesAtEveryEventWithoutAContext) {
     for (int i = 0; i < 2; ++i) {
         clearLog();
         EXPECT_EQ(0, TypeParam::deliver(*client, nullptr));
-        EXPECT_THAT(this->lines(),
-                    ElementsAre(TypeParam::eventLine(client.get()), kContextMissing));
+        EXPECT_EQ((Lines{TypeParam::eventLine(client.get()), kContextMissing}), this->lines());
         EXPECT_EQ(this->requestWith(client), this->mRemote->lastTransaction().request);
     }
     // The client does not count itself as unsubscribed.
@@ -364,9 +363,9 @@ TYPED_TEST(WatchedManagerClient, DropsEverythingWhenMadeWithoutArguments) {
     EXPECT_THAT(this->lines(), IsEmpty());
     EXPECT_EQ(0, TypeParam::deliver(*client, nullptr));
     client->binderDied(nullptr);
-    EXPECT_THAT(this->lines(),
-                ElementsAre(TypeParam::eventLine(client.get()), TypeParam::kCallbackMissing,
-                            TypeParam::kDied, "E callback is null"));
+    EXPECT_EQ((Lines{TypeParam::eventLine(client.get()), TypeParam::kCallbackMissing,
+                     TypeParam::kDied, "E callback is null"}),
+              this->lines());
 }
 
 TYPED_TEST(WatchedManagerClient, NeedsNoServiceToDropWhatHasNoContext) {
@@ -374,8 +373,9 @@ TYPED_TEST(WatchedManagerClient, NeedsNoServiceToDropWhatHasNoContext) {
     const sp<Client> client = new Client(noteEvent<typename TypeParam::Record>, noteDeath, nullptr);
     EXPECT_EQ(0, TypeParam::deliver(*client, nullptr));
     client->binderDied(nullptr);
-    EXPECT_THAT(this->lines(), ElementsAre(TypeParam::eventLine(client.get()), kContextMissing,
-                                           TypeParam::kDied, kContextMissing));
+    EXPECT_EQ((Lines{TypeParam::eventLine(client.get()), kContextMissing, TypeParam::kDied,
+                     kContextMissing}),
+              this->lines());
 }
 
 // ---- death ----
@@ -384,7 +384,7 @@ TYPED_TEST(WatchedManagerClient, TellsTheCallerOnceThatTheServiceDied) {
     const auto client = this->connect(this->makeClient());
     this->mRemote->die();
     EXPECT_EQ(1, this->mCaller.deaths);
-    EXPECT_THAT(this->lines(), ElementsAre(TypeParam::kDied));
+    EXPECT_EQ((Lines{TypeParam::kDied}), this->lines());
     EXPECT_THAT(this->mRemote->transactions(), IsEmpty());
     // The client stays as it is until it is told otherwise.
     EXPECT_EQ(STATUS_UNKNOWN_ERROR, this->operation(client));
@@ -395,7 +395,7 @@ TYPED_TEST(WatchedManagerClient, DropsADeathWithoutACallback) {
     const auto client = this->connect(
             new Client(noteEvent<typename TypeParam::Record>, nullptr, &this->mCaller));
     this->mRemote->die();
-    EXPECT_THAT(this->lines(), ElementsAre(TypeParam::kDied, "E callback is null"));
+    EXPECT_EQ((Lines{TypeParam::kDied, "E callback is null"}), this->lines());
     EXPECT_THAT(this->mRemote->transactions(), IsEmpty());
 }
 
@@ -404,10 +404,10 @@ TYPED_TEST(WatchedManagerClient, TriesToUnsubscribeAtADeathWithoutAContext) {
     const auto client =
             this->connect(new Client(noteEvent<typename TypeParam::Record>, noteDeath, nullptr));
     this->mRemote->die();
-    EXPECT_THAT(this->lines(), ElementsAre(TypeParam::kDied, kContextMissing));
+    EXPECT_EQ((Lines{TypeParam::kDied, kContextMissing}), this->lines());
     EXPECT_THAT(this->codes(), ElementsAre(kUnsubscribe));
-    EXPECT_THAT(linesOf(TypeParam::kServiceTag),
-                ElementsAre("D Bp: unsubscribe", "E unsubscribe() error: Broken pipe"));
+    EXPECT_EQ((Lines{"D Bp: unsubscribe", "E unsubscribe() error: Broken pipe"}),
+              linesOf(TypeParam::kServiceTag));
 }
 
 TYPED_TEST(WatchedManagerClient, ReconnectsByDeinitAndInit) {
@@ -502,8 +502,8 @@ TYPED_TEST(WatchedManagerClientAlone, NeedsAServiceManager) {
     const sp<typename TypeParam::Client> client = new typename TypeParam::Client;
     clearLog();
     EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->init());
-    EXPECT_THAT(linesOf(TypeParam::kTag),
-                ElementsAre("D init: E", "E couldn't get default service manager"));
+    EXPECT_EQ((Lines{"D init: E", "E couldn't get default service manager"}),
+              linesOf(TypeParam::kTag));
     EXPECT_THAT(waits.sleeps(), IsEmpty());
 }
 
