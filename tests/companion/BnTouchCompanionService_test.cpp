@@ -63,10 +63,10 @@ class TouchCompanionStub : public ::testing::Test {
 struct StubRow {
     const char* name;
     uint32_t code;
-    ParcelWriter arguments;  // what follows the token
-    const char* operation;   // whose status the service is told to return
-    const char* call;        // what the service sees
-    ParcelWriter results;    // what follows the status in the reply
+    void (*arguments)(Parcel& request);  // what follows the token
+    const char* operation;               // whose status the service is told to return
+    const char* call;                    // what the service sees
+    void (*results)(Parcel& reply);      // what follows the status in the reply
 };
 
 const StubRow kStubRows[] = {

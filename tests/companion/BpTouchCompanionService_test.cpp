@@ -11,7 +11,6 @@
 #include <climits>
 #include <cstdio>
 #include <cstring>
-#include <functional>
 #include <set>
 #include <string>
 
@@ -46,13 +45,13 @@ const sp<ITouchCompanionClient>& callbackObject() {
 struct ProxyRow {
     const char* name;
     uint32_t code;
-    std::function<int(ITouchCompanionService&)> call;
-    ParcelWriter arguments;          // what follows the token
-    const char* entry;               // null: no entry line
-    const char* transportError;      // null: a failure is not logged
-    const char* remoteError;         // null: no status is read, or it is not logged
-    bool passesStatus = true;        // whether the remote status becomes the result
-    ParcelWriter results = nullptr;  // what follows a status of 0 in the reply
+    int (*call)(ITouchCompanionService& service);
+    void (*arguments)(Parcel& request);        // what follows the token
+    const char* entry;                         // null: no entry line
+    const char* transportError;                // null: a failure is not logged
+    const char* remoteError;                   // null: no status is read, or it is not logged
+    bool passesStatus = true;                  // whether the remote status becomes the result
+    void (*results)(Parcel& reply) = nullptr;  // what follows a status of 0 in the reply
     const char* resultLine = nullptr;
 };
 
@@ -363,7 +362,7 @@ TEST_F(TouchCompanionProxy, LeavesOutputsAloneOnFailure) {
 
 struct ParseRow {
     const char* name;
-    std::function<int(ITouchCompanionService&)> call;
+    int (*call)(ITouchCompanionService& service);
     Lines lines;
 };
 

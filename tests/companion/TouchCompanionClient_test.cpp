@@ -7,8 +7,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <functional>
-
 #include "pemaro/testkit/NativeBinder.h"
 #include "tests/companion/TouchCompanionClientTest.h"
 #include "tests/support/RecordingBinder.h"
@@ -152,7 +150,7 @@ TEST_F(TouchCompanionClientTest, HasNothingToPingBeforeInit) {
 // What an operation needs is looked at before the service, which is missed only when it is called.
 struct Operation {
     const char* name;
-    std::function<int(TouchCompanionClient&)> call;
+    int (*call)(TouchCompanionClient& client);
     int status;
     Lines lines;
 };

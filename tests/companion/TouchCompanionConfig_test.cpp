@@ -5,7 +5,6 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
-#include <functional>
 #include <numeric>
 #include <string>
 #include <vector>
@@ -35,7 +34,7 @@ int gSession;
 
 struct Operation {
     const char* what;
-    std::function<int(TouchCompanionClient&)> call;
+    int (*call)(TouchCompanionClient& client);
     uint32_t code;
     ParcelWriter arguments;
     std::string service;  // the service's own operation

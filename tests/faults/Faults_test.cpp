@@ -14,7 +14,6 @@
 #include <cerrno>
 #include <chrono>
 #include <cstring>
-#include <functional>
 #include <future>
 #include <memory>
 #include <string>
@@ -250,7 +249,7 @@ INSTANTIATE_TEST_SUITE_P(
 struct Init {
     const char* client;
     int service;
-    std::function<int(Clients&)> call;
+    int (*call)(Clients& clients);
     // The step: its transaction, and what is logged of it. A null text is no line.
     uint32_t code;
     const char* refusedInProxy;
@@ -262,7 +261,7 @@ struct Init {
     const char* absentInClient;
     const char* succeededInClient;
     // An operation, and whether a client whose init() failed has a service for it all the same.
-    std::function<int(Clients&)> operation;
+    int (*operation)(Clients& clients);
     bool keepsService;
     int deathNotices;
 };
@@ -423,9 +422,9 @@ INSTANTIATE_TEST_SUITE_P(All, InitFaults, ::testing::ValuesIn(kInits), [](const 
 struct Deinit {
     const char* client;
     int service;
-    std::function<int(Clients&)> init;
-    std::function<int(Clients&)> deinit;
-    std::function<int(Clients&)> operation;
+    int (*init)(Clients& clients);
+    int (*deinit)(Clients& clients);
+    int (*operation)(Clients& clients);
     const char* deathNotice;
 };
 
@@ -522,7 +521,7 @@ struct RecordStep {
     const char* name;
     uint32_t code;
     // What a refusal comes to, where its status is read, and what a short reply does.
-    std::function<int(int status)> refused;
+    int (*refused)(int status);
     int shortened;
     const char* refusedInProxy;
     const char* deadInProxy;
