@@ -270,12 +270,22 @@ vm_watch_boot() {
 # shellcheck disable=SC2054 # commas are QEMU's
 vm_qemu_arguments() {
     local build
+    local -a kernel
     build=$(<"$VM_EXCHANGE/build")
+    # servicemanager asks for its callers' security contexts, which exist only with SELinux on.
+    # On a busy machine the guest would find its timer too slow, and give up.
+    kernel=(console=ttyS0 quiet panic=-1 no_timer_check lsm=selinux selinux=1)
+    if [[ ${ZELK_VM_ACCEL:-tcg} == kvm ]]; then
+        set -- -accel kvm -cpu host "$@"
+    else
+        # What QEMU has translated it finds again by its address: where each process has its libraries at addresses
+        # of its own, it translates them anew for each.
+        kernel+=(norandmaps)
+        set -- -accel "tcg,thread=multi" "$@"
+    fi
     VM_QEMU=(-nodefaults -display none -no-reboot -smp "$VM_PROCESSORS" -m 2048
         -kernel "$VM_KERNEL/vmlinuz" -initrd "$VM_INITRAMFS"
-        # servicemanager asks for its callers' security contexts, which exist only with SELinux on.
-        # On a busy machine the guest would find its timer too slow, and give up.
-        -append "console=ttyS0 quiet panic=-1 no_timer_check lsm=selinux selinux=1"
+        -append "${kernel[*]}"
         -fsdev "local,id=host,path=/,security_model=none,readonly=on,multidevs=remap"
         -device virtio-9p-pci,fsdev=host,mount_tag=host
         -fsdev "local,id=build,path=${build//,/,,},security_model=none,multidevs=remap"
@@ -283,11 +293,6 @@ vm_qemu_arguments() {
         -fsdev "local,id=exchange,path=${VM_EXCHANGE//,/,,},security_model=none"
         -device virtio-9p-pci,fsdev=exchange,mount_tag=exchange
         "$@")
-    if [[ ${ZELK_VM_ACCEL:-tcg} == kvm ]]; then
-        VM_QEMU+=(-accel kvm -cpu host)
-    else
-        VM_QEMU+=(-accel "tcg,thread=multi")
-    fi
 }
 
 # Before the command runs there is nobody to tell.
