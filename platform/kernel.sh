@@ -16,7 +16,7 @@ ensure_kernel() {
     make_cached kernel "$VM_KERNEL" 200 "fetching Debian's kernel (about 70 MB)" unpack_kernel
 }
 
-# Sets VM_INITRAMFS. The kernel is the newest that the archive had when it was first needed.
+# Sets VM_VMLINUX and VM_INITRAMFS. The kernel is the newest that the archive had when it was first needed.
 ensure_vm_image() {
     local folder key
     ensure_kernel
@@ -25,6 +25,9 @@ ensure_vm_image() {
     folder=$ZELK_CACHE/initramfs/$key
     make_cached initramfs "$folder" 20 "making the initramfs" make_initramfs "$VM_KERNEL"
     VM_INITRAMFS=$folder/initramfs
+    folder=$VM_KERNEL-uncompressed
+    make_cached uncompressed "$folder" 100 "uncompressing the kernel" uncompress_kernel "$VM_KERNEL/vmlinuz"
+    VM_VMLINUX=$folder/vmlinux
 }
 
 # Only the image and the modules named above are kept, out of 400 MB.
@@ -56,4 +59,24 @@ make_initramfs() {
         printf '/modules/%s.ko\n' "$module" >>"$root/modules/order"
     done
     (cd "$root" && find . | cpio --quiet -o -H newc) >"$scratch/result/initramfs"
+}
+
+# The kernel of a bzImage, which would take half of an emulated boot to uncompress itself. Where it lies is told in the
+# image's header: how many sectors the code in front of it has, and then its place behind these and its length
+# (the boot protocol's setup_sects, payload_offset and payload_length).
+uncompress_kernel() {
+    local image=$1 scratch=$2 sectors offset length
+    sectors=$(image_number "$image" 0x1f1 1)
+    offset=$(image_number "$image" 0x248 4)
+    length=$(image_number "$image" 0x24c 4)
+    mkdir -p -- "$scratch/result"
+    # Behind the compressed data is the length of the other.
+    dd "if=$image" bs=64K iflag=skip_bytes,count_bytes "skip=$(((sectors + 1) * 512 + offset))" "count=$length" status=none |
+        xz -dc --single-stream >"$scratch/result/vmlinux" ||
+        die "the kernel in $image cannot be uncompressed"
+}
+
+# image_number <file> <offset> <bytes>
+image_number() {
+    od -An -t "u$3" -j "$2" -N "$3" -- "$1" | tr -d ' '
 }

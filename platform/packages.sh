@@ -32,7 +32,7 @@ PACKAGES_SHELL=(bash-completion dropbear-bin man-db openssh-client)
 # What formats the sources and looks for mistakes in them.
 PACKAGES_LINT=(clang-format clang-tidy cppcheck shellcheck)
 # The machine that runs a kernel with the Binder driver.
-PACKAGES_VM=(qemu-system-x86 busybox-static cpio)
+PACKAGES_VM=(qemu-system-x86 busybox-static cpio xz-utils)
 
 # check_host [os-release file] [machine]
 check_host() {

@@ -284,7 +284,7 @@ vm_qemu_arguments() {
         set -- -accel "tcg,thread=multi" "$@"
     fi
     VM_QEMU=(-nodefaults -display none -no-reboot -smp "$VM_PROCESSORS" -m 2048
-        -kernel "$VM_KERNEL/vmlinuz" -initrd "$VM_INITRAMFS"
+        -kernel "$VM_VMLINUX" -initrd "$VM_INITRAMFS"
         -append "${kernel[*]}"
         -fsdev "local,id=host,path=/,security_model=none,readonly=on,multidevs=remap"
         -device virtio-9p-pci,fsdev=host,mount_tag=host
