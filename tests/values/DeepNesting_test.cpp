@@ -14,13 +14,15 @@
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
 #include "pemaro/testkit/LogRecorder.h"
+#include "tests/support/Sanitizers.h"
 
 namespace pemaro {
 namespace {
 
 using test::LogRecorder;
 
-constexpr size_t kMebibyte = 1 << 20;
+// A mebibyte; one thread at work is nothing to the thread sanitizer, which takes half a minute for as much.
+constexpr size_t kTextBytes = test::kThreadSanitizer ? 1 << 17 : 1 << 20;
 constexpr size_t kStackBytes = 256 * 1024;
 constexpr double kLinearSeconds = 60;
 
@@ -75,7 +77,7 @@ void useMap(SerializableMap& map, const std::string& text) {
 }
 
 TEST(DeepNesting, MapsAreReadWrittenCopiedMergedAndDestroyed) {
-    const std::string text = nested("{\"a\":", "{\"a\":1}", "}", kMebibyte / 6);
+    const std::string text = nested("{\"a\":", "{\"a\":1}", "}", kTextBytes / 6);
     onSmallStack([&text] {
         SerializableMap map;
         EXPECT_EQ(map.unserialize(text), 0);
@@ -84,7 +86,7 @@ TEST(DeepNesting, MapsAreReadWrittenCopiedMergedAndDestroyed) {
 }
 
 TEST(DeepNesting, ArraysAreReadWrittenCopiedAndDestroyed) {
-    const std::string text = nested("[", "", "]", kMebibyte / 2);
+    const std::string text = nested("[", "", "]", kTextBytes / 2);
     onSmallStack([&text] {
         SerializableMapArray array;
         EXPECT_EQ(array.unserialize(text), 0);
@@ -103,7 +105,7 @@ TEST(DeepNesting, ArraysAreReadWrittenCopiedAndDestroyed) {
 }
 
 TEST(DeepNesting, MapsAndArraysMayAlternate) {
-    const std::string text = nested("{\"a\":[", "{\"a\":1}", "]}", kMebibyte / 8);
+    const std::string text = nested("{\"a\":[", "{\"a\":1}", "]}", kTextBytes / 8);
     onSmallStack([&text] {
         SerializableMap map;
         EXPECT_EQ(map.unserialize(text), 0);
@@ -113,8 +115,8 @@ TEST(DeepNesting, MapsAndArraysMayAlternate) {
 }
 
 TEST(DeepNesting, UnclosedContainersAreRefused) {
-    const std::string maps = repeat("{\"a\":", kMebibyte / 5);
-    const std::string arrays(kMebibyte, '[');
+    const std::string maps = repeat("{\"a\":", kTextBytes / 5);
+    const std::string arrays(kTextBytes, '[');
     onSmallStack([&] {
         SerializableMap map;
         EXPECT_EQ(map.unserialize(maps), STATUS_INVALID_FORMAT);
@@ -128,7 +130,7 @@ TEST(DeepNesting, UnclosedContainersAreRefused) {
 }
 
 TEST(DeepNesting, AFailureInTheInnermostTakesAllAlong) {
-    constexpr size_t kDepth = kMebibyte / 6;
+    constexpr size_t kDepth = kTextBytes / 6;
     const std::string text = nested("{\"a\":", "{}", "}", kDepth);
     onSmallStack([&text] {
         LogRecorder::instance().clear();
@@ -141,7 +143,7 @@ TEST(DeepNesting, AFailureInTheInnermostTakesAllAlong) {
 
 TEST(LongTexts, ManyEntriesAreRead) {
     std::string text = "{\"k0\":0";
-    for (int i = 1; text.size() < kMebibyte; ++i) {
+    for (int i = 1; text.size() < kTextBytes; ++i) {
         // A third of the keys comes in ascending order, the others do not.
         const std::string key = std::to_string(i % 3 == 0 ? i : 1000000 - i);
         text += ",\"k" + key + "\":" + std::to_string(i);
@@ -166,10 +168,10 @@ struct Hostile {
 
 // Texts in which a search has a long way to go from each of many places.
 TEST(LongTexts, HostileTextsTakeLinearTime) {
-    constexpr size_t k = kMebibyte / 16;
+    constexpr size_t k = kTextBytes / 16;
     const Hostile kHostile[] = {
-            {"no comma", "[" + std::string(kMebibyte, 'x') + "]"},
-            {"no end of any token", "[" + std::string(kMebibyte, 'x') + "\"]"},
+            {"no comma", "[" + std::string(kTextBytes, 'x') + "]"},
+            {"no end of any token", "[" + std::string(kTextBytes, 'x') + "\"]"},
             {"no end, in either reading",
              "[" + repeat("x\\\"", k) + "\"" + repeat("y", k) + "\"]\""},
             {"odd quotes", "[" + repeat("\"a ", k) + "\"]"},
@@ -179,13 +181,13 @@ TEST(LongTexts, HostileTextsTakeLinearTime) {
             {"unbalanced inside", "[" + repeat("[}{]", k) + "]"},
             {"open strings in nested", "[" + nested("[", "x\"", "]", k) + "]"},
             {"keys without values", "{" + repeat("\"a\":x", k) + "\"}"},
-            {"one long key", "{\"" + std::string(kMebibyte, 'k') + "\":1}"},
+            {"one long key", "{\"" + std::string(kTextBytes, 'k') + "\":1}"},
             {"escaped quotes", "{\"" + repeat("\\\"", k) + "\":1}"},
             {"white space", "{" + repeat(" ", k) + "\"a\"" + repeat(" ", k) + ":" + repeat(" ", k) +
                                     "1" + repeat(" ", k) + "}" + repeat(" ", k)},
             {"equal keys", "{" + repeat("\"a\":{\"b\":1},", k) + "\"a\":2}"},
-            {"commas behind the end", "[1]" + std::string(kMebibyte, ',')},
-            {"no commas behind the end", "{\"a\":1}" + std::string(kMebibyte, 'x')},
+            {"commas behind the end", "[1]" + std::string(kTextBytes, ',')},
+            {"no commas behind the end", "{\"a\":1}" + std::string(kTextBytes, 'x')},
     };
     for (const Hostile& hostile : kHostile) {
         SCOPED_TRACE(hostile.name);

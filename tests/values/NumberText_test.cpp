@@ -14,10 +14,12 @@
 #include <limits>
 #include <random>
 
+#include "tests/support/Sanitizers.h"
+
 namespace pemaro {
 namespace {
 
-constexpr int kRandomNumbers = 300000;
+constexpr int kRandomNumbers = test::kAddressSanitizer || test::kThreadSanitizer ? 30000 : 300000;
 
 uint64_t seedOfTheRun() {
     const char* const value = getenv("ZELK_SEED");

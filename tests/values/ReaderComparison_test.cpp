@@ -12,6 +12,7 @@
 
 #include "pemaro/SerializableMap.h"
 #include "pemaro/SerializableMapArray.h"
+#include "tests/support/Sanitizers.h"
 #include "tests/values/reference/Comparison.h"
 
 namespace pemaro {
@@ -20,19 +21,8 @@ namespace {
 using reference::As;
 using reference::Comparison;
 
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
-#define ZELK_SANITIZED 1
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer) || __has_feature(thread_sanitizer)
-#define ZELK_SANITIZED 1
-#endif
-#endif
-
-#ifdef ZELK_SANITIZED
-constexpr unsigned long kDefaultTexts = 50000;
-#else
-constexpr unsigned long kDefaultTexts = 1000000;
-#endif
+constexpr unsigned long kDefaultTexts =
+        test::kAddressSanitizer || test::kThreadSanitizer ? 50000 : 1000000;
 
 unsigned long setting(const char* name, unsigned long otherwise) {
     const char* const value = getenv(name);
