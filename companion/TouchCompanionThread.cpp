@@ -4,6 +4,7 @@
 #include "companion/TouchCompanionThread.h"
 
 #include <log/log.h>
+#include <unistd.h>
 #include <utils/Timers.h>
 
 namespace pemaro {
@@ -13,11 +14,11 @@ namespace {
 // A wait takes 16 ms. One that takes so much longer waits for somebody who is dead.
 constexpr nsecs_t kOverdue = ms2ns(1000);
 
-// How often end() looks whether the thread still runs where nothing tells it.
-constexpr nsecs_t kLook = ms2ns(10);
+// How often end() looks whether the thread still runs.
+constexpr useconds_t kLookMicroseconds = 10000;
 
 // Between passes over a ring that paces nothing by itself.
-constexpr nsecs_t kPause = ms2ns(16);
+constexpr useconds_t kPauseMicroseconds = 16000;
 
 }  // namespace
 
@@ -25,31 +26,36 @@ TouchCompanionThread::TouchCompanionThread(const MappedBlock& block,
                                            FrameDelivery::DataCallback callback, void* context)
         : android::Thread(true /* canCallJava */), mDelivery(block, callback, context, this) {}
 
-void TouchCompanionThread::requestExit() {
-    android::Thread::requestExit();
-    android::AutoMutex lock(mStateLock);
-    mStateChanged.broadcast();
-}
-
 void TouchCompanionThread::end() {
     requestExit();
-    {
-        android::AutoMutex lock(mStateLock);
-        if (mHasSelf && pthread_equal(mSelf, pthread_self()) != 0) {
+    if (isSelf()) {
+        return;
+    }
+    while (isRunning()) {
+        if (isOverdue()) {
+            ALOGE("the recording thread is left behind: a wait in the shared memory does not "
+                  "end");
             return;
         }
-        while (isRunning()) {
-            if (mWaitingSince != 0 &&
-                systemTime(SYSTEM_TIME_MONOTONIC) - mWaitingSince > kOverdue) {
-                mLeftBehind = true;
-                ALOGE("the recording thread is left behind: a wait in the shared memory does not "
-                      "end");
-                return;
-            }
-            mStateChanged.waitRelative(mStateLock, kLook);
-        }
+        usleep(kLookMicroseconds);
     }
     requestExitAndWait();
+}
+
+/// Whether this is the thread that calls.
+bool TouchCompanionThread::isSelf() {
+    android::AutoMutex lock(mStateLock);
+    return mHasSelf && pthread_equal(mSelf, pthread_self()) != 0;
+}
+
+/// Whether its wait is; from then on it is left behind.
+bool TouchCompanionThread::isOverdue() {
+    android::AutoMutex lock(mStateLock);
+    if (mWaitingSince == 0 || systemTime(SYSTEM_TIME_MONOTONIC) - mWaitingSince <= kOverdue) {
+        return false;
+    }
+    mLeftBehind = true;
+    return true;
 }
 
 bool TouchCompanionThread::threadLoop() {
@@ -59,10 +65,10 @@ bool TouchCompanionThread::threadLoop() {
         mHasSelf = true;
     }
     mDelivery.pass(mStatistics);
-    android::AutoMutex lock(mStateLock);
-    if (mDelivery.isStuck() && !exitPending()) {
-        mStateChanged.waitRelative(mStateLock, kPause);
+    if (mDelivery.isStuck()) {
+        usleep(kPauseMicroseconds);
     }
+    android::AutoMutex lock(mStateLock);
     return !mLeftBehind;
 }
 

@@ -2,7 +2,6 @@
 #pragma once
 
 #include <pthread.h>
-#include <utils/Condition.h>
 #include <utils/Mutex.h>
 #include <utils/Thread.h>
 
@@ -19,8 +18,6 @@ class TouchCompanionThread : public android::Thread, private WaitWatch {
     TouchCompanionThread(const MappedBlock& block, FrameDelivery::DataCallback callback,
                          void* context);
 
-    void requestExit() override;
-
     /// Asks the thread to exit and waits until it has: no callback runs afterwards. Two threads are
     /// not waited for: the calling one, which ends when its callback returns, and one whose wait in
     /// the shared memory is overdue by a second, which is left behind with what it needs, and which
@@ -31,11 +28,12 @@ class TouchCompanionThread : public android::Thread, private WaitWatch {
     bool threadLoop() override;
     void waitBegins() override;
     bool waitEnded() override;
+    bool isSelf();
+    bool isOverdue();
 
     FrameDelivery mDelivery;
     FrameStatistics mStatistics;
     android::Mutex mStateLock;
-    android::Condition mStateChanged;
     pthread_t mSelf{};
     bool mHasSelf = false;
     int64_t mWaitingSince = 0;  ///< nanoseconds, 0 outside of a wait
