@@ -8,7 +8,10 @@ install(TARGETS zelkclient EXPORT zelkclientTargets COMPONENT Library)
 install(TARGETS zelktestkit zelktestkit_recorder EXPORT zelkclientTargets COMPONENT Development)
 if(ZELK_BUILD_TOOLS)
   install(TARGETS zelkctl zelk-touchstack COMPONENT Tools)
-  # Where bash, zsh and man look for them.
+endif()
+# Where bash, zsh and man look for them.
+get_property(references GLOBAL PROPERTY ZELK_REFERENCE_FILES)
+if(references)
   foreach(program zelkctl zelk-touchstack)
     install(FILES ${ZELK_REFERENCE_DIR}/${program}.bash
       DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME ${program} COMPONENT Tools)
