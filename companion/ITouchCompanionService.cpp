@@ -9,6 +9,7 @@
 
 #include <log/log.h>
 
+#include <algorithm>
 #include <cstdlib>
 #include <limits>
 #include <memory>
@@ -419,7 +420,7 @@ using Buffer = std::unique_ptr<void, decltype(&free)>;
 // memory.
 Buffer allocateConfig(size_t size) {
     constexpr size_t kMost = std::numeric_limits<ptrdiff_t>::max();
-    Buffer buffer(size <= kMost ? malloc(size > 0 ? size : 1) : nullptr, &free);
+    Buffer buffer(size <= kMost ? malloc(std::max<size_t>(size, 1)) : nullptr, &free);
     if (buffer == nullptr) {
         ALOGE("Error! could not allocate buffer for binary config data.");
     }

@@ -42,7 +42,7 @@ using Service = ITouchCompanionService;
 bool writeThroughKernel(void* to, const void* from, size_t size) {
     iovec source = {const_cast<void*>(from), size};
     iovec target = {to, size};
-    return process_vm_writev(getpid(), &source, 1, &target, 1, 0) >= 0 || errno != EFAULT;
+    return process_vm_writev(getpid(), &source, 1, &target, 1, 0) != -1 || errno != EFAULT;
 }
 
 // Where the service's memory is mapped, if a control block can be worked with there; else null, with
@@ -188,8 +188,7 @@ int TouchCompanionClient::mapBlock(Service& service, MappedBlock& block) {
     block.cblk = usableBlock(block.memory);
     sp<android::IMemory> memory = block.memory;  // takes what is let go, outside the guard
     ClientGuard guard;
-    mFrameCount = 0;
-    mStartTime = 0;
+    mFrameCount = 0;  // the first frame sets the start's time
     mLastSecond = 0;
     std::swap(mCblkMemory, memory);
     mCblk = block.cblk;

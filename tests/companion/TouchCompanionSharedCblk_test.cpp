@@ -43,6 +43,18 @@ class SharedPage {
     uint32_t* mWord;
 };
 
+// Leaves ones where the next function has its variables.
+__attribute__((noinline)) void soilTheStack() {
+    volatile uint8_t bytes[2048];
+    for (size_t i = 0; i < sizeof(bytes); ++i) {
+        bytes[i] = 0xff;
+    }
+}
+
+__attribute__((noinline)) void makeBlock(void* at) {
+    new (at) TouchCompanionSharedCblk;
+}
+
 // Runs `child` in a process of its own.
 template <typename Child>
 pid_t inChild(Child child) {
@@ -97,6 +109,16 @@ TEST(TouchCompanionSharedCblk, HasItsFieldsWhereTheOtherSideLooks) {
     EXPECT_EQ(6u, page.at<uint32_t>(128));
     EXPECT_EQ(reinterpret_cast<uint8_t*>(&block), reinterpret_cast<uint8_t*>(&block.mutex));
     EXPECT_EQ(reinterpret_cast<uint8_t*>(&block) + 40, reinterpret_cast<uint8_t*>(&block.cond));
+}
+
+// The attributes of both are made from nothing, whatever lay in their place.
+TEST(TouchCompanionSharedCblk, MakesTheSameMutexAndConditionEachTime) {
+    alignas(TouchCompanionSharedCblk) uint8_t first[sizeof(TouchCompanionSharedCblk)] = {};
+    alignas(TouchCompanionSharedCblk) uint8_t second[sizeof(TouchCompanionSharedCblk)] = {};
+    makeBlock(first);
+    soilTheStack();
+    makeBlock(second);
+    EXPECT_EQ(0, memcmp(first, second, offsetof(TouchCompanionSharedCblk, read)));
 }
 
 TEST(TouchCompanionSharedCblk, ExcludesTheOtherProcess) {
