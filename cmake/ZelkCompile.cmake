@@ -31,6 +31,8 @@ endif()
 if(ZELK_SANITIZE)
   target_compile_options(zelk_options INTERFACE -fsanitize=${ZELK_SANITIZE} -fno-omit-frame-pointer)
   target_link_options(zelk_options INTERFACE -fsanitize=${ZELK_SANITIZE})
+  # A container's index beside its elements is seen where it stays within the memory, too.
+  target_compile_definitions(zelk_options INTERFACE _GLIBCXX_ASSERTIONS)
   if(ZELK_SANITIZE MATCHES "undefined")
     # vptr checks need RTTI of the platform's classes, which its libraries do not promise.
     target_compile_options(zelk_options INTERFACE -fno-sanitize-recover=all -fno-sanitize=vptr)

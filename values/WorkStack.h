@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <cassert>
 #include <cstddef>
 #include <cstring>
 #include <new>
@@ -24,8 +25,14 @@ class WorkStack {
     size_t size() const { return static_cast<size_t>(mEnd - mBegin); }
     T* begin() { return mBegin; }
     T* end() { return mEnd; }
-    T& operator[](size_t index) { return mBegin[index]; }
-    T& top() { return mEnd[-1]; }
+    T& operator[](size_t index) {
+        assert(index < size());
+        return mBegin[index];
+    }
+    T& top() {
+        assert(!empty());
+        return mEnd[-1];
+    }
 
     void push(const T& record) {
         if (mEnd == mLimit) grow();
@@ -33,10 +40,16 @@ class WorkStack {
         ++mEnd;
     }
 
-    T pop() { return *--mEnd; }
+    T pop() {
+        assert(!empty());
+        return *--mEnd;
+    }
 
     /// Removes what was pushed last; `size` is not above size().
-    void shrink(size_t size) { mEnd = mBegin + size; }
+    void shrink(size_t size) {
+        assert(size <= this->size());
+        mEnd = mBegin + size;
+    }
 
   private:
     static_assert(kInline >= 2);
