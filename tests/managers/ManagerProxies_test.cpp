@@ -420,6 +420,14 @@ TEST_F(ProfileListProxy, AppendsNothingForNoneOrANegativeNumber) {
     EXPECT_THAT(mNames, ElementsAre("held"));
 }
 
+// The driver delivers a stub's positive result as a reply without anything.
+TEST_F(ProfileListProxy, TakesAnEmptyReplyForNoNamesAndSuccess) {
+    EXPECT_EQ(0, get(0, {}, nothing));
+    mRemote->answer([](Parcel&) {});
+    EXPECT_EQ(0, IHandBiometricManagerService::asInterface(mRemote)->getProfileList(mNames));
+    EXPECT_THAT(mNames, ElementsAre("held"));
+}
+
 TEST_F(ProfileListProxy, StopsWhereTheReplyEnds) {
     EXPECT_EQ(STATUS_CORRUPT_DATA, get(2, {"alice"}, nothing));
     EXPECT_THAT(mNames, ElementsAre("held", "alice"));
