@@ -22,16 +22,17 @@
 
 namespace pemaro::test {
 
-#ifdef ZELK_ADDRESS_SANITIZER
-inline constexpr bool kAddressSanitizer = true;
-#else
-inline constexpr bool kAddressSanitizer = false;
-#endif
-
 #ifdef ZELK_THREAD_SANITIZER
 inline constexpr bool kThreadSanitizer = true;
 #else
 inline constexpr bool kThreadSanitizer = false;
+#endif
+
+/// Either of them.
+#if defined(ZELK_ADDRESS_SANITIZER) || defined(ZELK_THREAD_SANITIZER)
+inline constexpr bool kSanitized = true;
+#else
+inline constexpr bool kSanitized = false;
 #endif
 
 }  // namespace pemaro::test

@@ -19,7 +19,7 @@
 namespace pemaro {
 namespace {
 
-constexpr int kRandomNumbers = test::kAddressSanitizer || test::kThreadSanitizer ? 30000 : 300000;
+constexpr int kRandomNumbers = test::kSanitized ? 30000 : 300000;
 
 uint64_t seedOfTheRun() {
     const char* const value = getenv("ZELK_SEED");

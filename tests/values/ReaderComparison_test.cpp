@@ -21,8 +21,7 @@ namespace {
 using reference::As;
 using reference::Comparison;
 
-constexpr unsigned long kDefaultTexts =
-        test::kAddressSanitizer || test::kThreadSanitizer ? 50000 : 1000000;
+constexpr unsigned long kDefaultTexts = test::kSanitized ? 50000 : 1000000;
 
 unsigned long setting(const char* name, unsigned long otherwise) {
     const char* const value = getenv(name);

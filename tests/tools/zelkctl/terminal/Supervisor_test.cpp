@@ -11,12 +11,13 @@
 #include <string>
 #include <thread>
 
+#include "tests/support/Sanitizers.h"
 #include "tools/common/ExitStatus.h"
 #include "tools/common/StandardOutput.h"
 
 using testing::ExitedWithCode;
 
-#ifdef __SANITIZE_THREAD__
+#ifdef ZELK_THREAD_SANITIZER
 // A process that ends while threads are at work would be kept for a second, for races to show: too long for
 // what is to end at once.
 extern "C" const char* __tsan_default_options() {
