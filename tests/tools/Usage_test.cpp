@@ -365,6 +365,22 @@ TEST(Help, OfACommandIsWhatItsOptionPrints) {
     }
 }
 
+// A command that is typed first is the only one that is made.
+TEST(Help, OfEachCommandIsThatOfTheCommandAlone) {
+    const std::string all = runLine("zelkctl help --json").output;
+    const std::string name = "{\"name\":\"";
+    size_t commands = 0;
+    for (size_t at = all.find("\"commands\":"); (at = all.find(name, at)) != std::string::npos;
+         ++commands) {
+        at += name.size();
+        const std::string command = all.substr(at, all.find('"', at) - at);
+        EXPECT_EQ(runLine("zelkctl help " + command).output,
+                  runLine("zelkctl " + command + " --help").output);
+    }
+    EXPECT_LT(20u, commands);
+    EXPECT_EQ(runLine("zelkctl help words").output, runLine("zelkctl words --help").output);
+}
+
 TEST(Status, IsExplained) {
     EXPECT_EQ("0x4000000B  1073741835  Invalid state\n",
               runLine("zelkctl status 0x4000000B").output);

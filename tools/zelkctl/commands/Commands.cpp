@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/commands/Commands.h"
 
+#include <algorithm>
+#include <iterator>
+
 #include "tools/zelkctl/commands/CheckCommand.h"
 #include "tools/zelkctl/commands/frames/FramesCommands.h"
 
@@ -10,32 +13,44 @@
 
 namespace pemaro::zelkctl {
 
-void addAllCommands(CLI::App& app, Action& action) {
-    addHelpCommand(app, action);
-    addStatusCommand(app, action);
-    addInfoCommand(app, action);
-    addPingCommand(app, action);
-    addCheckCommand(app, action);
+namespace {
+
+struct Row {
+    std::string_view name;
+    void (*add)(CLI::App& app, Action& action);
+};
+
+constexpr Row kRows[] = {
+        {"help", addHelpCommand},        {"status", addStatusCommand},
+        {"info", addInfoCommand},        {"ping", addPingCommand},
+        {"check", addCheckCommand},
 #ifdef ZELK_WITH_TRACE
-    addTraceCommand(app, action);
+        {"trace", addTraceCommand},
 #endif
-    addRecordCommand(app, action);
-    addRecordFileCommand(app, action);
-    addFramesCommands(app, action);
-    addCommandCommand(app, action);
-    addFilterCommand(app, action);
-    addPropertyCommands(app, action);
-    addAfeCommands(app, action);
-    addEventCommand(app, action);
-    addInspectCommand(app, action);
-    addPacketSizeCommand(app, action);
-    addAuthCommand(app, action);
-    addConfigCommands(app, action);
-    addSessionCommands(app, action);
-    addTouchCommands(app, action);
-    addGestureCommands(app, action);
-    addHandCommands(app, action);
-    addWordsCommand(app, action);
+        {"record", addRecordCommand},    {"record-file", addRecordFileCommand},
+        {"frames", addFramesCommands},   {"command", addCommandCommand},
+        {"filter", addFilterCommand},    {"property", addPropertyCommands},
+        {"afe", addAfeCommands},         {"event", addEventCommand},
+        {"inspect", addInspectCommand},  {"packet-size", addPacketSizeCommand},
+        {"auth", addAuthCommand},        {"config", addConfigCommands},
+        {"session", addSessionCommands}, {"touch", addTouchCommands},
+        {"gesture", addGestureCommands}, {"hand", addHandCommands},
+        {"words", addWordsCommand},
+};
+
+}  // namespace
+
+void addCommands(CLI::App& app, Action& action, std::string_view name) {
+    const auto* const end = std::end(kRows);
+    const auto* const named =
+            std::find_if(kRows, end, [name](const Row& row) { return row.name == name; });
+    if (named != end) {
+        named->add(app, action);
+        return;
+    }
+    for (const Row& row : kRows) {
+        row.add(app, action);
+    }
 }
 
 }  // namespace pemaro::zelkctl

@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <string_view>
+
 #include "tools/zelkctl/commands/Command.h"
 
 namespace pemaro::zelkctl {
 
-/// Adds all commands and their arguments to `app`, in the order in which the help lists them; each
-/// sets `action` when it is chosen. The arguments live as long as `app`.
-void addAllCommands(CLI::App& app, Action& action);
+/// Adds the command, or group of commands, of this name to `app`, or where there is none of this name
+/// all of them, in the order in which the help lists them; each sets `action` when it is chosen. The
+/// arguments live as long as `app`.
+void addCommands(CLI::App& app, Action& action, std::string_view name);
 
 // Each adds its command, or its group of commands.
 
