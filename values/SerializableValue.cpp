@@ -26,7 +26,8 @@ constexpr size_t kInitialZeros = 50;
 /// A copy of what `held` points at, or of an empty container when there is none.
 template <typename Container>
 Container copyOf(const Container* held) {
-    return held == nullptr ? Container() : Container(*held);
+    if (held == nullptr) return Container();
+    return *held;
 }
 
 template <typename Container>

@@ -10,17 +10,19 @@ Looks at the sources without running them, and fails for every finding:
   - format: C++ sources that ./dev format would change;
   - shellcheck: all shell scripts;
   - cppcheck: the library, frames/, simulator/, tools/ and testkit/;
-  - clang-tidy: the library, frames/, simulator/ and testkit/, as .clang-tidy says. And tools/, several sources at
-    a time, without the paths that the analyzer follows. It is not repeated for sources that it found clean.
+  - clang-tidy: the same, as .clang-tidy says; a folder's sources at once, and of what is not the library the
+    analyzer follows fewer paths. It is not repeated for sources that it found clean.
 What is overlooked is named with its reason: in cmake/cppcheck-suppressions, in .clang-tidy, or as NOLINT.
 TEXT
 }
 
 LINT_STEPS=(format shellcheck cppcheck clang_tidy)
-# Each source by itself; and rooms that are looked at as build/asan compiles them, in batches, which takes a fifth of
-# the time. Of a batch the analyzer would follow the paths of no function, for it leaves out what is included.
-LINT_TIDY=(values binder companion managers frames simulator testkit)
-LINT_TIDY_BATCHES=(tools)
+LINT_LIBRARY=(values binder companion managers)
+LINT_ROOMS=(frames simulator testkit tools)
+# Three sources of one shape, with the same names for other interfaces: they cannot be looked at as one.
+LINT_ALONE=managers
+# How many states of a function the analyzer comes to; its own bound is 225,000. With fewer, tools/ takes a third.
+LINT_STATES=10000
 
 command_lint() {
     (($# == 0)) || die_usage "lint takes no argument"
@@ -68,43 +70,59 @@ lint_cppcheck() {
         -D'DECLARE_META_INTERFACE(name)=' -D'IMPLEMENT_META_INTERFACE(name, text)=' \
         -D'IMPLEMENT_STUB(name, rows)=' -D'IMPLEMENT_SUBSCRIPTION(name, client)=' \
         -D'IMPLEMENT_MANAGER_CALLBACK(name, text, operation, record, texts)=' -DZELK_API= -DZELK_LOCAL= \
-        "${LINT_TIDY[@]}" "${LINT_TIDY_BATCHES[@]}"
+        "${LINT_LIBRARY[@]}" "${LINT_ROOMS[@]}"
 }
 
 lint_clang_tidy() {
-    local clean preset
-    for preset in debug asan; do
-        build_configured "$preset" "$ROOT/build/$preset" ON build.ninja >/dev/null || return
-    done
+    local clean
+    build_configured debug "$ROOT/build/debug" ON build.ninja >/dev/null || return
     clean=$ROOT/build/lint/$(
         {
-            cat .clang-tidy build/{debug,asan}/compile_commands.json
-            git ls-files --cached --others --exclude-standard -- include "${LINT_TIDY[@]}" "${LINT_TIDY_BATCHES[@]}" |
+            cat .clang-tidy platform/commands/lint.sh platform/tidy-batches build/debug/compile_commands.json
+            git ls-files --cached --others --exclude-standard -- include "${LINT_LIBRARY[@]}" "${LINT_ROOMS[@]}" |
                 xargs -d '\n' cat --
         } | sha256sum | cut -c 1-16
     )
     if [[ ! -e $clean ]]; then
-        find "${LINT_TIDY[@]}" -name '*.cpp' | tidy debug || return
-        tidy_batches | tidy asan --checks=-bugprone-suspicious-include \
-            --header-filter="/($(IFS='|' && printf '%s' "${LINT_TIDY_BATCHES[*]}"))/.*\.(h|cpp)$" || return
+        tidy library "${LINT_LIBRARY[@]}" || return
+        tidy rooms "${LINT_ROOMS[@]}" -- -analyzer-config max-nodes="$LINT_STATES" || return
         mkdir -p -- "${clean%/*}"
         : >"$clean"
     fi
 }
 
-# The batches of those rooms, and sources that are no batch.
-tidy_batches() {
-    local room
-    for room in "${LINT_TIDY_BATCHES[@]}"; do
-        grep -oP "\"file\": \"\K$ROOT/(build/asan/$room/[^\"]+/Unity/[^\"]+\.cxx|$room/[^\"]+\.cpp)" \
-            build/asan/compile_commands.json
+# tidy <name> <room …> [-- <option of the analyzer …>]
+tidy() {
+    local name=$1 option
+    local -a rooms=() options=()
+    shift
+    while (($# > 0)) && [[ $1 != -- ]]; do
+        rooms+=("$1")
+        shift
     done
+    for option in "${@:2}"; do
+        options+=(--extra-arg=-Xclang --extra-arg="$option")
+    done
+    find "${rooms[@]}" -name '*.cpp' -print0 | sort -z |
+        xargs -0 platform/tidy-batches build/debug/compile_commands.json "build/lint/$name" "$LINT_ALONE" |
+        xargs -d '\n' -n 1 -P "$(nproc)" \
+            clang-tidy -p "build/lint/$name" --quiet --warnings-as-errors='*' "${options[@]}" 2>/dev/null |
+        tidy_places
 }
 
-# tidy <preset> <option …>: the sources that are named on standard input, as that preset compiles them.
-tidy() {
-    local preset=$1
-    shift
-    xargs -d '\n' -n 1 -P "$(nproc)" \
-        clang-tidy -p "build/$preset" --quiet --warnings-as-errors='*' "$@" 2>/dev/null
+# Where in a source a finding is that was made in a batch; these name before each source's text which it is.
+tidy_places() {
+    awk -F : -v lint="$ROOT/build/lint/" '
+        index($1, lint) == 1 && $2 ~ /^[0-9]+$/ {
+            start = 0
+            for (number = 1; (getline text < $1) > 0; ++number) {
+                if (number < $2 && sub(/^#line 1 "/, "", text)) {
+                    start = number
+                    source = substr(text, 1, length(text) - 1)
+                }
+            }
+            close($1)
+            $0 = source ":" $2 - start substr($0, length($1) + length($2) + 2)
+        }
+        { print }'
 }
