@@ -96,7 +96,8 @@ build_configured() {
         cd -- "$ROOT"
         if ! is_configured "$folder" "$tests"; then
             say "configuring build/$preset"
-            cmake --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" -D "ZELK_BUILD_EXAMPLES=$tests"
+            # Anew: where a preset has another compiler now, CMake would forget what else it says.
+            cmake --fresh --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" -D "ZELK_BUILD_EXAMPLES=$tests"
         fi
         say_step "build_$preset" "building ${*:-all of it} in build/$preset"
         cmake --build "$folder" ${1:+--target "$@"}

@@ -4,6 +4,11 @@
 
 #include <atomic>
 
+// Beside libstdc++'s header clang's stdatomic.h, which IMemory.cpp includes, would declare others of these names.
+#ifdef __clang__
+#define __CLANG_STDATOMIC_H
+#endif
+
 using std::memory_order_acquire;
 using std::memory_order_relaxed;
 using std::memory_order_release;
