@@ -15,6 +15,10 @@ if(ZELK_BATCHES)
   add_compile_options($<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wno-subobject-linkage>)
 endif()
 
+# Of all but the library a debugger knows the lines alone: variables and types are a third of the time that an optimised
+# source takes to compile. In a debug build it knows everything.
+add_compile_options($<$<CONFIG:RelWithDebInfo>:-g1>)
+
 add_library(zelk_options INTERFACE)
 add_library(zelk::options ALIAS zelk_options)
 target_compile_options(zelk_options INTERFACE -Wall -Wextra -fno-strict-aliasing)
@@ -73,3 +77,6 @@ set_target_properties(zelkclient_objects PROPERTIES
   VISIBILITY_INLINES_HIDDEN ON
   UNITY_BUILD OFF)
 zelk_optimize(zelkclient_objects)
+if(NOT ZELK_SANITIZE)
+  target_compile_options(zelkclient_objects PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
+endif()

@@ -84,6 +84,7 @@ is_configured() {
 
 build_configured() {
     local preset=$1 folder=$2 tests=$3
+    local -a less=()
     shift 3
     check_host
     if [[ $preset == tsan ]]; then
@@ -97,7 +98,8 @@ build_configured() {
         if ! is_configured "$folder" "$tests"; then
             say "configuring build/$preset"
             # Anew: where a preset has another compiler now, CMake would forget what else it says.
-            cmake --fresh --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" -D "ZELK_BUILD_EXAMPLES=$tests"
+            [[ $tests == ON ]] || less=(-D ZELK_BUILD_EXAMPLES=OFF)
+            cmake --fresh --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" "${less[@]}"
         fi
         say_step "build_$preset" "building ${*:-all of it} in build/$preset"
         cmake --build "$folder" ${1:+--target "$@"}

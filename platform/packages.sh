@@ -14,7 +14,7 @@ PACKAGES_BUILD=(g++ cmake ninja-build)
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev valgrind clang
     libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin gcovr tmux zsh python3)
 # The browser that shows what zelkctl makes for browsers; large, and for the tests without the driver alone.
-PACKAGES_BROWSER=(chromium)
+PACKAGES_BROWSER=(chromium-headless-shell)
 # Libraries of zelkctl and the simulator, some of which are found by pkg-config; mandoc checks the manual pages.
 PACKAGES_TOOLS=(libcli11-dev libfmt-dev rapidjson-dev zlib1g-dev libpng-dev libevdev-dev libtracefs-dev
     libtraceevent-dev pkg-config mandoc)

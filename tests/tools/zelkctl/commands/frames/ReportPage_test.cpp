@@ -30,10 +30,10 @@ class ReportPage : public ::testing::Test {
                     "<script>setTimeout(() => {" + script + "}, 1000);</script>\n");
         const std::string path = recordings.write("scripted.html", page);
         const RunResult result =
-                run({"chromium", "--headless", "--no-sandbox", "--disable-gpu",
+                run({"chromium-headless-shell", "--no-sandbox", "--disable-gpu",
                      "--user-data-dir=" + recordings.path("browser"), "--window-size=1200,900",
                      "--virtual-time-budget=3000", "--dump-dom", "file://" + path + end});
-        EXPECT_EQ(0, result.status) << "this test needs chromium: " << result.errors;
+        EXPECT_EQ(0, result.status) << "this test needs chromium-headless-shell: " << result.errors;
         return result.output;
     }
 
