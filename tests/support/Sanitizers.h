@@ -22,13 +22,6 @@
 
 namespace pemaro::test {
 
-#ifdef ZELK_THREAD_SANITIZER
-inline constexpr bool kThreadSanitizer = true;
-#else
-inline constexpr bool kThreadSanitizer = false;
-#endif
-
-/// Either of them.
 #if defined(ZELK_ADDRESS_SANITIZER) || defined(ZELK_THREAD_SANITIZER)
 inline constexpr bool kSanitized = true;
 #else
