@@ -21,7 +21,8 @@ namespace {
 
 using test::LogRecorder;
 
-// A mebibyte. A sanitizer finds in less what it finds in that: the stack has at most 12 bytes for each of a text's containers.
+// A mebibyte. A sanitizer finds in less what it finds in that: the stack has at most 12 bytes for
+// each of a text's containers.
 constexpr size_t kTextBytes = test::kSanitized ? 1 << 17 : 1 << 20;
 constexpr size_t kStackBytes = 256 * 1024;
 constexpr double kLinearSeconds = 60;
