@@ -97,8 +97,8 @@ build_configured() {
         cd -- "$ROOT"
         if ! is_configured "$folder" "$tests"; then
             say "configuring build/$preset"
-            # Anew: where a preset has another compiler now, CMake would forget what else it says.
             [[ $tests == ON ]] || less=(-D ZELK_BUILD_EXAMPLES=OFF)
+            # Anew: where a preset has another compiler now, CMake would forget what else it says.
             cmake --fresh --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" "${less[@]}"
         fi
         say_step "build_$preset" "building ${*:-all of it} in build/$preset"
