@@ -43,6 +43,13 @@ function(zelk_bp_list name)
   endif()
 endfunction()
 
+# zelk_bp_exceptions(<options>): an Android tree has none either, unless a module asks for them.
+function(zelk_bp_exceptions options)
+  if("-fexceptions" IN_LIST options)
+    zelk_bp_list(cppflags -fexceptions)
+  endif()
+endfunction()
+
 # zelk_bp_libraries(<module's type> <library>...): those of the table, and the archives of this tree. In an Android
 # tree a module has what it names itself, nothing by way of another archive. So each names what those need that it
 # names, and what is linked names all archives; an archive takes in no other's objects.
@@ -112,6 +119,7 @@ function(zelk_bp_target target type)
     list(TRANSFORM definitions PREPEND -D OUTPUT_VARIABLE flags)
   endif()
   zelk_bp_list(cflags ${flags})
+  zelk_bp_exceptions("${COMPILE_OPTIONS}")
   # What zelk_around_defaults has already.
   zelk_bp_paths(folders ${SOURCE_DIR} ${INCLUDE_DIRECTORIES})
   if(NOT target STREQUAL "zelkclient_objects")
@@ -160,8 +168,7 @@ endforeach()
 
 zelk_bp_append([[
 // The tree as a part of Android's. Sources, definitions, include folders and libraries are those of the CMake
-// targets: after a change there, tests/android/android-bp --update writes this file anew. The library does
-// without exceptions; what stands around it, its tools and tests, does not.
+// targets: after a change there, tests/android/android-bp --update writes this file anew.
 
 cc_defaults {
     name: "zelk_defaults",
@@ -179,7 +186,6 @@ cc_defaults {
     name: "zelk_around_defaults",
     defaults: ["zelk_defaults"],
     local_include_dirs: [".", "include"],
-    cppflags: ["-fexceptions"],
 }
 ]])
 
@@ -239,6 +245,10 @@ function(zelk_bp_fuzz_module type name)
   zelk_bp_append("\n${type} {\n    name: \"${name}\",\n    defaults: [\"zelk_around_defaults\"],\n")
   zelk_bp_paths(sources ${CMAKE_SOURCE_DIR}/fuzz ${ARG_SOURCES})
   zelk_bp_list(srcs ${sources})
+  string(REGEX REPLACE "^zelk_" "" target "${name}")
+  if(fuzz_text MATCHES "\nzelk_command_line_target\\(${target}\\)")
+    zelk_bp_exceptions(-fexceptions)
+  endif()
   zelk_bp_libraries(${type} ${ARG_LIBS})
 endfunction()
 

@@ -38,4 +38,6 @@ refuses "android-bp: nowhere: not a folder of the tree" 'local_include_dirs: ["n
 # What a module has by way of an archive alone it does not have there.
 refuses "complete-modules: zelk_more_test: needs libzelk_frames, for libzelk_records" 'static_libs: ["libzelk_records"]'
 refuses "complete-modules: zelk_more_test: needs libfmtlib, for <fmt/core.h>" 'srcs: ["tools/touchstack/main.cpp"]'
+refuses "complete-modules: zelk_more_test: needs -fexceptions, for <CLI/CLI.hpp>" \
+    'srcs: ["tools/common/CommandLine.cpp"]'
 ((failures == 0))

@@ -4,17 +4,15 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
-#include <map>
 #include <set>
 #include <sstream>
 #include <string>
 #include <vector>
 
+#include "tests/driver/CommandGroups.h"
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
-#include "tools/zelkctl/commands/CommandTree.h"
 #include "tools/zelkctl/terminal/Json.h"
 
 using testing::StartsWith;
@@ -36,28 +34,6 @@ Words wordsOf(const std::string& line, const std::string& folder) {
         words.push_back(word);
     }
     return words;
-}
-
-// The words of each command, and whether others follow them. What its help tells, tools_tests looks at.
-using CommandGroups = std::map<std::string, bool>;
-
-void addGroups(CommandGroups& groups, const CLI::App& app, const std::string& path) {
-    const auto shown = [](const CLI::App* command) { return !command->get_group().empty(); };
-    const std::vector<const CLI::App*> commands = app.get_subcommands(shown);
-    groups[path] = !commands.empty();
-    for (const CLI::App* command : commands) {
-        addGroups(groups, *command,
-                  path.empty() ? command->get_name() : path + " " + command->get_name());
-    }
-}
-
-CommandGroups readCommands() {
-    CLI::App app;
-    zelkctl::Action action;
-    zelkctl::addCommandTree(app, action);
-    CommandGroups groups;
-    addGroups(groups, app, "");
-    return groups;
 }
 
 // The command that a line begins with, of one word or two.

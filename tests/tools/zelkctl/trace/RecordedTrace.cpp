@@ -7,7 +7,8 @@
 #include <cstring>
 #include <map>
 #include <sstream>
-#include <stdexcept>
+
+#include <gtest/gtest.h>
 
 namespace pemaro::zelkctl {
 namespace {
@@ -60,7 +61,8 @@ std::vector<BinderEvent> readEventLines(const std::string& text) {
         sscanf(line.c_str(), " %63s [%*[0-9]] %lf: %63[a-z_]: %n", task, &seconds, name, &rest);
         const char* thread = rest == 0 ? nullptr : strrchr(task, '-');
         if (thread == nullptr) {
-            throw std::invalid_argument("no event: " + line);
+            ADD_FAILURE() << "no event: " << line;
+            continue;
         }
         std::map<std::string, unsigned long> fields = fieldsOf(line.substr(rest));
         BinderEvent event;
