@@ -99,7 +99,7 @@ build_configured() {
             say "configuring build/$preset"
             [[ $tests == ON ]] || less=(-D ZELK_BUILD_EXAMPLES=OFF)
             # Anew: where a preset has another compiler now, CMake would forget what else it says.
-            cmake --fresh --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" "${less[@]}"
+            cmake --fresh --preset "$preset" -D "ZELK_BUILD_TESTS=$tests" "${less[@]}" || exit
         fi
         say_step "build_$preset" "building ${*:-all of it} in build/$preset"
         cmake --build "$folder" ${1:+--target "$@"}
