@@ -9,24 +9,22 @@
 #include <utility>
 #include <vector>
 
-#include "tests/support/ChildProcess.h"
-
 namespace pemaro::test {
 namespace {
 
 constexpr std::chrono::milliseconds kPeriod(100);
 constexpr int kPatience = 600;  // periods
 
-RunResult tmux(std::vector<std::string> words) {
-    // Tests may run beside each other.
-    const std::string server = "zelk-" + std::to_string(getpid());
-    words.insert(words.begin(), {"tmux", "-f", "/dev/null", "-L", server, "-u"});
-    return run(words);
+// Tests may run beside each other; and a server that was told to end may still take in who comes next.
+std::string nextSocket() {
+    static int last = 0;
+    return testing::TempDir() + "zelk-terminal-" + std::to_string(getpid()) + "-" +
+           std::to_string(++last);
 }
 
 }  // namespace
 
-Terminal::Terminal(const std::string& command, int columns, int rows) {
+Terminal::Terminal(const std::string& command, int columns, int rows) : mSocket(nextSocket()) {
     const RunResult start =
             tmux({"new-session", "-d", "-x", std::to_string(columns), "-y", std::to_string(rows),
                   command + "; echo ended with $?; sleep 1000"});
@@ -35,6 +33,12 @@ Terminal::Terminal(const std::string& command, int columns, int rows) {
 
 Terminal::~Terminal() {
     tmux({"kill-server"});
+    unlink(mSocket.c_str());
+}
+
+RunResult Terminal::tmux(std::vector<std::string> words) const {
+    words.insert(words.begin(), {"tmux", "-f", "/dev/null", "-S", mSocket, "-u"});
+    return run(words);
 }
 
 std::string Terminal::text(bool withColors) {

@@ -3,6 +3,9 @@
 
 #include <functional>
 #include <string>
+#include <vector>
+
+#include "tests/support/ChildProcess.h"
 
 namespace pemaro::test {
 
@@ -29,6 +32,11 @@ class Terminal {
     void resize(int columns, int rows);
     /// Ctrl-C.
     void interrupt();
+
+  private:
+    RunResult tmux(std::vector<std::string> words) const;
+
+    const std::string mSocket;
 };
 
 }  // namespace pemaro::test
