@@ -19,8 +19,8 @@ endif()
 # source takes to compile. In a debug build it knows everything.
 add_compile_options($<$<CONFIG:RelWithDebInfo>:-g1>)
 
-# The device's platform code is built without exceptions; so is all of this tree, but for what asks for them, for a
-# library of others' throws them: a sixth of what is compiled without optimisation would be ways out of each block.
+# The device's platform code is built without exceptions. So is this tree, but for the targets that ask for them, as a
+# library that they use throws: a sixth of what a test compiles to, unoptimised, would be ways out of its blocks.
 add_compile_options($<$<COMPILE_LANGUAGE:CXX>:-fno-exceptions>)
 
 add_library(zelk_options INTERFACE)
