@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tests/tools/zelkctl/trace/RecordedTrace.h"
 
+#include <gtest/gtest.h>
+
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <map>
 #include <sstream>
-
-#include <gtest/gtest.h>
 
 namespace pemaro::zelkctl {
 namespace {
