@@ -78,7 +78,7 @@ class RingRecorder {
             return STATUS_ERROR_ACQUIRING_RESOURCE;
         }
         pthread_detach(thread);
-        shared.release();
+        static_cast<void>(shared.release());
         return STATUS_NO_ERROR;
     }
 
