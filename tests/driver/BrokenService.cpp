@@ -4,7 +4,8 @@
 ///
 ///     broken-service companion|touch FAULT
 ///
-/// Each fault is one that "zelkctl check" has to find; "none" is a good service.
+/// Each fault is one that "zelkctl check" has to find; "none" is a good service, and "offers-nothing" one that
+/// overrides nothing of what services derive from.
 
 #include "pemaro/Binder.h"
 
@@ -22,6 +23,8 @@
 #include <thread>
 #include <utility>
 
+#include "pemaro/BasicTouchCompanionService.h"
+#include "pemaro/BasicTouchManagerService.h"
 #include "pemaro/BpTouchManagerClient.h"
 #include "pemaro/ITouchManagerService.h"
 #include "pemaro/TouchCompanionSharedCblk.h"
@@ -247,6 +250,15 @@ class BrokenTouchManager : public BrokenService {
     std::atomic<bool> mListens{false};
 };
 
+sp<BBinder> makeService(bool isTouch, const std::string& fault) {
+    if (fault == "offers-nothing") {
+        return isTouch ? sp<BBinder>(new pemaro::BasicTouchManagerService())
+                       : sp<BBinder>(new pemaro::BasicTouchCompanionService());
+    }
+    return isTouch ? sp<BBinder>(new BrokenTouchManager(fault))
+                   : sp<BBinder>(new BrokenCompanion(fault));
+}
+
 }  // namespace
 
 }  // namespace pemaro::test
@@ -259,12 +271,7 @@ int main(int argc, char** argv) {
         return 1;
     }
     const bool isTouch = strcmp(argv[1], "touch") == 0;
-    sp<BBinder> service;
-    if (isTouch) {
-        service = new BrokenTouchManager(argv[2]);
-    } else {
-        service = new BrokenCompanion(argv[2]);
-    }
+    const sp<BBinder> service = makeService(isTouch, argv[2]);
     android::ProcessState::self()->startThreadPool();
     android::defaultServiceManager()->addService(String16(isTouch ? kTouch : kCompanion), service);
     printf("process %d\n", getpid());

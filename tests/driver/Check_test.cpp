@@ -139,10 +139,12 @@ TEST_P(CheckFinds, TheFault) {
 
 TEST(Check, FindsNothingWhereThereIsNoFault) {
     for (const char* kind : {"companion", "touch"}) {
-        ChildProcess service({binary("broken-service"), kind, "none"});
-        ASSERT_TRUE(service.awaitOutput("process ")) << service.errors();
-        const RunResult check = zelkctl({"check", kind, "--invasive"});
-        EXPECT_EQ(0, check.status) << check.output;
+        for (const char* fault : {"none", "offers-nothing"}) {
+            ChildProcess service({binary("broken-service"), kind, fault});
+            ASSERT_TRUE(service.awaitOutput("process ")) << service.errors();
+            const RunResult check = zelkctl({"check", kind, "--invasive"});
+            EXPECT_EQ(0, check.status) << check.output;
+        }
     }
 }
 

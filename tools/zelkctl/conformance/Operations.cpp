@@ -76,7 +76,7 @@ std::string fieldProblem(const Parcel& reply, char field, int32_t* status) {
         case 'u':
             return number >= 0 ? "" : fmt::format("{} is no count", number);
         case 'p':
-            return number > 0 && number < STATUS_UNKNOWN_ERROR
+            return number > 0 && (number < STATUS_UNKNOWN_ERROR || isKnownStatus(number))
                            ? ""
                            : fmt::format("{} is no size of a packet", number);
         case 'b':

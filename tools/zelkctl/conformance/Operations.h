@@ -28,7 +28,7 @@ enum class Harm {
 /// A call that can be checked. A layout has a letter for each field of the reply:
 ///
 ///     S  status        i  any int32       u  count, not negative     b  answer, 0 or 1
-///     m  map           a  array of maps   p  packet size, above 0
+///     m  map           a  array of maps   p  packet size, above 0, or status
 ///     B  int32 length, and so many bytes  n  int32 count, and so many C strings
 struct CheckedCall {
     uint32_t code;
