@@ -172,50 +172,68 @@ int TouchCompanionClient::startRecord() {
         if (status != STATUS_NO_ERROR) {
             return status;
         }
-        startThread(block);
+        status = startThread(block);
+        if (status != STATUS_NO_ERROR) {
+            return status;
+        }
     }
     return callService(clientFailure("startRecord failed"), mService, &Service::startRecord);
 }
 
 int TouchCompanionClient::mapBlock(Service& service, MappedBlock& block) {
-    // A recording that was started twice has a thread in the old block.
-    endThread();
     block.memory = service.getCblk();
     if (block.memory == nullptr) {
         ALOGE("couldn't get shared control block");
         return STATUS_ERROR_ACQUIRING_RESOURCE;
     }
     block.cblk = usableBlock(block.memory);
+    if (block.cblk == nullptr) {
+        return STATUS_ERROR_ACQUIRING_RESOURCE;
+    }
+    // A recording that was started twice has a thread in the old block.
+    endThread();
     sp<android::IMemory> memory = block.memory;  // takes what is let go, outside the guard
     ClientGuard guard;
     mFrameCount = 0;  // the first frame sets the start's time
     mLastSecond = 0;
     std::swap(mCblkMemory, memory);
     mCblk = block.cblk;
-    return block.cblk != nullptr ? STATUS_NO_ERROR : STATUS_ERROR_ACQUIRING_RESOURCE;
+    return STATUS_NO_ERROR;
 }
 
-void TouchCompanionClient::startThread(const MappedBlock& block) {
+int TouchCompanionClient::startThread(const MappedBlock& block) {
     if (mCallback == nullptr) {
-        return;
+        return STATUS_NO_ERROR;
     }
     ALOGD("Init: callback is set, create DebugThread");
-    const sp<TouchCompanionThread> thread = new TouchCompanionThread(block, mCallback, mContext);
-    thread->run("TouchCompanionThread", 0, 0);
+    const sp<TouchCompanionThread> previous = copyGuarded(mThread);
+    const sp<TouchCompanionThread> thread =
+            new TouchCompanionThread(block, mCallback, mContext, previous);
+    if (thread->run("TouchCompanionThread", 0, 0) != android::NO_ERROR) {
+        ALOGE("the recording thread cannot be started");
+        return STATUS_ERROR_ACQUIRING_RESOURCE;
+    }
     // Two recordings that are started at once leave one thread.
     const sp<TouchCompanionThread> other = exchangeGuarded(mThread, thread);
-    if (other != nullptr) {
+    if (other != nullptr && other != previous) {
         other->end();
     }
+    return STATUS_NO_ERROR;
 }
 
 void TouchCompanionClient::endThread() {
-    const sp<TouchCompanionThread> thread = exchangeGuarded(mThread, sp<TouchCompanionThread>());
+    const sp<TouchCompanionThread> thread = copyGuarded(mThread);
     if (thread == nullptr) {
         return;
     }
     thread->printRefs();
-    thread->end();
+    // Whoever asks meanwhile waits as well; so does whoever asks after its callback did.
+    if (thread->end()) {
+        ClientGuard guard;
+        if (mThread == thread) {
+            mThread.clear();  // held by the caller still
+        }
+    }
 }
 
 int TouchCompanionClient::stopRecord() {

@@ -23,29 +23,46 @@ constexpr useconds_t kPauseMicroseconds = 16000;
 }  // namespace
 
 TouchCompanionThread::TouchCompanionThread(const MappedBlock& block,
-                                           FrameDelivery::DataCallback callback, void* context)
-        : android::Thread(true /* canCallJava */), mDelivery(block, callback, context, this) {}
+                                           FrameDelivery::DataCallback callback, void* context,
+                                           const android::sp<TouchCompanionThread>& previous)
+        : android::Thread(true /* canCallJava */),
+          mDelivery(block, callback, context, this),
+          mPrevious(previous) {}
 
-void TouchCompanionThread::end() {
+bool TouchCompanionThread::end() {
     requestExit();
     if (isSelf()) {
-        return;
+        return false;
     }
     while (isRunning()) {
         if (isOverdue()) {
             ALOGE("the recording thread is left behind: a wait in the shared memory does not "
                   "end");
-            return;
+            return true;
         }
         usleep(kLookMicroseconds);
     }
     requestExitAndWait();
+    // One that was told to exit before its first pass has not ended it.
+    const android::sp<TouchCompanionThread> before = previous();
+    return before == nullptr || before->end();
 }
 
-/// Whether this is the thread that calls.
-bool TouchCompanionThread::isSelf() {
+android::sp<TouchCompanionThread> TouchCompanionThread::previous() {
     android::AutoMutex lock(mStateLock);
-    return mHasSelf && pthread_equal(mSelf, pthread_self()) != 0;
+    return mPrevious;
+}
+
+/// Whether this is the thread that calls, or waits for it.
+bool TouchCompanionThread::isSelf() {
+    {
+        android::AutoMutex lock(mStateLock);
+        if (mHasSelf && pthread_equal(mSelf, pthread_self()) != 0) {
+            return true;
+        }
+    }
+    const android::sp<TouchCompanionThread> before = previous();
+    return before != nullptr && before->isSelf();
 }
 
 /// Whether its wait is; from then on it is left behind.
@@ -63,6 +80,15 @@ bool TouchCompanionThread::threadLoop() {
         android::AutoMutex lock(mStateLock);
         mSelf = pthread_self();
         mHasSelf = true;
+    }
+    const android::sp<TouchCompanionThread> before = previous();
+    if (before != nullptr) {
+        before->end();
+        android::AutoMutex lock(mStateLock);
+        mPrevious.clear();
+        if (exitPending()) {
+            return false;
+        }
     }
     mDelivery.pass(mStatistics);
     if (mDelivery.isStuck()) {

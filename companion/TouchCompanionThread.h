@@ -15,25 +15,29 @@ namespace pemaro {
 /// process has ruined may never end.
 class TouchCompanionThread : public android::Thread, private WaitWatch {
   public:
+    /// `previous`, if there is one, is ended before the first pass. It is in its callback, from
+    /// within which the next recording was started: so there is never a second callback at a time.
     TouchCompanionThread(const MappedBlock& block, FrameDelivery::DataCallback callback,
-                         void* context);
+                         void* context, const android::sp<TouchCompanionThread>& previous);
 
     /// Asks the thread to exit and waits until it has: no callback runs afterwards. Two threads are
-    /// not waited for: the calling one, which ends when its callback returns, and one whose wait in
-    /// the shared memory is overdue by a second, which is left behind with what it needs, and which
-    /// will call nobody.
-    void end();
+    /// not waited for: one whose wait in the shared memory is overdue by a second, which is left
+    /// behind with what it needs, and which will call nobody; and the calling one, or one that
+    /// waits for that to end, for which false is returned: the callback has yet to return.
+    bool end();
 
   private:
     bool threadLoop() override;
     void waitBegins() override;
     bool waitEnded() override;
+    android::sp<TouchCompanionThread> previous();
     bool isSelf();
     bool isOverdue();
 
     FrameDelivery mDelivery;
     FrameStatistics mStatistics;
     android::Mutex mStateLock;
+    android::sp<TouchCompanionThread> mPrevious;
     pthread_t mSelf{};
     bool mHasSelf = false;
     int64_t mWaitingSince = 0;  ///< nanoseconds, 0 outside of a wait

@@ -206,7 +206,7 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
   private:
     ZELK_LOCAL int mapBlock(ITouchCompanionService& service, MappedBlock& block);
     ZELK_LOCAL MappedBlock mappedBlock() const;
-    ZELK_LOCAL void startThread(const MappedBlock& block);
+    ZELK_LOCAL int startThread(const MappedBlock& block);
     ZELK_LOCAL void endThread();
     ZELK_LOCAL int readCommandResponse(SerializableMap& response, char** result);
 

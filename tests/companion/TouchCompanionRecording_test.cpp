@@ -3,6 +3,7 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <pthread.h>
 
 #include <atomic>
 #include <cerrno>
@@ -793,6 +794,196 @@ TEST_F(TouchCompanionRecording, MayBeLetGoInItsCallback) {
     EXPECT_TRUE(isLetGo(mRing.memory(), 1)) << "the thread has ended";
     EXPECT_EQ(1u, mRing.cblk().read) << "the frame was given back";
 }
+
+// A callback that does something with its client, and goes on until the test lets it go.
+class Inside {
+  public:
+    using Deed = void (*)(TouchCompanionClient& client);
+
+    explicit Inside(Deed deed) : mDeed(deed) {}
+
+    static void callback(int, void*, unsigned long, void* context) {
+        static_cast<Inside*>(context)->run();
+    }
+
+    void letGo() { mLetGo = true; }
+    bool isInside() const { return mInside != 0; }
+    bool wasAlone() const { return !mCrowded; }
+    bool waitUntilDone() const {
+        return waitFor([this] { return mDone.load(); });
+    }
+
+    template <typename Condition>
+    static bool waitFor(Condition condition) {
+        const auto giveUp = std::chrono::steady_clock::now() + kPatience;
+        while (!condition() && std::chrono::steady_clock::now() < giveUp) {
+            usleep(1000);
+        }
+        return condition();
+    }
+
+    TouchCompanionClient* client = nullptr;
+
+  private:
+    void run() {
+        mCrowded = mCrowded || ++mInside > 1;
+        if (!mDone && client != nullptr) {
+            mDeed(*client);
+            mDone = true;
+        }
+        waitFor([this] { return mLetGo.load(); });
+        --mInside;
+    }
+
+    const Deed mDeed;
+    std::atomic<int> mInside{0};
+    std::atomic<bool> mCrowded{false};
+    std::atomic<bool> mDone{false};
+    std::atomic<bool> mLetGo{false};
+};
+
+void stopInside(TouchCompanionClient& client) {
+    EXPECT_EQ(0, client.stopRecord());
+}
+
+// Whoever else ends the recording returns when no callback runs any more, also when the callback has
+// asked for the end itself.
+TEST_F(TouchCompanionRecording, EndsForOthersWhenTheCallbackThatStoppedItReturns) {
+    Inside inside(stopInside);
+    const sp<TouchCompanionClient> client = record(mRing, Inside::callback, &inside);
+    inside.client = client.get();
+    mRing.put();
+    ASSERT_TRUE(inside.waitUntilDone());
+    std::thread letting([&] {
+        usleep(50000);
+        inside.letGo();
+    });
+    EXPECT_EQ(0, client->stopRecord());
+    EXPECT_FALSE(inside.isInside());
+    letting.join();
+}
+
+TEST_F(TouchCompanionRecording, IsDestroyedWhenTheCallbackThatStoppedItReturns) {
+    Inside inside(stopInside);
+    sp<TouchCompanionClient> client = record(mRing, Inside::callback, &inside);
+    inside.client = client.get();
+    mRing.put();
+    ASSERT_TRUE(inside.waitUntilDone());
+    std::thread letting([&] {
+        usleep(50000);
+        inside.letGo();
+    });
+    client.clear();
+    EXPECT_FALSE(inside.isInside());
+    letting.join();
+}
+
+TEST_F(TouchCompanionRecording, EndsForAllWhoStopItAtOnce) {
+    Inside inside([](TouchCompanionClient&) {});
+    const sp<TouchCompanionClient> client = record(mRing, Inside::callback, &inside);
+    inside.client = client.get();
+    mRing.put();
+    ASSERT_TRUE(inside.waitUntilDone());
+    const auto stop = [&] {
+        EXPECT_EQ(0, client->stopRecord());
+        EXPECT_FALSE(inside.isInside());
+    };
+    std::thread first(stop);
+    std::thread second(stop);
+    usleep(50000);
+    inside.letGo();
+    first.join();
+    second.join();
+}
+
+// One frame at a time: the next recording's first waits for the callback that started it.
+TEST_F(TouchCompanionRecording, DeliversOneFrameAtATimeAfterAStartInItsCallback) {
+    Inside inside([](TouchCompanionClient& client) {
+        EXPECT_EQ(0, client.stopRecord());
+        EXPECT_EQ(0, client.startRecord());
+    });
+    const sp<TouchCompanionClient> client = record(mRing, Inside::callback, &inside);
+    inside.client = client.get();
+    mRing.put();
+    ASSERT_TRUE(inside.waitUntilDone());
+    mRing.put();
+    usleep(50000);
+    EXPECT_EQ(0u, mRing.cblk().read);
+    inside.letGo();
+    EXPECT_TRUE(Inside::waitFor([&] { return mRing.cblk().read == 2; }));
+    EXPECT_TRUE(inside.wasAlone());
+    EXPECT_EQ(0, client->stopRecord());
+}
+
+TEST_F(TouchCompanionRecording, MayBeStoppedAndStartedInItsCallbackAgainAndAgain) {
+    Inside inside([](TouchCompanionClient& client) {
+        for (int i = 0; i < 3; ++i) {
+            EXPECT_EQ(0, client.stopRecord());
+            EXPECT_EQ(0, client.startRecord());
+        }
+        EXPECT_EQ(0, client.stopRecord());
+    });
+    sp<TouchCompanionClient> client = record(mRing, Inside::callback, &inside);
+    inside.client = client.get();
+    mRing.put();
+    ASSERT_TRUE(inside.waitUntilDone());
+    mRing.put();
+    inside.letGo();
+    client.clear();
+    EXPECT_EQ(1u, mRing.cblk().read) << "none of the last recording's";
+    mService->cblk = nullptr;
+    EXPECT_TRUE(isLetGo(mRing.memory(), 1)) << "all threads have ended";
+}
+
+// What is refused takes nothing from the recording that runs.
+TEST_F(TouchCompanionRecording, GoesOnWhenAnotherStartIsRefused) {
+    const sp<TouchCompanionClient> client = record(mRing, Frames::callback, &mFrames);
+    mService->cblk = nullptr;
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
+    mRing.put();
+    EXPECT_TRUE(mFrames.waitFor(1));
+    EXPECT_EQ(0, client->stopRecord());
+}
+
+#ifdef __GLIBC__
+// Stacks that no process has room for.
+class NoThreads {
+  public:
+    NoThreads() {
+        pthread_getattr_default_np(&mUsual);
+        pthread_attr_t huge;
+        pthread_attr_init(&huge);
+        pthread_attr_setstacksize(&huge, size_t{1} << 46);
+        EXPECT_EQ(0, pthread_setattr_default_np(&huge));
+        pthread_attr_destroy(&huge);
+    }
+    ~NoThreads() {
+        EXPECT_EQ(0, pthread_setattr_default_np(&mUsual));
+        pthread_attr_destroy(&mUsual);
+    }
+
+  private:
+    pthread_attr_t mUsual;
+};
+
+TEST_F(TouchCompanionRecording, FailsWithoutAThread) {
+    const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
+    mService->cblk = mRing.memory();
+    client->setRecordOutput(1);
+    forget();
+    {
+        const NoThreads none;
+        EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
+    }
+    EXPECT_THAT(mService->calls(), ElementsAre("prepareRecord", "getCblk"));
+    EXPECT_THAT(clientLines(), ElementsAre("D Init: callback is set, create DebugThread",
+                                           "E the recording thread cannot be started"));
+    EXPECT_EQ(0, client->startRecord());
+    mRing.put();
+    EXPECT_TRUE(mFrames.waitFor(1));
+    EXPECT_EQ(0, client->stopRecord());
+}
+#endif
 
 // Checks each frame's bytes and that none is missing, in the callback, while the service writes.
 struct StreamCheck {
