@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #pragma once
 
+#include <utility>
+
 #include "binder/Guard.h"
 #include "binder/Log.h"
 #include "binder/ServiceLookup.h"
@@ -64,7 +66,7 @@ class ManagerConnection {
             letGo(service);
             return STATUS_UNKNOWN_ERROR;
         }
-        return connected();
+        return connected(service);
     }
 
     // ---- the steps of init() ----
@@ -85,9 +87,14 @@ class ManagerConnection {
         return status;
     }
 
-    /// Success is logged as an error so that it shows in every log.
-    int connected() {
-        exchangeGuarded(mInitialized, true);
+    /// Success is logged as an error so that it shows in every log. Who is subscribed can be reached
+    /// to end that, also where a deinit() has meanwhile let the service go.
+    int connected(android::sp<Service> service) {
+        {
+            ClientGuard guard;
+            std::swap(mService, service);  // what it takes is let go outside the guard
+            mInitialized = true;
+        }
         logText(ANDROID_LOG_ERROR, mTexts.tag, mTexts.connected);
         return STATUS_NO_ERROR;
     }
@@ -104,9 +111,7 @@ class ManagerConnection {
             if (binder != nullptr && watcher != nullptr) {
                 binder->unlinkToDeath(watcher, nullptr, 0, nullptr);
             }
-            if (letGo(service)) {
-                exchangeGuarded(mInitialized, false);
-            }
+            letGo(service);
         }
         logText(ANDROID_LOG_DEBUG, mTexts.tag, "deinit: X");
         return STATUS_NO_ERROR;
@@ -132,14 +137,13 @@ class ManagerConnection {
     }
 
   private:
-    /// False when another init() has put another service in its place.
-    bool letGo(android::sp<Service> service) {
+    /// The flag and the service at once. Not when another init() has put another service in its place.
+    void letGo(const android::sp<Service>& service) {
         ClientGuard guard;
-        if (mService != service) {
-            return false;
+        if (mService == service) {
+            mService.clear();  // the caller holds it still
+            mInitialized = false;
         }
-        mService.clear();  // the caller holds it still
-        return true;
     }
 
     const ManagerTexts& mTexts;

@@ -61,7 +61,7 @@ int TouchManagerClient::init() {
     ALOGD("before subscribe: mTchMgrClient ref count = %d", getStrongCount());
     int status = service->subscribe(this);
     ALOGD("after subscribe: mTchMgrClient ref count = %d", getStrongCount());
-    return status == STATUS_NO_ERROR ? connection.connected() : connection.refused(status);
+    return status == STATUS_NO_ERROR ? connection.connected(service) : connection.refused(status);
 }
 
 int TouchManagerClient::deinit() {

@@ -4,6 +4,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <functional>
+
 #include "pemaro/testkit/FakeServiceManager.h"
 #include "tests/support/LogLines.h"
 #include "tests/support/RecordingBinder.h"
@@ -54,6 +56,58 @@ TEST(ManagerConnection, RefusesABinderOfAnotherInterface) {
     clearLog();
     EXPECT_EQ(nullptr, connection.hold(binder));
     EXPECT_EQ((Lines{"E wrong service interface?"}), linesOf("Tag"));
+}
+
+// One that does something else while it is asked.
+class BusyService : public android::IInterface {
+  public:
+    static sp<BusyService> asInterface(const sp<IBinder>&) { return instance; }
+
+    int subscribe(const sp<Client>&) {
+        ++subscribed;
+        onSubscribe();
+        return STATUS_NO_ERROR;
+    }
+    int unsubscribe(const sp<Client>&) {
+        ++unsubscribed;
+        return STATUS_NO_ERROR;
+    }
+
+    static sp<BusyService> instance;
+    std::function<void()> onSubscribe = [] {};
+    int subscribed = 0;
+    int unsubscribed = 0;
+
+  private:
+    IBinder* onAsBinder() override { return mBinder.get(); }
+
+    const sp<RecordingBinder> mBinder = new RecordingBinder;
+};
+
+sp<BusyService> BusyService::instance;
+
+// Whoever is subscribed is reached by the next deinit(), whatever ran beside the init().
+TEST(ManagerConnection, CanBeEndedAfterADeinitWithinAnInit) {
+    ScopedServiceManager services;
+    services->add("service", new RecordingBinder);
+    const sp<Client> self = new Client;
+    BusyService::instance = new BusyService;
+    BusyService& busy = *BusyService::instance;
+    sp<BusyService> service;
+    bool initialized = false;
+    ManagerConnection connection(kTexts, initialized, service, self.get());
+    ASSERT_EQ(STATUS_NO_ERROR, connection.initWatched(nullptr));
+    busy.onSubscribe = [&] { EXPECT_EQ(STATUS_NO_ERROR, connection.deinit(nullptr)); };
+    EXPECT_EQ(STATUS_NO_ERROR, connection.initWatched(nullptr));
+    EXPECT_TRUE(initialized);
+    EXPECT_EQ(BusyService::instance, service);
+    EXPECT_EQ(1, busy.unsubscribed);
+
+    EXPECT_EQ(STATUS_NO_ERROR, connection.deinit(nullptr));
+    EXPECT_EQ(2, busy.unsubscribed);
+    EXPECT_FALSE(initialized);
+    EXPECT_EQ(nullptr, service);
+    BusyService::instance.clear();
 }
 
 }  // namespace
