@@ -46,14 +46,14 @@ class RingRecorder {
     /// Ends the last recording, which a client that died has left running, and makes the ring of the
     /// next one, as RingWriter::create() does; 0, or 0x40000006 when there is no memory for it.
     int prepare(uint32_t frameBytes, uint32_t ringFrames) {
-        const std::lock_guard<std::mutex> guard(mLock);
-        letGo();
-        auto ring = RingWriter::create(frameBytes, ringFrames);
-        if (ring == nullptr) {
+        stop();
+        auto next = std::make_shared<Recording>();
+        next->ring = RingWriter::create(frameBytes, ringFrames);
+        if (next->ring == nullptr) {
             return STATUS_ERROR_ALLOCATING_MEMORY;
         }
-        mRecording = std::make_shared<Recording>();
-        mRecording->ring = std::move(ring);
+        // Two that are prepared at once leave one.
+        exchange(next);
         return STATUS_NO_ERROR;
     }
 
@@ -63,18 +63,22 @@ class RingRecorder {
         return mRecording != nullptr ? mRecording->ring->memory() : nullptr;
     }
 
-    /// Begins to write; 0, or 0x4000000B when no ring is prepared or the recording has begun, or
-    /// 0x4000000A when there is no thread to be had.
+    /// Begins to write; 0, or 0x4000000D for an empty function, 0x4000000B when no ring is prepared
+    /// or the recording has begun, or 0x4000000A when there is no thread to be had. The function is
+    /// destroyed with no lock held: by its thread, or by who stops it when that ends first.
     int start(Write write) {
+        if (!write) {
+            return STATUS_BAD_PARAMETER;
+        }
         const std::lock_guard<std::mutex> guard(mLock);
         if (mRecording == nullptr || mRecording->write) {
             return STATUS_INVALID_STATE;
         }
-        mRecording->write = std::move(write);
+        mRecording->write.swap(write);  // which is empty then, or takes it back
         auto shared = std::make_unique<std::shared_ptr<Recording>>(mRecording);
         pthread_t thread;
         if (pthread_create(&thread, nullptr, run, shared.get()) != 0) {
-            mRecording->write = nullptr;
+            mRecording->write.swap(write);
             return STATUS_ERROR_ACQUIRING_RESOURCE;
         }
         pthread_detach(thread);
@@ -85,8 +89,7 @@ class RingRecorder {
     /// Tells the thread to end, without waiting, and lets go of the recording; 0, also when there
     /// is none.
     int stop() {
-        const std::lock_guard<std::mutex> guard(mLock);
-        letGo();
+        exchange(nullptr);
         return STATUS_NO_ERROR;
     }
 
@@ -107,11 +110,15 @@ class RingRecorder {
         return nullptr;
     }
 
-    void letGo() {
-        if (mRecording != nullptr) {
-            mRecording->stopped = true;
+    /// What the last recording's function has captured may ask the recorder when it is destroyed.
+    void exchange(std::shared_ptr<Recording> recording) {
+        {
+            const std::lock_guard<std::mutex> guard(mLock);
+            mRecording.swap(recording);
         }
-        mRecording = nullptr;
+        if (recording != nullptr) {
+            recording->stopped = true;
+        }
     }
 
     mutable std::mutex mLock;

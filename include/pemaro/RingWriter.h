@@ -25,6 +25,10 @@ namespace pemaro {
 ///     return mRing != nullptr ? mRing->memory() : nullptr;              // in getCblk()
 ///     if (!mRing->put(frame, length)) ++mDropped;                       // while recording
 ///
+/// A frame is the service's to define, but for one thing: the unsigned 32-bit number at its byte 8 is
+/// its length in bytes, which the client's callback is told. So it has 12 bytes at least. Neither is
+/// looked at here; of a length that leads out of the ring the client delivers no frame.
+///
 /// One ring has one reader, so each client that records is given a ring of its own, and a new one
 /// for each recording. The memory lives as long as the writer or a client holds it.
 ///
@@ -53,12 +57,13 @@ class RingWriter {
     /// What getCblk() returns.
     const android::sp<android::IMemory>& memory() const { return mMemory; }
 
-    /// Copies a frame of `length` bytes into the ring, publishes it and wakes the reader. False,
-    /// and nothing is done, when the ring is full or the frame is longer than a slot.
+    /// Copies a frame of `length` bytes, which is what its byte 8 tells too, into the ring, publishes
+    /// it and wakes the reader. False, and nothing is done, when the ring is full or the frame is
+    /// longer than a slot.
     bool put(const void* frame, size_t length);
 
     /// The same without a copy: the slot of the next frame, `frameBytes` long, to be filled in
-    /// place, or null when the ring is full. The reader sees it when publish() is called.
+    /// place, where an earlier frame's bytes are, or null when the ring is full. The reader sees it when publish() is called.
     uint8_t* next() const;
 
     /// Publishes the frame that next() gave room for, and wakes the reader. REQUIRES: next() has

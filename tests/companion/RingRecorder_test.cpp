@@ -9,6 +9,7 @@
 #include <thread>
 
 #include "binder/PlatformShims.h"
+#include "tests/support/NoThreads.h"
 
 namespace pemaro::test {
 
@@ -106,5 +107,33 @@ TEST(RingRecorder, WaitsForNoThread) {
     release.set_value();
     gone.get_future().wait();
 }
+
+TEST(RingRecorder, RefusesAnEmptyFunction) {
+    RingRecorder recorder;
+    ASSERT_EQ(STATUS_NO_ERROR, recorder.prepare(16, 4));
+    EXPECT_EQ(STATUS_BAD_PARAMETER, recorder.start(nullptr));
+    EXPECT_EQ(STATUS_NO_ERROR, recorder.start([](RingWriter&) { std::this_thread::yield(); }));
+}
+
+#ifdef __GLIBC__
+// Asks the recorder when the function that captured it is destroyed.
+struct Asking {
+    explicit Asking(RingRecorder& recorder) : mRecorder(recorder) {}
+    ~Asking() { static_cast<void>(mRecorder.memory()); }
+    RingRecorder& mRecorder;
+};
+
+TEST(RingRecorder, HoldsNoLockWhenThereIsNoThread) {
+    RingRecorder recorder;
+    ASSERT_EQ(STATUS_NO_ERROR, recorder.prepare(16, 4));
+    {
+        const NoThreads none;
+        EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE,
+                  recorder.start([asking = std::make_shared<Asking>(recorder)](RingWriter&) {}));
+    }
+    EXPECT_EQ(STATUS_NO_ERROR, recorder.start([](RingWriter&) { std::this_thread::yield(); }))
+            << "it is prepared still";
+}
+#endif
 
 }  // namespace pemaro::test

@@ -3,7 +3,6 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <pthread.h>
 
 #include <atomic>
 #include <cerrno>
@@ -13,6 +12,7 @@
 
 #include "tests/companion/TouchCompanionClientTest.h"
 #include "tests/support/FakeClock.h"
+#include "tests/support/NoThreads.h"
 #include "tests/support/RecordingBinder.h"
 
 namespace pemaro::test {
@@ -946,26 +946,6 @@ TEST_F(TouchCompanionRecording, GoesOnWhenAnotherStartIsRefused) {
 }
 
 #ifdef __GLIBC__
-// Stacks that no process has room for.
-class NoThreads {
-  public:
-    NoThreads() {
-        pthread_getattr_default_np(&mUsual);
-        pthread_attr_t huge;
-        pthread_attr_init(&huge);
-        pthread_attr_setstacksize(&huge, size_t{1} << 46);
-        EXPECT_EQ(0, pthread_setattr_default_np(&huge));
-        pthread_attr_destroy(&huge);
-    }
-    ~NoThreads() {
-        EXPECT_EQ(0, pthread_setattr_default_np(&mUsual));
-        pthread_attr_destroy(&mUsual);
-    }
-
-  private:
-    pthread_attr_t mUsual;
-};
-
 TEST_F(TouchCompanionRecording, FailsWithoutAThread) {
     const sp<TouchCompanionClient> client = connect(Frames::callback, &mFrames);
     mService->cblk = mRing.memory();
