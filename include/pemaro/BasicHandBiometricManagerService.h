@@ -34,10 +34,7 @@ class BasicHandBiometricManagerService : public BnHandBiometricManagerService {
         count = 0;
         return STATUS_UNSUPPORTED;
     }
-    int getProfileList(std::vector<std::string>& names) override {
-        names.clear();
-        return STATUS_UNSUPPORTED;
-    }
+    int getProfileList(std::vector<std::string>&) override { return STATUS_UNSUPPORTED; }
     int enableWakeup() override { return STATUS_UNSUPPORTED; }
     int disableWakeup() override { return STATUS_UNSUPPORTED; }
 

@@ -55,11 +55,13 @@ class Subscribers {
 
     /// Calls `call` with each client, one after another and with no lock held: a client may take
     /// its time, or call the service from within. One that it returns 0x40000000 for, as a proxy
-    /// does when its process is no more, is let go of.
+    /// does when a call does not get through, is let go of when its process is no more. A client
+    /// that is alive and too slow, so that a call finds no room, has lost that report and no other.
     template <typename Call>
     void report(Call call) {
         for (const android::sp<Client>& client : clients()) {
-            if (call(*client) == STATUS_UNKNOWN_ERROR) {
+            if (call(*client) == STATUS_UNKNOWN_ERROR &&
+                !android::IInterface::asBinder(client)->isBinderAlive()) {
                 remove(client);
             }
         }

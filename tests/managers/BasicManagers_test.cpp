@@ -77,7 +77,8 @@ TEST(BasicGestureManagerService, OffersNothing) {
 TEST(BasicHandBiometricManagerService, OffersNothing) {
     const sp<BasicHandBiometricManagerService> service = new BasicHandBiometricManagerService;
     unsigned int most = 7;
-    std::vector<std::string> names = {"left over"};
+    const std::vector<std::string> held = {"of the caller"};
+    std::vector<std::string> names = held;
     EXPECT_EQ(STATUS_UNSUPPORTED, service->startEnrollment());
     EXPECT_EQ(STATUS_UNSUPPORTED, service->stopEnrollment());
     EXPECT_EQ(STATUS_UNSUPPORTED, service->scan());
@@ -93,7 +94,7 @@ TEST(BasicHandBiometricManagerService, OffersNothing) {
     EXPECT_EQ(STATUS_UNSUPPORTED, service->enableWakeup());
     EXPECT_EQ(STATUS_UNSUPPORTED, service->disableWakeup());
     EXPECT_EQ(0u, most);
-    EXPECT_TRUE(names.empty());
+    EXPECT_EQ(held, names) << "names are appended";
 }
 
 TEST(BasicServices, ReportToTheirSubscribers) {
@@ -143,10 +144,17 @@ TEST(Subscribers, KnowAClientByItsBinder) {
     EXPECT_EQ(0u, subscribers.size());
 }
 
-TEST(Subscribers, LetGoOfWhoCannotBeReached) {
+// A client whose process may be no more.
+struct RemoteGestureManagerClient : RecordingGestureManagerClient {
+    bool isBinderAlive() const override { return isAlive; }
+    bool isAlive = true;
+};
+
+TEST(Subscribers, LetGoOfWhoIsNoMore) {
     Subscribers<IGestureManagerClient> subscribers;
-    const sp<IGestureManagerClient> dead = new RecordingGestureManagerClient;
+    const sp<RemoteGestureManagerClient> dead = new RemoteGestureManagerClient;
     const sp<IGestureManagerClient> cross = new RecordingGestureManagerClient;
+    dead->isAlive = false;
     subscribers.add(dead);
     subscribers.add(cross);
     int calls = 0;
@@ -161,6 +169,14 @@ TEST(Subscribers, LetGoOfWhoCannotBeReached) {
     EXPECT_EQ(1u, subscribers.size());
     subscribers.report(report);
     EXPECT_EQ(3, calls);
+}
+
+TEST(Subscribers, KeepWhoMissedAReport) {
+    Subscribers<IGestureManagerClient> subscribers;
+    const sp<IGestureManagerClient> busy = new RemoteGestureManagerClient;
+    subscribers.add(busy);
+    subscribers.report([](IGestureManagerClient&) { return STATUS_UNKNOWN_ERROR; });
+    EXPECT_EQ(1u, subscribers.size());
 }
 
 }  // namespace pemaro::test
