@@ -20,13 +20,19 @@ std::string textOf(const android::String16& name) {
 
 void FakeServiceManager::add(const std::string& name,
                              const android::sp<android::IBinder>& service) {
+    android::sp<android::IBinder> held = service;  // takes what is let go, outside the lock
     std::lock_guard<std::mutex> lock(mLock);
-    mServices[name] = service;
+    std::swap(mServices[name], held);
 }
 
 void FakeServiceManager::remove(const std::string& name) {
+    android::sp<android::IBinder> held;
     std::lock_guard<std::mutex> lock(mLock);
-    mServices.erase(name);
+    const auto found = mServices.find(name);
+    if (found != mServices.end()) {
+        std::swap(found->second, held);
+        mServices.erase(found);
+    }
 }
 
 int FakeServiceManager::lookups(const std::string& name) const {
@@ -37,7 +43,7 @@ int FakeServiceManager::lookups(const std::string& name) const {
 
 void FakeServiceManager::onLookup(LookupHook hook) {
     std::lock_guard<std::mutex> lock(mLock);
-    mHook = std::move(hook);
+    mHook.swap(hook);
 }
 
 android::sp<android::IBinder> FakeServiceManager::find(const android::String16& name16) const {
