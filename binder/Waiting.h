@@ -7,7 +7,7 @@
 
 namespace pemaro {
 
-/// The library's only two ways to wait, in one place so that tests can replace them.
+/// How the lookup of a service and the ring's reader wait, in one place so that tests can replace it.
 struct WaitHooks {
     int (*condTimedWait)(pthread_cond_t* cond, pthread_mutex_t* mutex, const timespec* deadline);
     int (*sleepMicros)(useconds_t micros);

@@ -13,6 +13,8 @@
 
 #include "values/NumberText.h"
 
+#include <locale.h>
+
 #include <cfloat>
 #include <cmath>
 #include <cstdio>
@@ -150,6 +152,16 @@ bool scanPlainFloat(const char* text, float& value) {
     return true;
 }
 
+/// What is left to sscanf. A process may have a locale whose decimal point is a comma; what peers
+/// write has a point.
+int scanAnyFloat(const char* text, float& value) {
+    static const locale_t plain = newlocale(LC_NUMERIC_MASK, "C", nullptr);
+    const locale_t own = uselocale(plain);
+    const int count = sscanf(text, "%f", &value);
+    uselocale(own);
+    return count;
+}
+
 }  // namespace
 
 std::string formatUnsigned(uint32_t value) {
@@ -214,7 +226,7 @@ bool scanSigned(const char* text, int32_t& value) {
 }
 
 bool scanFloat(const char* text, float& value) {
-    return scanPlainFloat(text, value) || sscanf(text, "%f", &value) == 1;
+    return scanPlainFloat(text, value) || scanAnyFloat(text, value) == 1;
 }
 
 }  // namespace pemaro

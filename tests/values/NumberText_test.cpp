@@ -5,11 +5,15 @@
 #include "values/NumberText.h"
 
 #include <gtest/gtest.h>
+#include <locale.h>
+#include <unistd.h>
 
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <filesystem>
+#include <fstream>
 #include <iostream>
 #include <limits>
 #include <random>
@@ -46,6 +50,47 @@ uint32_t bitsOf(float value) {
     memcpy(&bits, &value, sizeof(bits));
     return bits;
 }
+
+#ifdef __GLIBC__
+// A locale with the decimal point of most of Europe, as localedef makes it, without its help.
+class CommaLocale {
+  public:
+    CommaLocale() {
+        static constexpr char kNumeric[] =
+                "\x14\x11\x03\x20\x06\0\0\0\x20\0\0\0\x22\0\0\0\x23\0\0\0\x24\0\0\0"
+                "\x28\0\0\0\x2c\0\0\0,\0\0\0,\0\0\0\0\0\0\0ANSI_X3.4-1968";
+        namespace fs = std::filesystem;
+        const fs::path folder = testing::TempDir() + "NumberText_test." + std::to_string(getpid());
+        fs::create_directories(folder / "comma");
+        std::ofstream(folder / "comma" / "LC_NUMERIC").write(kNumeric, sizeof(kNumeric));
+        setenv("LOCPATH", folder.c_str(), 1);
+        mLocale = newlocale(LC_NUMERIC_MASK, "comma", nullptr);
+        unsetenv("LOCPATH");
+        fs::remove_all(folder);
+        uselocale(mLocale);
+    }
+    ~CommaLocale() {
+        uselocale(LC_GLOBAL_LOCALE);
+        freelocale(mLocale);
+    }
+
+  private:
+    locale_t mLocale;
+};
+
+// What peers send does not depend on where the user is, however many digits it has.
+TEST(NumberText, ReadsAPointInEveryLocale) {
+    const CommaLocale comma;
+    ASSERT_EQ(1.5f, strtof("1,5", nullptr));
+    for (const char* text : {"1.5", "0.15e1", "1.50000000000000000000000000", "0x1.8p0"}) {
+        float value = 0;
+        EXPECT_TRUE(scanFloat(text, value));
+        EXPECT_EQ(1.5f, value) << text;
+    }
+    EXPECT_EQ("1.500000", formatFloat(1.5f));
+    EXPECT_EQ(1.5f, strtof("1,5", nullptr)) << "the process keeps its locale";
+}
+#endif
 
 TEST(NumberText, FormatsIntegersAsPrintfDoes) {
     std::mt19937_64 random(seedOfTheRun());
