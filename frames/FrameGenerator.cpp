@@ -8,7 +8,8 @@
 namespace pemaro::frames {
 namespace {
 
-constexpr uint32_t kMaxSide = 65535;
+/// What the header has room to tell: of columns, of rows, and of fingers.
+constexpr uint32_t kMaxCount = 65535;
 /// A finger touches this many cells to each side of its centre.
 constexpr uint32_t kReach = 3;
 constexpr float kSigma = 1.3f;
@@ -28,12 +29,12 @@ FingerRecord fingerAt(uint32_t id, double seconds) {
 
 FrameGenerator::FrameGenerator(uint32_t frameBytes, uint32_t fingers) {
     const uint32_t room = frameBytes - static_cast<uint32_t>(sizeof(FrameHeader));
-    mFingers = std::min<uint32_t>(fingers, room / sizeof(FingerRecord));
+    mFingers = std::min({fingers, kMaxCount, room / static_cast<uint32_t>(sizeof(FingerRecord))});
     const uint32_t cells = (room - mFingers * sizeof(FingerRecord)) / sizeof(int16_t);
     // Panels are taller than wide: about 9 columns for 16 rows.
     mColumns = static_cast<uint32_t>(std::sqrt(cells * 9.0 / 16.0));
-    mColumns = std::clamp(mColumns, std::min(cells, 1u), kMaxSide);
-    mRows = mColumns == 0 ? 0 : std::min(cells / mColumns, kMaxSide);
+    mColumns = std::clamp(mColumns, std::min(cells, 1u), kMaxCount);
+    mRows = mColumns == 0 ? 0 : std::min(cells / mColumns, kMaxCount);
 }
 
 const std::vector<uint8_t>& FrameGenerator::draw(uint32_t sequence, uint64_t timeNs,

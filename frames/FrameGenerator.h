@@ -17,7 +17,7 @@ constexpr int16_t kFingerPeak = 1200;
 class FrameGenerator {
   public:
     /// REQUIRES: frameBytes >= sizeof(FrameHeader). There is room for so many fingers; those that do
-    /// not fit are left out.
+    /// not fit, or that the header cannot count, are left out.
     FrameGenerator(uint32_t frameBytes, uint32_t fingers);
 
     /// The next frame, valid until the next call; its size is the frame's length. As many fingers as

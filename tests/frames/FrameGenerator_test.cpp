@@ -76,6 +76,14 @@ TEST(FrameGenerator, DrawsTheSameFrameForTheSameMoment) {
     EXPECT_EQ(one.draw(5, 123456789, kFilterDefault), other.draw(5, 123456789, kFilterDefault));
 }
 
+TEST(FrameGenerator, DrawsNoMoreFingersThanTheHeaderCanCount) {
+    constexpr uint32_t kTooMany = 70000;
+    FrameGenerator generator(sizeof(FrameHeader) + kTooMany * sizeof(FingerRecord), kTooMany);
+    EXPECT_EQ(65535u, Picture(generator.draw(0, 0, kFilterDefault)).fingers.size());
+    const std::vector<FingerRecord> fingers(kTooMany, FingerRecord{1, 2, 3, 4});
+    EXPECT_EQ(65535u, Picture(generator.draw(0, 0, kFilterDefault, fingers)).fingers.size());
+}
+
 TEST(FrameGenerator, LeavesOutWhatTheFilterLeavesOut) {
     FrameGenerator generator(4096, 3);
     struct {
