@@ -46,7 +46,7 @@ const char* frameFault(const void* frame, size_t length) {
     if (fault != nullptr) {
         return fault;
     }
-    return frameChecksum(frame, length) == header.checksum ? nullptr : "wrong checksum";
+    return frameChecksum(frame, length) == header.checksum ? nullptr : kWrongChecksum;
 }
 
 }  // namespace pemaro::frames

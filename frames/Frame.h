@@ -70,6 +70,9 @@ bool readFrameHeader(const void* frame, size_t length, FrameHeader* header);
 /// Null for a header that a frame of `length` bytes can have, else what is wrong with it.
 const char* frameHeaderFault(const FrameHeader& header, uint64_t length);
 
+/// What is wrong with a frame that has another checksum than its header tells.
+constexpr const char* kWrongChecksum = "wrong checksum";
+
 /// Null for an intact frame of `length` bytes, else what is wrong with it.
 const char* frameFault(const void* frame, size_t length);
 

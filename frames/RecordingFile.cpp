@@ -9,6 +9,8 @@
 #include <cerrno>
 #include <cstring>
 
+#include "frames/Checksum.h"
+
 namespace pemaro::frames {
 namespace {
 
@@ -29,10 +31,12 @@ bool beginsAsFrame(const uint8_t* bytes, size_t size) {
 std::unique_ptr<RecordingFile> RecordingFile::open(const std::string& path, std::string* problem,
                                                    const Progress& progress,
                                                    size_t maxStreamBytes) {
-    std::unique_ptr<RecordingFile> file(new RecordingFile(path));
-    if (file->load(maxStreamBytes, progress)) {
-        file->split(progress);
+    std::unique_ptr<RecordingFile> file(new RecordingFile(path, progress));
+    if (file->load(maxStreamBytes)) {
+        file->split();
     }
+    file->mProgress = nullptr;
+    file->mChecksums.reset();
     if (!file->mProblem.empty()) {
         *problem = file->mProblem;
         return nullptr;
@@ -40,7 +44,7 @@ std::unique_ptr<RecordingFile> RecordingFile::open(const std::string& path, std:
     return file;
 }
 
-bool RecordingFile::load(size_t maxStreamBytes, const Progress& progress) {
+bool RecordingFile::load(size_t maxStreamBytes) {
     mFd.reset(::open(mPath.c_str(), O_RDONLY | O_CLOEXEC));
     struct stat info {};
     if (!mFd.ok() || fstat(mFd.get(), &info) != 0) {
@@ -51,7 +55,7 @@ bool RecordingFile::load(size_t maxStreamBytes, const Progress& progress) {
     }
     if (S_ISREG(info.st_mode) && info.st_size != 0) {
         mSize = static_cast<uint64_t>(info.st_size);
-    } else if (!loadStream(maxStreamBytes, progress)) {
+    } else if (!loadStream(maxStreamBytes)) {
         return false;
     }
     if (mSize != 0 && !beginsAt(0) && mProblem.empty()) {
@@ -61,7 +65,7 @@ bool RecordingFile::load(size_t maxStreamBytes, const Progress& progress) {
 }
 
 /// What is foreign is left as soon as its first bytes are there: it may go on for ever.
-bool RecordingFile::loadStream(size_t maxBytes, const Progress& progress) {
+bool RecordingFile::loadStream(size_t maxBytes) {
     while (true) {
         mWindow.resize(mSize + kSearchBytes);
         const ssize_t got =
@@ -76,8 +80,8 @@ bool RecordingFile::loadStream(size_t maxBytes, const Progress& progress) {
         if (mSize > maxBytes) {
             return fail("there is no end within " + std::to_string(maxBytes) + " bytes");
         }
-        if (progress && !progress(mSize, 0)) {
-            return fail(kGivenUp);
+        if (!goesOn(mSize, 0)) {
+            return false;
         }
     }
     mWindow.resize(mSize);
@@ -97,40 +101,73 @@ const uint8_t* RecordingFile::bytes(const Part& part) const {
     return found;
 }
 
+bool RecordingFile::isInWindow(uint64_t offset, uint64_t length) const {
+    return offset >= mWindowOffset && offset + length <= mWindowOffset + mWindow.size();
+}
+
 /// These bytes, until the next call. REQUIRES: the file had so many when it was opened.
 const uint8_t* RecordingFile::at(uint64_t offset, uint64_t length) const {
-    const bool isHere =
-            offset >= mWindowOffset && offset + length <= mWindowOffset + mWindow.size();
-    if (isHere) {
-        return mWindow.data() + (offset - mWindowOffset);
-    }
-    mWindow.resize(std::min(std::max(length, kWindowBytes), mSize - offset));
-    mWindowOffset = offset;
-    size_t have = 0;
-    ssize_t got = 1;
-    while (have < mWindow.size() && got > 0) {
-        got = TEMP_FAILURE_RETRY(pread(mFd.get(), mWindow.data() + have, mWindow.size() - have,
-                                       static_cast<off_t>(offset + have)));
-        have += static_cast<size_t>(std::max<ssize_t>(got, 0));
-    }
-    mWindow.resize(have);
-    if (have < length) {
-        fail(got < 0 ? strerror(errno) : kChanged);
-        return nullptr;
-    }
-    return mWindow.data();
-}
-
-void RecordingFile::split(const Progress& progress) {
-    for (uint64_t offset = 0; offset < mSize && mProblem.empty(); offset += mParts.back().length) {
-        mParts.push_back(partAt(offset));
-        if (progress && !progress(offset, mSize)) {
-            fail(kGivenUp);
+    if (!isInWindow(offset, length)) {
+        mWindow.resize(std::min(std::max(length, kWindowBytes), mSize - offset));
+        mWindowOffset = offset;
+        mWindow.resize(readAt(offset, length, mWindow.data(), mWindow.size()));
+        if (mWindow.size() < length) {
+            return nullptr;
         }
     }
+    return mWindow.data() + (offset - mWindowOffset);
 }
 
-RecordingFile::Part RecordingFile::partAt(uint64_t offset) const {
+/// The same for a look ahead, from where the window would have to come back: what is not in it is read
+/// into `room`.
+const uint8_t* RecordingFile::aside(uint64_t offset, uint64_t length, uint8_t* room) const {
+    if (isInWindow(offset, length)) {
+        return mWindow.data() + (offset - mWindowOffset);
+    }
+    return readAt(offset, length, room, length) < length ? nullptr : room;
+}
+
+/// How many bytes were read, all that the file has of them; with a problem where it has not even the least.
+size_t RecordingFile::readAt(uint64_t offset, uint64_t least, uint8_t* bytes, size_t size) const {
+    size_t have = 0;
+    ssize_t got = 1;
+    while (have < size && got > 0) {
+        got = TEMP_FAILURE_RETRY(
+                pread(mFd.get(), bytes + have, size - have, static_cast<off_t>(offset + have)));
+        have += static_cast<size_t>(std::max<ssize_t>(got, 0));
+    }
+    if (have < least) {
+        fail(got < 0 ? strerror(errno) : kChanged);
+    }
+    return have;
+}
+
+void RecordingFile::split() {
+    mChecksums.emplace([this](uint64_t begin, uint64_t end, uint32_t* crc) {
+        return addTo(crc, begin, end) && goesOn(end, mSize);
+    });
+    mDone = 0;
+    uint64_t offset = 0;
+    while (offset < mSize) {
+        mParts.push_back(partAt(offset));
+        if (!goesOn(offset, mSize)) {
+            break;
+        }
+        offset += mParts.back().length;
+    }
+}
+
+/// Whether there is a reason to: no problem, nor that somebody gives up.
+bool RecordingFile::goesOn(uint64_t done, uint64_t total) {
+    // A checksum reaches further than the look for the next frame that it is made for.
+    mDone = std::max(mDone, done);
+    if (mProblem.empty() && mProgress && !mProgress(mDone, total)) {
+        fail(kGivenUp);
+    }
+    return mProblem.empty();
+}
+
+RecordingFile::Part RecordingFile::partAt(uint64_t offset) {
     const uint64_t left = mSize - offset;
     Part part{Kind::kFrame, offset, 0, {}, nullptr};
     const bool hasHeader = isFrameAt(offset, &part.header);
@@ -161,9 +198,9 @@ RecordingFile::Part RecordingFile::partAt(uint64_t offset) const {
 }
 
 /// Where the next intact frame begins; the size of the file where there is none.
-uint64_t RecordingFile::findIntact(uint64_t offset) const {
+uint64_t RecordingFile::findIntact(uint64_t offset) {
     FrameHeader header;
-    while (mSize - offset >= sizeof(kFrameMagic)) {
+    while (mSize - offset >= sizeof(kFrameMagic) && goesOn(offset, mSize)) {
         const uint64_t size = std::min(mSize - offset, kSearchBytes);
         const uint8_t* bytes = at(offset, size);
         if (bytes == nullptr) {
@@ -197,18 +234,37 @@ bool RecordingFile::beginsAt(uint64_t offset) const {
     if (size == 0) {
         return true;
     }
-    const uint8_t* bytes = at(offset, size);
+    uint8_t room[sizeof(kFrameMagic)];
+    const uint8_t* bytes = aside(offset, size, room);
     return bytes != nullptr && beginsAsFrame(bytes, size);
 }
 
 /// What is wrong with the frame that has this header. What contradicts itself is not read for it.
-const char* RecordingFile::faultAt(uint64_t offset, const FrameHeader& header) const {
+const char* RecordingFile::faultAt(uint64_t offset, const FrameHeader& header) {
     const char* fault = frameHeaderFault(header, header.length);
     if (fault != nullptr) {
         return fault;
     }
-    const uint8_t* bytes = at(offset, header.length);
-    return bytes == nullptr ? kChanged : frameFault(bytes, header.length);
+    // A short one is read at once. Long ones may overlap, each header within the frame of the one before.
+    if (header.length <= SpanChecksums::kBlockBytes) {
+        const uint8_t* bytes = at(offset, header.length);
+        return bytes == nullptr ? kChanged : frameFault(bytes, header.length);
+    }
+    uint32_t checksum = frameChecksum(&header, sizeof(header));
+    if (!mChecksums->add(offset + sizeof(header), offset + header.length, &checksum)) {
+        return kChanged;
+    }
+    return checksum == header.checksum ? nullptr : kWrongChecksum;
+}
+
+/// Continues a CRC-32 by no more than a block of the file.
+bool RecordingFile::addTo(uint32_t* crc, uint64_t begin, uint64_t end) {
+    uint8_t room[SpanChecksums::kBlockBytes];
+    const uint8_t* bytes = aside(begin, end - begin, room);
+    if (bytes != nullptr) {
+        *crc = crc32(bytes, end - begin, *crc);
+    }
+    return bytes != nullptr;
 }
 
 bool RecordingFile::fail(const std::string& reason) const {

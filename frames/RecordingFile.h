@@ -7,10 +7,12 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "frames/Frame.h"
+#include "frames/SpanChecksums.h"
 
 namespace pemaro::frames {
 
@@ -67,23 +69,34 @@ class RecordingFile {
     const std::string& problem() const { return mProblem; }
 
   private:
-    explicit RecordingFile(const std::string& path) : mPath(path) {}
+    RecordingFile(const std::string& path, const Progress& progress)
+            : mPath(path), mProgress(progress) {}
 
-    bool load(size_t maxStreamBytes, const Progress& progress);
-    bool loadStream(size_t maxBytes, const Progress& progress);
-    void split(const Progress& progress);
-    Part partAt(uint64_t offset) const;
-    uint64_t findIntact(uint64_t offset) const;
+    bool load(size_t maxStreamBytes);
+    bool loadStream(size_t maxBytes);
+    void split();
+    bool goesOn(uint64_t done, uint64_t total);
+    Part partAt(uint64_t offset);
+    uint64_t findIntact(uint64_t offset);
     bool isFrameAt(uint64_t offset, FrameHeader* header) const;
     bool beginsAt(uint64_t offset) const;
-    const char* faultAt(uint64_t offset, const FrameHeader& header) const;
+    const char* faultAt(uint64_t offset, const FrameHeader& header);
+    bool addTo(uint32_t* crc, uint64_t begin, uint64_t end);
+    bool isInWindow(uint64_t offset, uint64_t length) const;
     const uint8_t* at(uint64_t offset, uint64_t length) const;
+    const uint8_t* aside(uint64_t offset, uint64_t length, uint8_t* room) const;
+    size_t readAt(uint64_t offset, uint64_t least, uint8_t* bytes, size_t size) const;
     bool fail(const std::string& reason) const;
 
     const std::string mPath;
     android::base::unique_fd mFd;
     uint64_t mSize = 0;
     std::vector<Part> mParts;
+
+    /// While it is opened.
+    Progress mProgress;
+    uint64_t mDone = 0;
+    std::optional<SpanChecksums> mChecksums;
 
     /// What was read last of the file, and where it stands there; all of what is no file.
     mutable std::vector<uint8_t> mWindow;

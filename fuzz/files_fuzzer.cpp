@@ -13,6 +13,7 @@
 #include "frames/FrameContent.h"
 #include "frames/FrameGenerator.h"
 #include "frames/RecordingFile.h"
+#include "frames/SpanChecksums.h"
 #include "fuzz/support/MemoryFile.h"
 #include "fuzz/support/ParcelInput.h"
 #include "tools/zelkctl/files/ConfigFile.h"
@@ -37,15 +38,19 @@ void damage(void* bytes, size_t size, FuzzedDataProvider& input) {
 /// Frames, some of them damaged, with anything before, between and behind them.
 std::string recording(FuzzedDataProvider& input) {
     static auto& generator = *new frames::FrameGenerator(96, 1);
+    // Some are longer than what is read at once for a checksum.
+    static auto& longer = *new frames::FrameGenerator(frames::SpanChecksums::kBlockBytes + 1024, 1);
     std::string bytes;
     for (uint32_t left = input.ConsumeIntegralInRange<uint32_t>(0, 6); left > 0; --left) {
         if (input.ConsumeBool()) {
             bytes += input.ConsumeRandomLengthString(64);
             continue;
         }
+        const auto sequence = input.ConsumeIntegral<uint8_t>();
+        const auto time = input.ConsumeIntegral<uint64_t>();
         const auto& drawn =
-                generator.draw(input.ConsumeIntegral<uint8_t>(), input.ConsumeIntegral<uint64_t>(),
-                               input.ConsumeIntegralInRange<uint32_t>(0, 3));
+                (sequence % 8 == 7 ? longer : generator)
+                        .draw(sequence, time, input.ConsumeIntegralInRange<uint32_t>(0, 3));
         std::string frame(drawn.begin(), drawn.end());
         damage(frame.data(), frame.size(), input);
         bytes += frame;

@@ -3,16 +3,20 @@
 
 #include <gtest/gtest.h>
 #include <signal.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstring>
 #include <fstream>
+#include <random>
 #include <string>
 #include <thread>
 #include <utility>
 #include <vector>
 
+#include "frames/Checksum.h"
 #include "frames/FrameGenerator.h"
 
 namespace pemaro::frames {
@@ -29,6 +33,96 @@ struct Expected {
     size_t length;
     const char* problem;
 };
+
+/// The parts of a recording, found in the plainest way.
+std::vector<Expected> partsOf(const std::string& bytes) {
+    const auto isIntact = [&bytes](size_t offset, const FrameHeader& header) {
+        return header.length <= bytes.size() - offset &&
+               frameFault(&bytes[offset], header.length) == nullptr;
+    };
+    const auto headerAt = [&bytes](size_t offset, FrameHeader* header) {
+        return readFrameHeader(&bytes[offset], bytes.size() - offset, header);
+    };
+    std::vector<Expected> parts;
+    for (size_t offset = 0; offset < bytes.size(); offset += parts.back().length) {
+        const size_t left = bytes.size() - offset;
+        FrameHeader header{};
+        const bool hasHeader = headerAt(offset, &header);
+        if (hasHeader && header.length >= sizeof(header) && header.length <= left) {
+            const char* fault = frameFault(&bytes[offset], header.length);
+            const size_t behind = std::min(left - header.length, sizeof(kFrameMagic));
+            if (fault == nullptr ||
+                memcmp(&bytes[offset] + header.length, &kFrameMagic, behind) == 0) {
+                const Kind kind = fault == nullptr ? Kind::kFrame : Kind::kCorrupt;
+                parts.push_back({kind, offset, header.length, fault});
+                continue;
+            }
+        }
+        size_t next = offset + 1;
+        FrameHeader other{};
+        while (next < bytes.size() && !(headerAt(next, &other) && isIntact(next, other))) {
+            next += 1;
+        }
+        const bool isMagic =
+                memcmp(&bytes[offset], &kFrameMagic, std::min(left, sizeof(kFrameMagic))) == 0;
+        const bool isCut = hasHeader ? header.length > left : left < sizeof(header) && isMagic;
+        if (isCut && next == bytes.size()) {
+            parts.push_back({Kind::kTruncated, offset, left, "the file ends within this frame"});
+        } else {
+            parts.push_back(
+                    {Kind::kCorrupt, offset, next - offset,
+                     hasHeader ? "a length that leads to no other frame" : "no frame begins here"});
+        }
+    }
+    return parts;
+}
+
+/// A header that does not contradict itself, of a frame without fingers whose checksum is another one.
+FrameHeader headerOf(uint16_t columns, uint16_t rows) {
+    FrameHeader header{};
+    header.magic = kFrameMagic;
+    header.version = kFrameVersion;
+    header.headerBytes = sizeof(header);
+    header.filter = kFilterImage;
+    header.columns = columns;
+    header.rows = rows;
+    header.length = static_cast<uint32_t>(sizeof(header) + sizeof(int16_t) * columns * rows);
+    return header;
+}
+
+std::string bytesOf(const FrameHeader& header) {
+    return {reinterpret_cast<const char*>(&header), sizeof(header)};
+}
+
+/// The checksum of the frame with this header and nothing but zeros.
+uint32_t checksumOfNothing(const FrameHeader& header) {
+    const std::string zeros(1 << 20, '\0');
+    uint32_t crc = frameChecksum(&header, sizeof(header));
+    for (size_t left = header.length - sizeof(header); left > 0;) {
+        const size_t size = std::min(left, zeros.size());
+        crc = crc32(zeros.data(), size, crc);
+        left -= size;
+    }
+    return crc;
+}
+
+/// A file of which one half are headers, each of a frame that is as long as the other half.
+std::string headersUpTo(size_t size) {
+    const auto rows = static_cast<uint16_t>(size / 2 / 1024);
+    std::string bytes;
+    while (bytes.size() < size / 2) {
+        bytes += bytesOf(headerOf(512, rows));
+    }
+    bytes.resize(size, 'x');
+    return bytes;
+}
+
+/// The most memory that this process had, in bytes.
+size_t mostMemory() {
+    rusage usage{};
+    EXPECT_EQ(0, getrusage(RUSAGE_SELF, &usage));
+    return static_cast<size_t>(usage.ru_maxrss) << 10;
+}
 
 class RecordingFileTest : public ::testing::Test {
   protected:
@@ -50,6 +144,13 @@ class RecordingFileTest : public ::testing::Test {
 
     std::unique_ptr<RecordingFile> write(const std::string& bytes) {
         std::ofstream(path, std::ios::binary) << bytes;
+        return RecordingFile::open(path, &problem);
+    }
+
+    /// A frame of nothing but zeros, which take no room on the disk.
+    std::unique_ptr<RecordingFile> writeSparse(const FrameHeader& header) {
+        std::ofstream(path, std::ios::binary) << bytesOf(header);
+        EXPECT_EQ(0, truncate(path.c_str(), header.length));
         return RecordingFile::open(path, &problem);
     }
 
@@ -207,6 +308,91 @@ TEST_F(RecordingFileTest, IsRefusedWhenAPipeHasNoEnd) {
     EXPECT_EQ(nullptr, RecordingFile::open(path, &problem, nullptr, 700 * kLength));
     writer.join();
     EXPECT_EQ("cannot read " + path + ": there is no end within 89600 bytes", problem);
+}
+
+// Frames of all lengths, some within others and some damaged, with anything between them.
+TEST_F(RecordingFileTest, HasThePartsThatAPlainSearchFinds) {
+    std::mt19937 random(1);
+    const auto upTo = [&random](size_t limit) {
+        return std::uniform_int_distribution<size_t>(0, limit)(random);
+    };
+    for (int round = 0; round < 300; ++round) {
+        std::string bytes = frame(0);
+        for (size_t left = upTo(8); left > 0; --left) {
+            FrameGenerator other(static_cast<uint32_t>(40 + upTo(upTo(1) == 0 ? 300 : 20000)), 1);
+            const std::vector<uint8_t>& drawn = other.draw(1, left, kFilterDefault);
+            std::string piece(drawn.begin(), drawn.end());
+            switch (upTo(6)) {
+                case 0:
+                    piece[upTo(piece.size() - 1)] ^= 4;
+                    break;
+                case 1:
+                    piece.resize(upTo(piece.size()));
+                    break;
+                case 2:
+                    piece += std::string(upTo(5000), 'x');
+                    break;
+                case 3:
+                    piece.insert(upTo(piece.size()), frame(1));
+                    break;
+                case 4:
+                    // A frame that these headers claim to be within, one in the other.
+                    piece = headersUpTo(4096 + upTo(8192)) + piece;
+                    break;
+                default:
+                    break;
+            }
+            bytes += piece;
+        }
+        expectParts(bytes, partsOf(bytes));
+        ASSERT_FALSE(HasFailure()) << round;
+    }
+}
+
+// Each of the headers needs a checksum of its own, of all that it claims to be its frame's.
+TEST_F(RecordingFileTest, WorksNoMoreThanTwiceForTwiceAsManyHeadersThatClaimMuch) {
+    uint64_t asked[2] = {0, 0};
+    for (size_t i = 0; i < 2; ++i) {
+        const size_t size = size_t{1} << (18 + i);
+        write(frame(0) + headersUpTo(size));
+        const auto file = RecordingFile::open(path, &problem, [&](uint64_t done, uint64_t total) {
+            EXPECT_LE(done, total);
+            asked[i] += 1;
+            return true;
+        });
+        ASSERT_NE(nullptr, file) << problem;
+        EXPECT_EQ(2u, file->parts().size());
+        // For every header at least.
+        EXPECT_GT(asked[i], size / 2 / sizeof(FrameHeader));
+    }
+    EXPECT_LE(asked[1], asked[0] * 2 + asked[0] / 10);
+}
+
+TEST_F(RecordingFileTest, IsGivenUpAmidDamageAndAmidAFrame) {
+    const std::string long1 = bytesOf(headerOf(1024, 1024)) + std::string(2 << 20, '\0');
+    for (const std::string& bytes :
+         {headersUpTo(1 << 18), frame(0) + std::string(1 << 20, 'x'), frame(0) + long1}) {
+        write(bytes);
+        int asked = 0;
+        EXPECT_EQ(nullptr, RecordingFile::open(path, &problem,
+                                               [&](uint64_t, uint64_t) { return ++asked < 5; }));
+        EXPECT_EQ("cannot read " + path + ": that was given up", problem);
+        EXPECT_EQ(5, asked);
+    }
+}
+
+TEST_F(RecordingFileTest, TakesNoMemoryForWhatAHeaderClaims) {
+    FrameHeader header = headerOf(8192, 8192);
+    header.checksum = checksumOfNothing(header);
+    const size_t before = mostMemory();
+    for (const bool isIntact : {true, false}) {
+        header.checksum ^= isIntact ? 0 : 1;
+        const auto file = writeSparse(header);
+        ASSERT_NE(nullptr, file) << problem;
+        ASSERT_EQ(1u, file->parts().size());
+        EXPECT_EQ(isIntact ? Kind::kFrame : Kind::kCorrupt, file->parts()[0].kind);
+    }
+    EXPECT_LT(mostMemory() - before, size_t{64} << 20);
 }
 
 // Longer than what is read at once, and damaged where that ends.
