@@ -89,6 +89,12 @@ bool RecordingFile::loadStream(size_t maxBytes) {
 }
 
 const uint8_t* RecordingFile::bytes(const Part& part) const {
+    if (part.length > kMaxFrameBytes) {
+        fail("the frame at offset " + std::to_string(part.offset) + " has " +
+             std::to_string(part.length) + " bytes, and " + std::to_string(kMaxFrameBytes) +
+             " are the most");
+        return nullptr;
+    }
     const uint8_t* found = at(part.offset, part.length);
     if (found == nullptr || part.kind != Kind::kFrame) {
         return found;

@@ -46,6 +46,10 @@ class RecordingFile {
     /// How much is taken of what is no file, and may have no end.
     static constexpr size_t kMaxStreamBytes = size_t{1} << 30;
 
+    /// The longest frame that is handed out: 16 times the longest of the simulated stack. A longer one is
+    /// told apart like any other, but what its header claims may be more than the memory.
+    static constexpr size_t kMaxFrameBytes = size_t{16} << 20;
+
     /// Told now and then how many bytes were read of how many, which are 0 where that is not known;
     /// false gives up.
     using Progress = std::function<bool(uint64_t done, uint64_t total)>;
@@ -62,7 +66,7 @@ class RecordingFile {
     /// The whole file, from its beginning to its end.
     const std::vector<Part>& parts() const { return mParts; }
     /// Good until the next call. Null, with the reason in problem(), when the file no longer has
-    /// them; those of an intact frame are intact.
+    /// them or they are more than kMaxFrameBytes; those of an intact frame are intact.
     const uint8_t* bytes(const Part& part) const;
 
     /// Why parts could not be read any more; empty as long as all could.

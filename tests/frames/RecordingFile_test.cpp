@@ -391,8 +391,29 @@ TEST_F(RecordingFileTest, TakesNoMemoryForWhatAHeaderClaims) {
         ASSERT_NE(nullptr, file) << problem;
         ASSERT_EQ(1u, file->parts().size());
         EXPECT_EQ(isIntact ? Kind::kFrame : Kind::kCorrupt, file->parts()[0].kind);
+        EXPECT_EQ(nullptr, file->bytes(file->parts()[0]));
+        EXPECT_EQ("cannot read " + path +
+                          ": the frame at offset 0 has 134217768 bytes, and 16777216 are the most",
+                  file->problem());
     }
     EXPECT_LT(mostMemory() - before, size_t{64} << 20);
+}
+
+TEST_F(RecordingFileTest, GivesOutTheLongestFrameAndNoLongerOne) {
+    FrameHeader header = headerOf(2048, 4095);
+    header.fingers = 507;
+    header.length += header.fingers * sizeof(FingerRecord);
+    ASSERT_EQ(RecordingFile::kMaxFrameBytes, header.length);
+    for (const bool isLonger : {false, true}) {
+        header.fingers += isLonger ? 1 : 0;
+        header.length += isLonger ? sizeof(FingerRecord) : 0;
+        header.checksum = checksumOfNothing(header);
+        const auto file = writeSparse(header);
+        ASSERT_NE(nullptr, file) << problem;
+        ASSERT_EQ(1u, file->parts().size());
+        EXPECT_EQ(Kind::kFrame, file->parts()[0].kind);
+        EXPECT_EQ(isLonger, file->bytes(file->parts()[0]) == nullptr);
+    }
 }
 
 // Longer than what is read at once, and damaged where that ends.
