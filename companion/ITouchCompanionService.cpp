@@ -62,6 +62,7 @@ enum {
     SAVE_SESSION,
     RESTORE_SESSION,
     SET_AUTH,
+    END_OF_CODES,  // stays the last
 };
 
 // Several texts name another operation than their own ("init()" of open and close, "reloadConfig()"
@@ -531,7 +532,7 @@ const StubRow<Service> kRows[] = {
         {replyInt<&Service::restoreSession>},
         {replyText<&Service::setAuth>},
 };
-static_assert(sizeof(kRows) / sizeof(kRows[0]) == SET_AUTH, "one row a code");
+static_assert(sizeof(kRows) / sizeof(kRows[0]) + 1 == END_OF_CODES, "one row a code");
 
 }  // namespace
 

@@ -34,6 +34,7 @@ enum {
     VERIFY_GESTURE,
     GET_MAX_PREDEFINED_GESTURE,
     GET_MAX_USERDEFINED_GESTURE,
+    END_OF_CODES,  // stays the last
 };
 
 // Log readers know these texts so; they stay: the wake-up operations fail as "enable()" and
@@ -171,7 +172,7 @@ const StubRow<Service> kRows[] = {
          "GET_MAX_USERDEFINED_GESTURE transact received...",
          "GET_MAX_USERDEFINED_GESTURE transact finished..."},
 };
-static_assert(sizeof(kRows) / sizeof(kRows[0]) == GET_MAX_USERDEFINED_GESTURE, "one row a code");
+static_assert(sizeof(kRows) / sizeof(kRows[0]) + 1 == END_OF_CODES, "one row a code");
 
 }  // namespace
 

@@ -42,6 +42,7 @@ enum {
     GET_PROFILELIST,
     ENABLE_WAKEUP,
     DISABLE_WAKEUP,
+    END_OF_CODES,  // stays the last
 };
 
 // Log readers know these texts so; they stay: only the subscriptions fail with parentheses, and the
@@ -224,7 +225,7 @@ const StubRow<Service> kRows[] = {
         {replyPlain<&Service::enableWakeup>, "ENABLE_WAKEUP transact received..."},
         {replyPlain<&Service::disableWakeup>, "DISABLE_WAKEUP transact received..."},
 };
-static_assert(sizeof(kRows) / sizeof(kRows[0]) == DISABLE_WAKEUP, "one row a code");
+static_assert(sizeof(kRows) / sizeof(kRows[0]) + 1 == END_OF_CODES, "one row a code");
 
 }  // namespace
 

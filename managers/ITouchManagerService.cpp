@@ -28,6 +28,7 @@ enum {
     ENABLE,
     DISABLE,
     CONFIGURE_VM_REGION,
+    END_OF_CODES,  // stays the last
 };
 
 constexpr ProxyRow kIsSupported = {IS_SUPPORTED, "Bp::isSupported", "isSupported() error: %s"};
@@ -122,7 +123,7 @@ const StubRow<Service> kRows[] = {
         {replyInt<&Service::disable>, "DISABLE transact received..."},
         {onConfigureVmRegion, "CONFIGURE_VM_REGION transact received..."},
 };
-static_assert(sizeof(kRows) / sizeof(kRows[0]) == CONFIGURE_VM_REGION, "one row a code");
+static_assert(sizeof(kRows) / sizeof(kRows[0]) + 1 == END_OF_CODES, "one row a code");
 
 }  // namespace
 
