@@ -56,8 +56,14 @@ TEST(BasicTouchCompanionService, LetsAClientConnect) {
     EXPECT_EQ(STATUS_UNSUPPORTED, client->setAuth("a"));
     EXPECT_EQ(STATUS_UNSUPPORTED, client->getPacketSize());
     EXPECT_EQ(STATUS_UNSUPPORTED, client->setRecordOutput(1));
-    EXPECT_EQ(STATUS_NO_ERROR, service->unregisterClient());
+}
+
+TEST(BasicTouchCompanionService, LetsEverybodyComeAndGo) {
+    const sp<BasicTouchCompanionService> service = new BasicTouchCompanionService;
+    EXPECT_EQ(STATUS_NO_ERROR, service->registerClient(nullptr));
+    EXPECT_EQ(STATUS_NO_ERROR, service->open());
     EXPECT_EQ(STATUS_NO_ERROR, service->close());
+    EXPECT_EQ(STATUS_NO_ERROR, service->unregisterClient());
 }
 
 namespace {

@@ -9,9 +9,9 @@ trap 'rm -rf -- "$folder"' EXIT
 failures=0
 
 cd -- "$here/../.."
-cp -r --parents -- include companion/ITouchCompanionService.cpp managers docs/*-protocol.md simulator/faults \
-    fuzz/proxies_fuzzer.cpp tools/zelkctl tests/companion tests/managers tests/faults \
-    tests/install/consumer "$folder"
+cp -r --parents -- include companion/ITouchCompanionService.cpp managers docs/*-protocol.md \
+    simulator/{companion,faults,managers} fuzz/proxies_fuzzer.cpp tools/zelkctl \
+    tests/companion tests/managers tests/faults tests/install/consumer "$folder"
 cd -- "$folder"
 
 # forget FILE SED-COMMAND [NAMED]: what a contributor may forget; the file is named, or what NAMED says.
@@ -41,6 +41,9 @@ forget() {
     forget tools/zelkctl/services/Interfaces.cpp '/{"setAuth"}/d'
     forget tools/zelkctl/services/Interfaces.cpp 's/"isSupported"/"isEnabled"/'
     forget tools/zelkctl/services/Interfaces.cpp 's/"getAFEParams (map)"/"getAFEParams"/'
+    forget tools/zelkctl/services/Interfaces.cpp 's/{"unsubscribe", &kGestureClient}/{"unsubscribe"}/'
+    forget tools/zelkctl/services/Interfaces.cpp 's/{"getCblk", nullptr, &kMemory}/{"getCblk"}/'
+    forget tools/zelkctl/services/Interfaces.cpp 's/{"getCblk", nullptr, &kMemory}/{"getCblk", \&kMemory}/'
     forget tools/zelkctl/conformance/Operations.cpp '/"setSecurity of no level"/d'
     forget tools/zelkctl/conformance/Operations.cpp 's/, 12 renameProfile//'
     forget tests/faults/Operations.cpp '/hand->scan()/d'
@@ -51,5 +54,11 @@ forget() {
     forget tests/companion/ITouchCompanionService_test.cpp '/Service::setAuth/d'
     forget tests/companion/BnTouchCompanionService_test.cpp 's/{"saveSession", 26/{"saveSession", 99/'
     forget tests/managers/ManagerStubs_test.cpp '/deleteGesture/d'
+    forget tests/companion/BasicTouchCompanionService_test.cpp '/service->setAuth/d'
+    forget tests/managers/BasicManagers_test.cpp '/service->deleteProfile/d'
+    forget simulator/companion/TouchCompanionSimulator.cpp 's/perform("setAuth"/perform("setauth"/'
+    forget simulator/companion/TouchCompanionSimulator.cpp 's/ForClient("close"/ForClient("open"/'
+    forget simulator/managers/ManagerSimulator.h 's/"unsubscribe"/"subscribe"/' GestureManagerSimulator.cpp
+    forget simulator/managers/HandBiometricManagerSimulator.cpp 's/begin("scan"/begin("startMatching"/'
 }
 ((failures == 0))
