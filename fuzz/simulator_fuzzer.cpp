@@ -6,8 +6,11 @@
 #include <unistd.h>
 #include <utils/String8.h>
 
+#include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <cstdlib>
+#include <iterator>
 #include <string>
 
 #include "fuzz/support/ParcelInput.h"
@@ -17,6 +20,7 @@
 #include "simulator/managers/GestureManagerSimulator.h"
 #include "simulator/managers/HandBiometricManagerSimulator.h"
 #include "simulator/managers/TouchManagerSimulator.h"
+#include "tools/zelkctl/services/Interfaces.h"
 
 namespace {
 
@@ -93,18 +97,37 @@ struct Services {
     }
 };
 
-/// The codes whose request is a path: these get one within the folder.
+/// The touch companion's transactions whose request is a text, and whether that is a path: these get one
+/// within the folder. check-interfaces holds them against docs/binder-protocol.md.
+constexpr struct {
+    uint32_t code;
+    bool isPath;
+} kTexts[] = {
+        {8, true},    // setRecordFile
+        {12, true},   // reloadConfig
+        {19, true},   // saveConfig
+        {28, false},  // setAuth
+};
+
 bool takesPath(const IBinder& service, const Services& all, uint32_t code) {
-    constexpr uint32_t kSetRecordFile = 8;
-    constexpr uint32_t kReloadConfigPath = 12;
-    constexpr uint32_t kSaveConfigPath = 19;
     return &service == all.companion.get() &&
-           (code == kSetRecordFile || code == kReloadConfigPath || code == kSaveConfigPath);
+           std::any_of(std::begin(kTexts), std::end(kTexts),
+                       [code](const auto& text) { return text.code == code && text.isPath; });
+}
+
+/// The first code that no service has: one bound for all, so that an input means the same codes whichever it picks.
+uint32_t firstUnknownCode() {
+    size_t most = 0;
+    for (const zelkctl::KnownInterface* service : zelkctl::knownServices()) {
+        most = std::max(most, service->operations.size());
+    }
+    return static_cast<uint32_t>(most) + 1;
 }
 
 void transact(const Services& all, FuzzedDataProvider& input, const fuzz::Binders& binders) {
     const sp<IBinder> service = all.pick(input);
-    const auto code = input.ConsumeIntegralInRange<uint32_t>(1, 29);
+    static const uint32_t last = firstUnknownCode();
+    const auto code = input.ConsumeIntegralInRange<uint32_t>(1, last);
     android::Parcel request;
     request.writeInterfaceToken(service->getInterfaceDescriptor());
     if (takesPath(*service, all, code)) {

@@ -10,7 +10,7 @@ failures=0
 
 cd -- "$here/../.."
 cp -r --parents -- include companion/ITouchCompanionService.cpp managers docs/*-protocol.md \
-    simulator/{companion,faults,managers} fuzz/proxies_fuzzer.cpp tools/zelkctl \
+    simulator/{companion,faults,managers} fuzz/{proxies,simulator}_fuzzer.cpp tools/zelkctl \
     tests/companion tests/managers tests/faults tests/install/consumer "$folder"
 cd -- "$folder"
 
@@ -60,5 +60,7 @@ forget() {
     forget simulator/companion/TouchCompanionSimulator.cpp 's/ForClient("close"/ForClient("open"/'
     forget simulator/managers/ManagerSimulator.h 's/"unsubscribe"/"subscribe"/' GestureManagerSimulator.cpp
     forget simulator/managers/HandBiometricManagerSimulator.cpp 's/begin("scan"/begin("startMatching"/'
+    forget docs/binder-protocol.md 's/| `setAuth` | text |/| `setAuth` | text path |/' fuzz/simulator_fuzzer.cpp
+    forget fuzz/simulator_fuzzer.cpp '/{19, true},/d'
 }
 ((failures == 0))
