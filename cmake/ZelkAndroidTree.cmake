@@ -21,9 +21,9 @@ set(ZELK_BP_LIBRARIES
   "zelk_fuzz_support=static_libs:libzelk_fuzz_support"
   "zelk::testkit=static_libs:libzelktestkit"
   "zelktestkit=static_libs:libzelktestkit")
-# Tests that start a service manager, the programs or the completions of a desk; what counts costs there; the
-# manual's programs, whose sources a build here takes out of the document; what needs libtracefs.
-set(ZELK_BP_DESK_ONLY reference_tests report_page_test tools_tests zelk_values_plain values_plain_test
+# Tests that start a service manager, the programs or the completions of a desk, or read the documents; what counts
+# costs there; the manual's programs, whose sources a build here takes out of the document; what needs libtracefs.
+set(ZELK_BP_DESK_ONLY docs_protocols reference_tests report_page_test tools_tests zelk_values_plain values_plain_test
   values_plain_comparison_test values_allocations_test values_plain_numbers_test manual_by_name manual_watch
   zelkctl_trace trace_test)
 
