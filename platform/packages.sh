@@ -10,9 +10,9 @@ PACKAGES_BUILD=(g++ cmake ninja-build)
 # libabigail, and compiled with the device's C++ library as well; zsh runs its completion; spin verifies the
 # model of the shared ring, tmux is a terminal to draw on, and gcovr tells what the tests reach. The benchmarks
 # compare with nlohmann's reader; valgrind counts instructions. A program of the documents is in Python, and so is
-# the mutation check.
+# the mutation check. What is released is told by git's tags.
 PACKAGES_TESTS=(libgtest-dev libgmock-dev libbenchmark-dev nlohmann-json3-dev valgrind clang
-    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin gcovr tmux zsh python3)
+    libclang-rt-14-dev llvm abigail-tools libc++-14-dev libc++abi-14-dev spin gcovr tmux zsh python3 git)
 # The browser that shows what zelkctl makes for browsers; large, and for the tests without the driver alone.
 PACKAGES_BROWSER=(chromium-headless-shell)
 # Libraries of zelkctl and the simulator, some of which are found by pkg-config; mandoc checks the manual pages.
