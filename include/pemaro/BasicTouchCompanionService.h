@@ -10,9 +10,10 @@ namespace pemaro {
 ///
 /// The operations that only tell something, registerClient(), unregisterClient(), open() and
 /// close(), succeed, so that a client can connect. All others answer 0x4000000E (unsupported), which
-/// reaches the client's caller; getCblk() returns null, and getConfigParams() of the binary
-/// configuration 0, its failure. Who overrides one of two overloads names the other by `using`, if
-/// it is to be called by the class's own name.
+/// reaches the client's caller, but for prepareRecord()'s, which the proxy ignores: getCblk() returns
+/// null, and that is what the client's startRecord() answers 0x4000000A for. getConfigParams() of the
+/// binary configuration returns 0, its failure. Who overrides one of two overloads names the other by
+/// `using`, if it is to be called by the class's own name.
 ///
 /// The class is all in this header.
 class BasicTouchCompanionService : public BnTouchCompanionService {

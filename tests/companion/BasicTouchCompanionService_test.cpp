@@ -8,6 +8,7 @@
 
 #include <string>
 
+#include "pemaro/BpTouchCompanionService.h"
 #include "pemaro/Serve.h"
 #include "pemaro/TouchCompanionClient.h"
 #include "pemaro/testkit/FakeServiceManager.h"
@@ -64,6 +65,39 @@ TEST(BasicTouchCompanionService, LetsEverybodyComeAndGo) {
     EXPECT_EQ(STATUS_NO_ERROR, service->open());
     EXPECT_EQ(STATUS_NO_ERROR, service->close());
     EXPECT_EQ(STATUS_NO_ERROR, service->unregisterClient());
+}
+
+namespace {
+
+// A service as another process sees it: there is no calling it but by transactions.
+class Remote : public android::BBinder {
+  public:
+    explicit Remote(const sp<android::IBinder>& service) : mService(service) {}
+
+  private:
+    android::status_t onTransact(uint32_t code, const android::Parcel& data, android::Parcel* reply,
+                                 uint32_t flags) override {
+        return mService->transact(code, data, reply, flags);
+    }
+
+    const sp<android::IBinder> mService;
+};
+
+}  // namespace
+
+TEST(BasicTouchCompanionService, KeepsWhatItAnswersToPreparationsFromClients) {
+    struct Unprepared : BasicTouchCompanionService {
+        int setRecordParameter(int) override { return STATUS_NO_ERROR; }
+    };
+    const sp<android::IBinder> service = new Remote(new Unprepared);
+    const sp<ITouchCompanionService> proxy = new BpTouchCompanionService(service);
+    EXPECT_EQ(STATUS_NO_ERROR, proxy->prepareRecord());
+    ScopedServiceManager services;
+    services->add("pemaro.TouchService", service);
+    const sp<TouchCompanionClient> client = new TouchCompanionClient;
+    ASSERT_EQ(STATUS_NO_ERROR, client->init());
+    ASSERT_EQ(STATUS_NO_ERROR, client->setRecordOutput(1));
+    EXPECT_EQ(STATUS_ERROR_ACQUIRING_RESOURCE, client->startRecord());
 }
 
 namespace {
