@@ -80,7 +80,8 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/zelkclient.pc
   DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT Development)
 
 # ---- documents and examples ----------------------------------------------------------------------------
-install(FILES README.md CHANGELOG.md SECURITY.md LICENSE DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
+install(FILES README.md CHANGELOG.md CONTRIBUTING.md SECURITY.md LICENSE
+  DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
 install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation
   FILES_MATCHING PATTERN "*.md" PATTERN "*.svg" PATTERN doxygen EXCLUDE)
 install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT Documentation)
