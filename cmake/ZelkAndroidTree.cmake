@@ -199,6 +199,8 @@ zelk_bp_module(cc_library_static libzelkclient_static "" "defaults: [\"libzelkcl
 zelk_bp_module(cc_library_headers libzelkclient_headers "" "export_include_dirs: [\"include\"],")
 
 # ---- what stands around it -----------------------------------------------------------------------------
+zelk_bp_module(cc_library_static libzelktestkit_recorder zelktestkit_recorder "defaults: [\"zelk_around_defaults\"],"
+  "export_include_dirs: [\"include\"],")
 zelk_bp_module(cc_library_static libzelktestkit zelktestkit "defaults: [\"zelk_around_defaults\"],"
   "export_include_dirs: [\"include\"],")
 foreach(folder values frames simulator tools examples tests)

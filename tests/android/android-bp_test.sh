@@ -35,6 +35,7 @@ refuses "android-bp: ${generated#"$root/"}: not a file of the tree" "srcs: [\"${
 refuses "android-bp: docs/doxygen/make-reference: no source of a compiler" 'srcs: ["docs/doxygen/make-reference"]'
 refuses "android-bp: fuzz/corpus/nowhere/*: no such files" 'corpus: ["fuzz/corpus/nowhere/*"]'
 refuses "android-bp: nowhere: not a folder of the tree" 'local_include_dirs: ["nowhere"]'
+refuses "android-bp: no module is libnowhere, and docs/android.md does not tell of it" 'shared_libs: ["libnowhere"]'
 # What a module has by way of an archive alone it does not have there.
 refuses "complete-modules: zelk_more_test: needs libzelk_frames, for libzelk_records" 'static_libs: ["libzelk_records"]'
 refuses "complete-modules: zelk_more_test: needs libfmtlib, for <fmt/core.h>" 'srcs: ["tools/touchstack/main.cpp"]'
