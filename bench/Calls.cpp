@@ -72,7 +72,7 @@ class BareBinder : public BBinder {
                 return reply->writeInt32(7);
             case kSendCommand: {
                 SerializableMap request;
-                request.unserialize(data.readString8().string());
+                request.unserialize(data.readString8().c_str());
                 reply->writeInt32(0);
                 return reply->writeString8(String8(SerializableMap().serialize().c_str()));
             }
@@ -172,7 +172,7 @@ CallPair sendCommand() {
                     [](Parcel& data) { data.writeString8(String8(request.serialize().c_str())); },
                     [](const Parcel& reply) {
                         SerializableMap response;
-                        response.unserialize(reply.readString8().string());
+                        response.unserialize(reply.readString8().c_str());
                     })};
 }
 

@@ -25,4 +25,14 @@ inline void* mappedAddress(const android::sp<android::IMemory>& memory) {
     return mappedAddressOf(*memory, 0);
 }
 
+/// What `manager` knows by this name, or null: `getService()`, which asks for some five seconds. From
+/// Android 14 on a call warns that it does; here that is wanted.
+template <typename Manager>
+android::sp<android::IBinder> polledService(const Manager& manager, const android::String16& name) {
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wdeprecated-declarations"
+    return manager.getService(name);
+#pragma GCC diagnostic pop
+}
+
 }  // namespace pemaro

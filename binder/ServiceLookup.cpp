@@ -5,6 +5,7 @@
 #include <utils/String16.h>
 
 #include "binder/Log.h"
+#include "binder/PlatformShims.h"
 #include "binder/Waiting.h"
 
 namespace pemaro {
@@ -34,7 +35,7 @@ sp<IBinder> findService(const char* tag, const char* name) {
     if (manager == nullptr) {
         return nullptr;
     }
-    sp<IBinder> binder = manager->getService(String16(name));
+    sp<IBinder> binder = polledService(*manager, String16(name));
     if (binder == nullptr) {
         logText(ANDROID_LOG_ERROR, tag, "couldn't find the service");
     }
@@ -47,7 +48,7 @@ sp<IBinder> awaitService(const char* tag, const char* name) {
         return nullptr;
     }
     for (int attempt = 0; attempt < kLookupAttempts; ++attempt) {
-        sp<IBinder> binder = manager->getService(String16(name));
+        sp<IBinder> binder = polledService(*manager, String16(name));
         if (binder != nullptr) {
             return binder;
         }

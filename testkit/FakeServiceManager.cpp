@@ -72,10 +72,6 @@ android::sp<android::IBinder> FakeServiceManager::checkService(
     return find(name);
 }
 
-android::sp<android::IBinder> FakeServiceManager::waitForService(const android::String16& name) {
-    return find(name);
-}
-
 android::status_t FakeServiceManager::addService(const android::String16& name,
                                                  const android::sp<android::IBinder>& service,
                                                  bool /*allowIsolated*/, int /*dumpsysFlags*/) {
@@ -90,11 +86,6 @@ android::Vector<android::String16> FakeServiceManager::listServices(int /*dumpsy
         names.push(android::String16(entry.first.c_str()));
     }
     return names;
-}
-
-bool FakeServiceManager::isDeclared(const android::String16& name) {
-    std::lock_guard<std::mutex> lock(mLock);
-    return mServices.count(textOf(name)) != 0;
 }
 
 ScopedServiceManager::ScopedServiceManager() : mManager(new FakeServiceManager) {

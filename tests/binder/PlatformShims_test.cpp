@@ -38,5 +38,31 @@ TEST(MappedAddress, IsWhereTheMemoryLies) {
     EXPECT_EQ(nullptr, mappedAddress(LocalMemory::unmapped()));
 }
 
+// Every warning is an error in the tests of a device: that this compiles is what is tested.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic error "-Wdeprecated-declarations"
+
+// IServiceManager of Android 10, and of Android 14.
+struct PlainLookup {
+    android::sp<android::IBinder> getService(const android::String16&) const { return known; }
+    android::sp<android::IBinder> known = new android::BBinder;
+};
+
+struct PollingLookup : PlainLookup {
+    [[deprecated("it polls")]] android::sp<android::IBinder> getService(
+            const android::String16&) const {
+        return known;
+    }
+};
+
+TEST(PolledService, IsAskedForWithoutAWarning) {
+    const PlainLookup android10;
+    EXPECT_EQ(android10.known, polledService(android10, android::String16("service")));
+    const PollingLookup android14;
+    EXPECT_EQ(android14.known, polledService(android14, android::String16("service")));
+}
+
+#pragma GCC diagnostic pop
+
 }  // namespace
 }  // namespace pemaro::test

@@ -3,12 +3,12 @@
 
 #include "pemaro/Binder.h"
 
-#include <binder/IServiceManager.h>
-
 #include <functional>
 #include <map>
 #include <mutex>
 #include <string>
+
+#include "pemaro/testkit/ServiceManagerShims.h"
 
 namespace pemaro::test {
 
@@ -20,7 +20,7 @@ namespace pemaro::test {
 ///     EXPECT_EQ(1, services->lookups("pemaro.TouchService"));
 ///
 /// Lookups never wait: an absent service yields null at once.
-class FakeServiceManager : public android::IServiceManager {
+class FakeServiceManager : public EveryServiceManager<android::IServiceManager> {
   public:
     /// Called before each lookup with the name and its number, counted from 1 for each name.
     using LookupHook = std::function<void(const std::string& name, int attempt)>;
@@ -40,8 +40,6 @@ class FakeServiceManager : public android::IServiceManager {
                                  const android::sp<android::IBinder>& service, bool allowIsolated,
                                  int dumpsysFlags) override;
     android::Vector<android::String16> listServices(int dumpsysFlags) override;
-    android::sp<android::IBinder> waitForService(const android::String16& name) override;
-    bool isDeclared(const android::String16& name) override;
 
   private:
     android::IBinder* onAsBinder() override { return nullptr; }
