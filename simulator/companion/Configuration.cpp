@@ -13,6 +13,7 @@
 #include "frames/Checksum.h"
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
+#include "simulator/Panel.h"
 
 namespace pemaro::simulator {
 namespace {
@@ -43,8 +44,8 @@ SerializableMap factoryValues() {
         zones.add(zone);
     }
     SerializableMap size;
-    size.add("height", 2400);
-    size.add("width", 1080);
+    size.add("height", kPanelHeight);
+    size.add("width", kPanelWidth);
 
     SerializableMap values;
     values.add("device.name", std::string("simulated touch panel"));

@@ -34,10 +34,6 @@ constexpr uint32_t kGestureWakeup = 1;        ///< it woke the device
 constexpr uint32_t kGestureRegionOn = 2;      ///< a region was configured
 constexpr uint32_t kGestureInsideRegion = 4;  ///< and the middle of the gesture lies in it
 
-/// The panel that positions and regions refer to, in pixels.
-constexpr int kPanelWidth = 1080;
-constexpr int kPanelHeight = 2340;
-
 struct GesturePoint {
     uint32_t timeMs;  ///< since the gesture's first point
     uint16_t x;

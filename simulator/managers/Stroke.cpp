@@ -5,6 +5,8 @@
 #include <cmath>
 #include <random>
 
+#include "simulator/Panel.h"
+
 namespace pemaro::simulator {
 namespace {
 

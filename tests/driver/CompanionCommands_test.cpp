@@ -101,11 +101,11 @@ TEST(CompanionCommands, ReadsValuesOfTheConfiguration) {
             {{"config", "get", "gain"}, 0, "gain=1.500000\n"},
             {{"config", "get", "report.rate", "panel.size", "device.name", "edge.zones", "gain"},
              0,
-             "report.rate=240\npanel.size={\"height\":2400,\"width\":1080}\n"
+             "report.rate=240\npanel.size={\"height\":2340,\"width\":1080}\n"
              "device.name=simulated touch panel\nedge.zones=[0,120,240]\ngain=1.500000\n"},
             {{"config", "get", "--json", "palm.rejection", "panel.size"},
              0,
-             "{\"palm.rejection\":true,\"panel.size\":{\"height\":2400,\"width\":1080}}\n"},
+             "{\"palm.rejection\":true,\"panel.size\":{\"height\":2340,\"width\":1080}}\n"},
             {{"config", "get", "gain", "volume"},
              1,
              "getConfigParams: Not Found (0x40000019): volume\n"},

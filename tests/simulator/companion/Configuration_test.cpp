@@ -63,7 +63,7 @@ TEST(Configuration, GivesTheValuesOfTheKeysWanted) {
     EXPECT_EQ(0, configuration.get(map));
     EXPECT_EQ(
             "{\"edge.zones\":[0,120,240],\"gain\":1.500000,\"palm.rejection\":true,"
-            "\"panel.size\":{\"height\":2400,\"width\":1080}}",
+            "\"panel.size\":{\"height\":2340,\"width\":1080}}",
             map.serialize());
 }
 

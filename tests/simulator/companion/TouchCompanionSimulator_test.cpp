@@ -269,7 +269,7 @@ TEST_F(TouchCompanionSimulatorTest, AnswersWithTextsThatAProxyCanRead) {
     EXPECT_EQ(
             "{\"device.name\":\"simulated touch panel\",\"edge.zones\":[0,120,240],"
             "\"gain\":1.500000,\"palm.rejection\":true,"
-            "\"panel.size\":{\"height\":2400,\"width\":1080}}",
+            "\"panel.size\":{\"height\":2340,\"width\":1080}}",
             wanted.serialize());
     for (const char* text :
          {"{\"DEBUG_COMMAND\":{\"REQUEST\":{\"ACTION\":\"SET_RECORD_FILTER\","

@@ -9,6 +9,7 @@
 #include <memory>
 
 #include "pemaro/GestureManagerClient.h"
+#include "simulator/Panel.h"
 #include "simulator/managers/Stroke.h"
 #include "tests/simulator/managers/ManagerSimulatorTest.h"
 

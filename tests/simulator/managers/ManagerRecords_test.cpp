@@ -9,6 +9,7 @@
 #include "pemaro/IGestureManagerClient.h"
 #include "pemaro/IHandBiometricManagerClient.h"
 #include "pemaro/ITouchManagerClient.h"
+#include "simulator/Panel.h"
 #include "simulator/managers/GestureRecord.h"
 #include "simulator/managers/HandImage.h"
 #include "simulator/managers/HandRecord.h"

@@ -8,6 +8,7 @@
 #include <memory>
 
 #include "pemaro/TouchManagerClient.h"
+#include "simulator/Panel.h"
 #include "tests/simulator/managers/ManagerSimulatorTest.h"
 
 using testing::Each;

@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <cctype>
 
+#include "simulator/Panel.h"
 #include "tools/common/Number.h"
 #include "tools/zelkctl/terminal/Printable.h"
 #include "tools/zelkctl/terminal/StrokeDrawing.h"
