@@ -3,7 +3,6 @@
 
 #include <utils/String16.h>
 
-#include <algorithm>
 #include <utility>
 
 namespace pemaro::test {
@@ -66,11 +65,6 @@ void RecordingBinder::setUnlinkResult(android::status_t status) {
     mUnlinkResult = status;
 }
 
-std::vector<RecordingBinder::DeathLink> RecordingBinder::links() const {
-    std::lock_guard<std::mutex> lock(mLock);
-    return mLinks;
-}
-
 int RecordingBinder::linkCalls() const {
     std::lock_guard<std::mutex> lock(mLock);
     return mLinkCalls;
@@ -86,72 +80,33 @@ int RecordingBinder::pings() const {
     return mPings;
 }
 
-void RecordingBinder::die() {
-    std::vector<DeathLink> links;
-    {
-        std::lock_guard<std::mutex> lock(mLock);
-        mAlive = false;
-        links.swap(mLinks);
-    }
-    for (const DeathLink& link : links) {
-        android::sp<DeathRecipient> recipient = link.recipient.promote();
-        if (recipient != nullptr) {
-            recipient->binderDied(this);
-        }
-    }
-}
-
 const android::String16& RecordingBinder::getInterfaceDescriptor() const {
     return mDescriptor;
-}
-
-bool RecordingBinder::isBinderAlive() const {
-    std::lock_guard<std::mutex> lock(mLock);
-    return mAlive;
 }
 
 android::status_t RecordingBinder::pingBinder() {
     std::lock_guard<std::mutex> lock(mLock);
     ++mPings;
-    return mAlive ? mPingResult : static_cast<android::status_t>(android::DEAD_OBJECT);
+    return isBinderAlive() ? mPingResult : Watchable::pingBinder();
 }
 
 android::status_t RecordingBinder::linkToDeath(const android::sp<DeathRecipient>& recipient,
                                                void* cookie, uint32_t flags) {
     std::lock_guard<std::mutex> lock(mLock);
     ++mLinkCalls;
-    if (!mAlive) {
-        return android::DEAD_OBJECT;
-    }
-    if (mLinkResult == android::NO_ERROR) {
-        mLinks.push_back({recipient, cookie, flags});
-    }
-    return mLinkResult;
+    return isBinderAlive() && mLinkResult != android::NO_ERROR
+                   ? mLinkResult
+                   : Watchable::linkToDeath(recipient, cookie, flags);
 }
 
 android::status_t RecordingBinder::unlinkToDeath(const android::wp<DeathRecipient>& recipient,
-                                                 void* cookie, uint32_t /*flags*/,
+                                                 void* cookie, uint32_t flags,
                                                  android::wp<DeathRecipient>* outRecipient) {
     std::lock_guard<std::mutex> lock(mLock);
     ++mUnlinkCalls;
-    if (!mAlive) {
-        return android::DEAD_OBJECT;
-    }
-    if (mUnlinkResult != android::NO_ERROR) {
-        return mUnlinkResult;
-    }
-    // As the platform matches them: by recipient, or by cookie when no recipient is given.
-    auto found = std::find_if(mLinks.begin(), mLinks.end(), [&](const DeathLink& link) {
-        return link.recipient == recipient || (recipient == nullptr && link.cookie == cookie);
-    });
-    if (found == mLinks.end()) {
-        return android::NAME_NOT_FOUND;
-    }
-    if (outRecipient != nullptr) {
-        *outRecipient = found->recipient;
-    }
-    mLinks.erase(found);
-    return android::NO_ERROR;
+    return isBinderAlive() && mUnlinkResult != android::NO_ERROR
+                   ? mUnlinkResult
+                   : Watchable::unlinkToDeath(recipient, cookie, flags, outRecipient);
 }
 
 android::status_t RecordingBinder::onTransact(uint32_t code, const android::Parcel& data,
@@ -160,7 +115,7 @@ android::status_t RecordingBinder::onTransact(uint32_t code, const android::Parc
     {
         std::lock_guard<std::mutex> lock(mLock);
         mTransactions.push_back({code, flags, bytesOf(data)});
-        if (!mAlive) {
+        if (!isBinderAlive()) {
             return android::DEAD_OBJECT;
         }
         handler = mHandler;

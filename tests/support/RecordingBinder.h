@@ -8,13 +8,15 @@
 #include <vector>
 
 #include "pemaro/Binder.h"
+#include "pemaro/testkit/Watchable.h"
 #include "tests/support/ParcelBytes.h"
 
 namespace pemaro::test {
 
 /// A binder that stands for one in another process: a proxy is made around it because it answers no
 /// query for a local interface.
-/// It keeps every transaction and answers as it was told, and it can die.
+/// It keeps every transaction and answers as it was told, and it can die: then those who are linked
+/// are told, and everything is answered with DEAD_OBJECT.
 ///
 ///     sp<RecordingBinder> remote = new RecordingBinder;
 ///     remote->answer([](Parcel& reply) { reply.writeInt32(0); });
@@ -22,18 +24,12 @@ namespace pemaro::test {
 ///     EXPECT_EQ(3u, remote->transactions()[0].code);
 ///
 /// Callable from any thread.
-class RecordingBinder : public android::BBinder {
+class RecordingBinder : public Watchable<android::BBinder> {
   public:
     struct Transaction {
         uint32_t code;
         uint32_t flags;
         Bytes request;
-    };
-
-    struct DeathLink {
-        android::wp<android::IBinder::DeathRecipient> recipient;
-        void* cookie;
-        uint32_t flags;
     };
 
     using Handler = std::function<android::status_t(uint32_t code, const android::Parcel& data,
@@ -60,17 +56,11 @@ class RecordingBinder : public android::BBinder {
     void setLinkResult(android::status_t status);
     void setUnlinkResult(android::status_t status);
 
-    std::vector<DeathLink> links() const;
     int linkCalls() const;
     int unlinkCalls() const;
     int pings() const;
 
-    /// The other process dies: the recipients linked at this moment are told, once, on this thread,
-    /// and from now on everything is answered with DEAD_OBJECT.
-    void die();
-
     const android::String16& getInterfaceDescriptor() const override;
-    bool isBinderAlive() const override;
     android::status_t pingBinder() override;
     android::status_t linkToDeath(const android::sp<DeathRecipient>& recipient,
                                   void* cookie = nullptr, uint32_t flags = 0) override;
@@ -88,14 +78,12 @@ class RecordingBinder : public android::BBinder {
     mutable std::mutex mLock;
     Handler mHandler;
     std::vector<Transaction> mTransactions;
-    std::vector<DeathLink> mLinks;
     android::status_t mPingResult = android::NO_ERROR;
     android::status_t mLinkResult = android::NO_ERROR;
     android::status_t mUnlinkResult = android::NO_ERROR;
     int mLinkCalls = 0;
     int mUnlinkCalls = 0;
     int mPings = 0;
-    bool mAlive = true;
 };
 
 }  // namespace pemaro::test
