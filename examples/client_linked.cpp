@@ -25,6 +25,7 @@ namespace {
 using pemaro::TouchCompanionClient;
 
 constexpr int kOutputMemory = 1;
+constexpr size_t kMostConfiguration = 1 << 20;  // more fits in no answer
 
 int fail(const char* what, const char* why) {
     fprintf(stderr, "client_linked: %s: %s\n", what, why);
@@ -47,12 +48,16 @@ void onFrame(int /* zero */, void* /* frame */, unsigned long bytes, void* conte
     recording.bytes += bytes;
 }
 
-// A length of 0 asks for the length; then the bytes are read into as many.
+// A length of 0 asks for the length, which is the service's word; then the bytes are read into as
+// many.
 int readConfiguration(TouchCompanionClient& client) {
     size_t length = 0;
     int status = client.getConfigParams(nullptr, &length);
     if (status != pemaro::STATUS_NO_ERROR) {
         return fail("asking for the configuration's length", status);
+    }
+    if (length > kMostConfiguration) {
+        return fail("asking for the configuration's length", "the answer cannot be");
     }
     std::vector<char> configuration(length);
     status = client.getConfigParams(configuration.data(), &length);
