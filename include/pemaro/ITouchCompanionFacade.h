@@ -10,10 +10,10 @@ namespace pemaro {
 /// made by VEXPemaroCreateInstance(2048, 0x8000000, ...), destroyed with `delete`.
 ///
 /// Callers reach the operations through their positions in the table of virtual functions: the
-/// order of the declarations is binding. Every operation but init(), the map form of
-/// setConfigParams() and those that refuse a null argument needs an init() before it; whether that
-/// succeeded is the status of each operation itself. TouchCompanionClient tells what they return.
-/// One thread at a time.
+/// order of the declarations is binding. Before the first init() only these may be called: init()
+/// itself, getClassID(), the map form of setConfigParams(), and, with the null that they refuse,
+/// the map form of getConfigParams() and sendCommand(). Whether init() succeeded is the status of
+/// each operation itself. TouchCompanionClient tells what they return. One thread at a time.
 class ZELK_API ITouchCompanionFacade {
   public:
     virtual ~ITouchCompanionFacade() = default;
