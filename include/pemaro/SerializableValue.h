@@ -94,7 +94,9 @@ class ZELK_API SerializableValue {
     /// The scalar getters read the text, whatever the text tag: leading white space and an optional
     /// sign, then as much as looks like a number. They yield 0 and set `value`, or
     /// STATUS_INVALID_FORMAT and leave it alone when the tag is a container's or no number is
-    /// there. A number too large for the type is cut to its low bits, as the `scanf` family does.
+    /// there. An integer too large for the type is cut to its low bits. One beyond 64 bits first
+    /// becomes the last that they hold, as with `sscanf`: 99999999999999999999 reads as -1 in an
+    /// int, and the negative of it as 0.
     int getValue(unsigned char& value) const;
     int getValue(signed char& value) const;
     int getValue(unsigned short& value) const;
