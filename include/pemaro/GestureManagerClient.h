@@ -58,13 +58,19 @@ class ZELK_API GestureManagerClient : public BnGestureManagerClient,
     GestureManagerClient();
 
     /// Looks the service up, subscribes and watches for the service's death. 0x4000000A: no service
-    /// manager or no such service; 0x4000000D: the binder found is no gesture manager; 0x40000000:
-    /// the service cannot be watched; else what subscribing returned. A further call looks up and
-    /// subscribes again.
+    /// manager or no such service; 0x40000000: subscribing failed, as it does with a service of
+    /// another interface, or the service cannot be watched, as none can that is in this process;
+    /// else what subscribing returned. (0x4000000D would be a binder that the platform makes no
+    /// proxy for; its releases make one for any.)
     ///
     /// An absent service takes about 55 seconds: ten lookups, in each of which the platform waits
-    /// for some five seconds by itself, and half a second of sleep after each. Where no service
-    /// manager runs, the platform waits for one without end.
+    /// for some five seconds by itself, and half a second of sleep after each. What an absent
+    /// service manager means is told at TouchCompanionClient::init().
+    ///
+    /// Not guarded against a second call: deinit() comes before another init(). Without it the
+    /// client subscribes and watches once more. deinit() then undoes one of each, and a death is
+    /// told for each watch, also after deinit(). A second init() that the service refuses lets go
+    /// of the service, and deinit() undoes nothing.
     int init();
 
     /// Unsubscribes and ends the watch, if init() had succeeded, and lets go of the service. Always

@@ -55,11 +55,9 @@ class ZELK_API HandBiometricManagerClient : public BnHandBiometricManagerClient,
     /// A client without callbacks and context, whose events are dropped.
     HandBiometricManagerClient();
 
-    /// Looks the service up, subscribes and watches for the service's death. 0x4000000A: no service
-    /// manager or no such service; 0x4000000D: the binder found is no hand biometric manager;
-    /// 0x40000000: the service cannot be watched; else what subscribing returned. A further call
-    /// looks up and subscribes again. How long an absent service takes is told at
-    /// GestureManagerClient::init().
+    /// Looks the service up, subscribes and watches for the service's death. Statuses, the time
+    /// that an absent service takes and what a second call does are those of
+    /// GestureManagerClient::init(): deinit() comes before another init().
     int init();
 
     /// Unsubscribes and ends the watch, if init() had succeeded, and lets go of the service. Always

@@ -75,21 +75,25 @@ class ZELK_API ITouchCompanionService : public android::IInterface {
     /// 0 is any failure. With a `size` of 0 nothing is read: the result is the length that a buffer
     /// needs. Through a proxy, a buffer that is too small stays as it was and yields the length
     /// too: the stub's failure does not cross the driver, what it wrote before does. (Where stub
-    /// and proxy meet in one process, it yields 0.)
+    /// and proxy meet in one process, it yields 0.) The length that a proxy returns is the
+    /// service's word: 32 bits with a sign, so that a negative one becomes one of almost 2^64.
     virtual size_t getConfigParams(void* buffer, size_t size) = 0;
 
-    /// Reads configuration values: `params` names the wanted keys and receives their values.
+    /// Reads configuration values: `params` names the wanted keys and receives their values. Each
+    /// key has a value that is not null, such as 0: a null one has no text, and ends the stub's
+    /// process if others follow it.
     virtual int getConfigParams(SerializableMap& params) = 0;
 
     /// Replaces the binary configuration by the `size` bytes at `data`. A proxy returns 0x4000001A,
-    /// without a call, for more bytes than a request can hold. A stub that finds fewer bytes than
+    /// without a call, for more bytes than a parcel takes. A stub that finds fewer bytes than
     /// announced, or no memory for them, answers nothing, which a proxy reads as 0.
     virtual int setConfigParams(const void* data, size_t size) = 0;
 
     /// Fills `out` with the service's properties.
     virtual int getProperties(SerializableMap& out) = 0;
 
-    /// Sends a request map; `response` receives the answer when the status is 0.
+    /// Sends a request map, in which no value is null (see getConfigParams()); `response` receives
+    /// the answer when the status is 0.
     virtual int sendCommand(SerializableMap& request, SerializableMap& response) = 0;
 
     /// Sets parameters of the analog front end.
@@ -101,7 +105,9 @@ class ZELK_API ITouchCompanionService : public android::IInterface {
     /// Reads the parameters of the analog front end as an array of maps.
     virtual int getAFEParams(SerializableMapArray& out) = 0;
 
-    /// Returns the bytes of a frame; through a proxy 0x40000000 when the transaction failed.
+    /// Returns the bytes of a frame; through a proxy 0x40000000 when the transaction failed. A
+    /// service that records nothing may return a status, which cannot be told from a size of that
+    /// number.
     virtual int getPacketSize() = 0;
 
     /// Reads the service's inspection word into `*value`, which must not be null.

@@ -46,6 +46,10 @@ enum eventParam : int32_t {};
 /// service is missed when it is to be called. Calls may come from several threads, at once too; the
 /// client holds no lock while it calls. Log tag: "TouchCompanionClient".
 ///
+/// A service knows a client by its process, and so a process has one recording. While one client of
+/// it records, another's setRecordOutput() or startRecord() may be refused, and another's
+/// stopRecord() may end the recording of the first. A facade has such a client, too.
+///
 /// A service may die or misbehave at any point of a recording. The library waits for it in the
 /// shared memory for no longer than a second before it gives up on the recording's thread: that is
 /// left behind, with an error in the log, when the client stops or is destroyed.
@@ -75,10 +79,15 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     TouchCompanionClient(DataCallback callback, void* context);
 
     /// Looks the service up, registers this client and opens the service. 0x4000000A: no service
-    /// manager or no such service (after the platform's own lookup gave up, some five seconds;
-    /// where no service manager runs at all, the platform waits for one without end); 0x4000000D:
-    /// the binder found is no touch companion service; else what registering or opening returned.
-    /// Not guarded against a second call, which registers anew.
+    /// manager or no such service (after the platform's own lookup gave up, some five seconds);
+    /// 0x40000000: registering failed, as it does with a service of another interface, which
+    /// refuses the request; else what opening returned. (0x4000000D would be a binder that the
+    /// platform makes no proxy for; its releases make one for any.) Not guarded against a second
+    /// call, which registers anew.
+    ///
+    /// In a process that never found a service manager, the platform waits for one without end. It
+    /// keeps the one that it found: when that dies and another is started, no client of the process
+    /// finds a service any more, and the process has to be restarted.
     int init();
 
     /// 1 when the service's process answers a ping, else 0.
@@ -86,7 +95,9 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
 
     // ---- recording ----
 
-    /// Chooses where the next recording goes: 0 a file of the service's, 1 shared memory.
+    /// Chooses where the next recording goes: 0 a file of the service's, 1 shared memory. The
+    /// client goes by this number from now on, also when the service refuses it, or is not told
+    /// because init() was not called yet.
     int setRecordOutput(int output);
 
     /// Names the file of output 0. 0x4000000D unless output 0 was chosen before.
@@ -94,13 +105,15 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
 
     /// Starts a recording. With output 1 the service's block is mapped and, if there is a data
     /// callback, a thread delivers the frames from before the service starts until stopRecord().
-    /// 0x4000000D: no output was chosen; 0x4000000A: the service gave no block, or one that is too
-    /// small, mapped read-only or misaligned, of which the last two are logged.
+    /// 0x4000000D: setRecordOutput() was never called; 0x4000000A: there can be no thread, or the
+    /// service gave no block, or one that is too small, mapped read-only or misaligned, of which
+    /// the last two are logged.
     int startRecord();
 
     /// Ends a recording: first the thread, then the service, then the block. It waits for a
     /// callback that runs, however long that takes, and not for a thread whose wait in the shared
-    /// memory does not end. When the service refuses, its status is returned and the block stays
+    /// memory does not end. Where no frames come it takes up to a second, the time that the thread
+    /// looks for one. When the service refuses, its status is returned and the block stays
     /// mapped. From within the callback it only asks the thread to end.
     int stopRecord();
 
@@ -114,10 +127,12 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     /// Takes up to `buffer->size` bytes of whole frames out of the ring, never across its end.
     /// Waits for frames when the ring is empty; 0x40000015 after about a second without any,
     /// 0x4000000B when no block is mapped. For the recording thread, or for a caller that gave no
-    /// callback.
+    /// callback. What is taken lies in the mapping: it is to be released before stopRecord(), which
+    /// ends that.
     int acquireBuffer(FrameBuffer* buffer);
 
-    /// Gives the frames of acquireBuffer() back to the service.
+    /// Gives the frames of acquireBuffer() back to the service. Of frames that were taken in an
+    /// earlier recording it knows nothing: as many of the present one are skipped.
     void releaseBuffer(FrameBuffer* buffer);
 
     // ---- commands ----
@@ -130,7 +145,9 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     /// `*result`, when the text could not be allocated. `result` must not be null.
     int sendCommand(const char* command, char** result);
 
-    /// Sends a request map as it is and stores the service's answer into `response`.
+    /// Sends a request map as it is and stores the service's answer into `response`. No value in
+    /// the request may be null: it has no text, and the service that reads the request is ended by
+    /// one that others follow, and does not see one that is the last.
     int sendCommand(SerializableMap& request, SerializableMap& response);
 
     /// Chooses by the bits of `mask` what recorded frames contain. 0x4000000C when the response
@@ -171,20 +188,26 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     int saveConfig(const std::string* path);
 
     /// Replaces the service's binary configuration by `size` bytes. 0x4000001A, without a call, for
-    /// more than a request can hold.
+    /// more than a parcel takes, which is 2^31 - 1 bytes at most; 0x40000000 already for more than
+    /// Binder carries, about a megabyte.
     int setConfigParams(const void* data, size_t size);
 
     /// Reads the binary configuration. `*len` is the capacity of `buffer` in bytes and receives the
     /// configuration's length; with a `*len` of 0 only the length is asked for. 0x4000001B for a
     /// null `len`; 0x40000000, and `*len` as it was, on any failure, a buffer that is too small
-    /// among them. With a null `buffer` and enough capacity nothing is copied, and 0 returned.
+    /// among them. With a null `buffer` and enough capacity nothing is copied, and 0 returned. The
+    /// length is the service's word, and a negative one becomes one of almost 2^64: who allocates
+    /// as much holds it against a limit first. More than a megabyte fits in no answer.
     int getConfigParams(void* buffer, size_t* len);
 
-    /// Reads configuration values: `params` names the wanted keys and receives their values. A map
-    /// without entries asks for nothing and succeeds without a call.
+    /// Reads configuration values: `params` names the wanted keys and receives their values. Each
+    /// key needs a value, whatever it is but null: 0 will do, a null one can end the service (see
+    /// sendCommand()). A map without entries asks for nothing and succeeds without a call.
     int getConfigParams(SerializableMap& params);
 
-    /// The bytes of a frame. A failed call cannot be told from a packet size of 0x40000000.
+    /// The bytes of a frame, or a status, which cannot be told from a packet size of that number:
+    /// 0x40000000 when the call failed, 0x4000000B without a service, or the service's own, such as
+    /// 0x4000000E of one that records nothing.
     int getPacketSize();
 
     /// Reads the service's inspection word into `*value`, which must not be null.
@@ -200,7 +223,8 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     int setAuth(const char* auth);
 
   protected:
-    /// Unregisters from the service and ends the recording thread, if init() had succeeded.
+    /// Unregisters from the service, if init() had succeeded, and ends the recording thread, which
+    /// takes as long as in stopRecord().
     ~TouchCompanionClient() override;
 
   private:

@@ -49,10 +49,14 @@ class ZELK_API TouchManagerClient : public BnTouchManagerClient {
     TouchManagerClient();
 
     /// Looks the service up, once, and subscribes. 0x4000000A: no service manager or no such
-    /// service (after the platform's own lookup gave up, some five seconds; where no service
-    /// manager runs at all, the platform waits for one without end); 0x4000000D: the binder found
-    /// is no touch manager; else what subscribing returned. A further call looks up and subscribes
-    /// again.
+    /// service (after the platform's own lookup gave up, some five seconds); 0x40000000:
+    /// subscribing failed, as it does with a service of another interface; else what subscribing
+    /// returned. (0x4000000D would be a binder that the platform makes no proxy for; its releases
+    /// make one for any.) What an absent service manager means is told at
+    /// TouchCompanionClient::init().
+    ///
+    /// Not guarded against a second call: deinit() comes before another init(). Without it the
+    /// client subscribes once more, which deinit() undoes once.
     int init();
 
     /// Unsubscribes, if init() had succeeded, and lets go of the service. Always 0.
