@@ -10,19 +10,24 @@
 #include <cstdio>
 #include <cstdlib>
 
+#include "pemaro/BasicGestureManagerService.h"
+#include "pemaro/GestureManagerClient.h"
 #include "pemaro/Status.h"
 #include "pemaro/TouchCompanionClient.h"
 #include "pemaro/testkit/FakeServiceManager.h"
 #include "pemaro/testkit/FakeTouchCompanionService.h"
 #include "pemaro/testkit/LogRecorder.h"
+#include "pemaro/testkit/Watchable.h"
 
 namespace {
 
 using android::sp;
+using pemaro::GestureManagerClient;
 using pemaro::TouchCompanionClient;
 using pemaro::test::FakeTouchCompanionService;
 using pemaro::test::LogRecorder;
 using pemaro::test::ScopedServiceManager;
+using pemaro::test::Watchable;
 
 int gFailures = 0;
 
@@ -57,11 +62,28 @@ void testFailure() {
     expect(!LogRecorder::instance().lines().empty(), "and is logged");
 }
 
+// A service to be watched, which the platform grants for none of the same process.
+void testDeath() {
+    ScopedServiceManager services;
+    using Service = Watchable<pemaro::BasicGestureManagerService>;
+    const sp<Service> service = new Service;
+    services->add("pemaro.GestureManagerService", service);
+
+    int deaths = 0;
+    const auto onDeath = [](void* context) { *static_cast<int*>(context) += 1; };
+    const sp<GestureManagerClient> client = new GestureManagerClient(nullptr, onDeath, &deaths);
+    expect(client->init() == pemaro::STATUS_NO_ERROR, "a client watches the service");
+    service->die();
+    expect(deaths == 1, "it is told of the death");
+    expect(client->enableWakeup() == pemaro::STATUS_UNKNOWN_ERROR, "and nobody answers any more");
+}
+
 }  // namespace
 
 int main() {
     testCalls();
     testFailure();
+    testDeath();
     if (gFailures == 0) {
         puts("all held");
     }
