@@ -107,14 +107,17 @@ class ZELK_API TouchCompanionClient : public android::RefBase {
     /// callback, a thread delivers the frames from before the service starts until stopRecord().
     /// 0x4000000D: setRecordOutput() was never called; 0x4000000A: there can be no thread, or the
     /// service gave no block, or one that is too small, mapped read-only or misaligned, of which
-    /// the last two are logged.
+    /// the last two are logged. Nothing of a recording that runs is ended by a failure to begin
+    /// another, as far as the service has not ended it.
     int startRecord();
 
     /// Ends a recording: first the thread, then the service, then the block. It waits for a
     /// callback that runs, however long that takes, and not for a thread whose wait in the shared
     /// memory does not end. Where no frames come it takes up to a second, the time that the thread
     /// looks for one. When the service refuses, its status is returned and the block stays
-    /// mapped. From within the callback it only asks the thread to end.
+    /// mapped. From within the callback it only asks the thread to end: who stops or destroys the
+    /// client next waits for that callback, and a recording that is started before it returns
+    /// delivers nothing until it has.
     int stopRecord();
 
     /// Does nothing and returns 0.
