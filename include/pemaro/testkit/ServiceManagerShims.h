@@ -11,11 +11,9 @@
 
 namespace pemaro::test {
 
-/// What the platform's releases have added to IServiceManager since Android 10, whose four operations
-/// every release has: getService(), checkService(), addService() and listServices(). Each class
-/// answers an addition where `Manager` has it, and is nothing where it has not, which is found out at
-/// compile time. A service manager of one process has declared and updates nothing, is reached
-/// through no network, and tells nobody of who comes.
+/// \cond
+// What the platform's releases have added to IServiceManager since Android 10. Each class answers an addition where
+// `Manager` has it, and is nothing where it has not, which is found out at compile time.
 namespace added {
 
 template <typename Manager, typename = void>
@@ -113,8 +111,12 @@ class Debugged<Manager, std::void_t<typename Manager::ServiceDebugInfo>> : publi
 };
 
 }  // namespace added
+/// \endcond
 
-/// A service manager that has those four yet to be made, in every release.
+/// A service manager of which only the four operations that every release has are yet to be made:
+/// getService(), checkService(), addService() and listServices(). What the platform's releases have
+/// added since Android 10 is answered: it has declared what it lists, updates nothing, is reached
+/// through no network, and tells nobody of who comes.
 template <typename Manager>
 using EveryServiceManager = added::Waiting<added::Declared<added::Instances<added::Updatable<
         added::UpdatableNames<added::Connected<added::Notifying<added::Debugged<Manager>>>>>>>>;
