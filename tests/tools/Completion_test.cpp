@@ -21,23 +21,33 @@ WordSet asSet(const std::vector<std::string>& words) {
 
 constexpr const char* kPrograms[] = {"zelkctl", "zelk-touchstack"};
 
-// What bash offers for the last of these words, which is being typed. They are as bash breaks them.
-std::vector<std::string> completeInBash(const std::string& program, const std::string& words,
-                                        const std::string& typed) {
+// What bash offers for the word that is typed behind others, all as bash breaks them, where readline replaces that end
+// of it. The script is run before.
+std::vector<std::string> completeInBash(const std::string& program, const std::string& script,
+                                        const std::string& words, const std::string& typed,
+                                        const std::string& replaced) {
     const RunResult result =
             run({"bash", "--norc", "-c",
-                 ". " ZELK_REFERENCE_DIR "/" + program +
-                         ".bash\n"
-                         "COMP_WORDS=(" ZELK_BIN_DIR "/" +
-                         program + " " + words + " '" + typed +
-                         "')\n"
+                 ". " ZELK_REFERENCE_DIR "/" + program + ".bash\n" + script +
+                         "\n"
+                         "COMP_WORDS=(" +
+                         words +
+                         " \"$1\")\n"
                          "COMP_CWORD=$((${#COMP_WORDS[@]} - 1))\n_" +
                          program +
-                         "\n"
-                         "((${#COMPREPLY[@]} == 0)) || printf '%s\\n' \"${COMPREPLY[@]}\"\n"});
+                         " \"${COMP_WORDS[0]}\" \"$2\"\n"
+                         "((${#COMPREPLY[@]} == 0)) || printf '%s\\n' \"${COMPREPLY[@]}\"\n",
+                 "bash", typed, replaced});
     EXPECT_EQ(0, result.status);
     EXPECT_EQ("", result.errors);
     return splitLines(result.output);
+}
+
+std::vector<std::string> completeInBash(const std::string& program, const std::string& words,
+                                        const std::string& typed) {
+    const bool isBreak = typed == "=" || typed == ":";
+    return completeInBash(program, "", ZELK_BIN_DIR "/" + program + " " + words, typed,
+                          isBreak ? "" : typed);
 }
 
 // What zsh is told of a command: the options, and the commands behind it.
@@ -144,6 +154,71 @@ TEST(BashCompletion, OffersTheValuesOfTheTouchStacksOptions) {
         EXPECT_EQ(row.offered, asSet(completeInBash("zelk-touchstack", row.words, row.typed)))
                 << row.words << " " << row.typed;
     }
+}
+
+// It is text of anybody's, which no shell is to run.
+TEST(BashCompletion, QuotesWhatAServiceTells) {
+    const struct {
+        const char* words;
+        const char* typed;
+        const char* replaced;
+        WordSet offered;
+    } rows[] = {
+            {"hand delete",
+             "",
+             "",
+             {"Anna\\'s\\ hand", "\\$\\(echo\\ ran\\ \\>\\&2\\)", "\\`echo\\ ran\\ \\>\\&2\\`",
+              "a\\\\b", "\\*", "so\\\"\\!"}},
+            {"hand delete", "An", "An", {"Anna\\'s\\ hand"}},
+            {"hand delete", "Anna\\'s\\ h", "Anna\\'s\\ h", {"Anna\\'s\\ hand"}},
+            {"hand delete", "Anna\\", "Anna\\", {"Anna\\'s\\ hand"}},
+            {"hand delete", "'An", "An", {"Anna'\\''s hand"}},
+            {"hand delete", "\"Anna's", "Anna's", {"Anna's hand"}},
+            {"hand delete", "An\"na", "na", {"na's hand"}},
+            {"hand delete", "\\$", "\\$", {"\\$\\(echo\\ ran\\ \\>\\&2\\)"}},
+            {"hand delete", "'$(", "$(", {"$(echo ran >&2)"}},
+            {"hand delete", "\"\\$(e", "\\$(e", {"\\$(echo ran >&2)"}},
+            {"hand delete", "\"$", "$", {"\\$(echo ran >&2)"}},
+            {"hand delete", "\"\\`", "\\`", {"\\`echo ran >&2\\`"}},
+            {"hand delete", "a", "a", {"a\\\\b"}},
+            {"hand delete", "\"a", "a", {"a\\\\b"}},
+            {"hand delete", "'a", "a", {"a\\b"}},
+            {"hand delete", "\"s", "s", {"so\\\"\"\\!\"\""}},
+            {"hand delete",
+             "$(echo ran >&2)",
+             "$(echo ran >&2)",
+             {"\\$\\(echo\\ ran\\ \\>\\&2\\)"}},
+            {"hand delete", "Otto", "Otto", {}},
+            {"config set", "so", "so", {"so\\\"\\!="}},
+            {"config get", "'An", "An", {"Anna'\\''s hand"}},
+            {"config load",
+             "\"" ZELK_TOOLS_DIR "/dem",
+             ZELK_TOOLS_DIR "/dem",
+             {ZELK_TOOLS_DIR "/demo"}},
+            {"config load", "'" ZELK_TOOLS_DIR "'/'dem", "dem", {"demo"}},
+    };
+    const std::string program =
+            "service() { printf '%s\\n' \"Anna's hand\" '$(echo ran >&2)' '`echo ran >&2`' 'a\\b' "
+            "'*' 'so\"!'; }";
+    for (const auto& row : rows) {
+        EXPECT_EQ(row.offered,
+                  asSet(completeInBash("zelkctl", program, std::string("service ") + row.words,
+                                       row.typed, row.replaced)))
+                << row.words << " " << row.typed;
+    }
+}
+
+// What it is given in an array it quotes itself.
+TEST(ZshCompletion, HandsOverWhatAServiceTellsAsItIs) {
+    const RunResult result = run({"zsh", "-f", "-c",
+                                  "zelkctl() { print -rl -- \"Anna's hand\" '$(echo ran >&2)' "
+                                  "'`echo ran >&2`' '*' '-Q' }\n"
+                                  "compadd() { print -r -- $@[1,-2]; print -rl -- ${(P)@[-1]} }\n"
+                                  ". " ZELK_REFERENCE_DIR "/_zelkctl\n"
+                                  "_zelkctl_values PROFILE\n_zelkctl_values KEY=VALUE\n"});
+    EXPECT_EQ("", result.errors);
+    const std::string told = "Anna's hand\n$(echo ran >&2)\n`echo ran >&2`\n*\n-Q\n";
+    EXPECT_EQ("-a\n" + told + "-S = -a\n" + told, result.output);
 }
 
 TEST(ZshCompletion, OffersTheValuesOfTheTouchStacksOptions) {
