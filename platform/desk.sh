@@ -8,7 +8,7 @@
 # What the caller's environment has for a terminal of its own.
 DESK_ENVIRONMENT='^(TERM|COLORTERM|LANG|LC_.*|TZ|EDITOR|PAGER|LESS|PATH|ZELK_.*|ANDROID_.*|[A-Z]*SAN_OPTIONS)$'
 
-# How long a machine may take to end when its last terminal was closed, on a busy host.
+# How long a machine may take to end by itself when its last terminal was closed, on a busy host.
 DESK_SECONDS=20
 
 # desk_run <options of the stack, one per line, or "--no-stack", or ""> [command …]: runs the command or a
@@ -18,13 +18,20 @@ desk_run() {
     shift
     desk_folders
     DESK_STATUS=0
-    # Whoever works at the desk holds a shared lock on "users": who gets it for itself alone is the last.
+    # Whoever works at the desk holds a shared lock on "users". Who ends the desk waits for that lock alone: it gets it
+    # when the last has gone, however that came.
     exec {DESK_USERS}>>"$DESK/users"
-    flock --shared "$DESK_USERS"
+    if ! flock --nonblock --shared "$DESK_USERS"; then
+        desk_say_waiting
+        flock --shared "$DESK_USERS"
+    fi
     "desk_join_$VM_MODE" "$stack"
     "desk_session_$VM_MODE" "$@" || DESK_STATUS=$?
-    "desk_leave_$VM_MODE"
     exit "$DESK_STATUS"
+}
+
+desk_say_waiting() {
+    say "waiting for an earlier desk to end"
 }
 
 # The desk's state is nobody else's business: it lets whoever can read it in.
@@ -98,15 +105,11 @@ desk_session_direct() {
     env --default-signal bash -c "$script" {DESK_USERS}>&-
 }
 
-desk_leave_direct() {
-    :
-}
-
 # ---- QEMU ----------------------------------------------------------------------------------------------
 
 # Terminals come in by ssh over one connection, which is QEMU itself: ssh speaks to its standard streams, and
-# they are the guest's virtio port. The last to leave ends the connection, and with it the machine; where nobody
-# could, because all were killed, it ends by itself after a while.
+# they are the guest's virtio port. A process beside QEMU ends the connection when nobody is there any more, and with it
+# the machine.
 desk_ssh() {
     ssh -F none -S "$DESK/ssh" -o LogLevel=ERROR -o StrictHostKeyChecking=no -o UserKnownHostsFile=/dev/null \
         -o PreferredAuthentications=none -o EscapeChar=none "$@"
@@ -129,7 +132,10 @@ desk_join_qemu() {
 
 desk_start_qemu() {
     local -a options
-    desk_end_earlier
+    if ! flock --nonblock "$DESK/running" true; then
+        desk_say_waiting
+        desk_end_machine
+    fi
     say "starting a machine with a touch stack (about ten seconds)"
     rm -rf -- "$DESK/exchange" "$DESK/ssh"
     mkdir -- "$DESK/exchange"
@@ -145,21 +151,36 @@ desk_start_qemu() {
         -fsdev "local,id=home,path=${DESK_HOME//,/,,},security_model=none,multidevs=remap" \
         -device virtio-9p-pci,fsdev=home,mount_tag=home \
         -device virtio-serial-pci -chardev stdio,id=desk,signal=off -device virtserialport,chardev=desk
-    printf '%s\n' "echo \$\$ >${DESK@Q}/pid" \
-        "exec setsid flock --nonblock --no-fork ${DESK@Q}/running qemu-system-x86_64 ${VM_QEMU[*]@Q}" \
-        >"$DESK/machine"
-    desk_ssh -f -N -o ControlMaster=yes -o ControlPersist=20 \
+    desk_write_machine >"$DESK/machine"
+    desk_write_end >"$DESK/end"
+    desk_ssh -f -N -o ControlMaster=yes \
         -o ProxyCommand="bash ${DESK@Q}/machine 2>>${DESK@Q}/console" root@desk || {
         cp -- "$DESK/console" "$ROOT/build/vm-console.log"
         die "the virtual machine did not boot (console log: $ROOT/build/vm-console.log)"
     }
 }
 
-# A machine that nobody is connected to ends by itself.
-desk_end_earlier() {
-    if ! flock --nonblock "$DESK/running" true; then
-        say "waiting for the machine of an earlier desk to end"
-        flock --timeout "$DESK_SECONDS" "$DESK/running" true || vm_kill "$(<"$DESK/pid")"
+# The text of a bash script: becomes QEMU, and leaves somebody behind to end it. Both are out of a terminal's reach.
+desk_write_machine() {
+    printf '%s\n' "echo \$\$ >${DESK@Q}/pid" \
+        "exec {running}>>${DESK@Q}/running" \
+        "flock --nonblock \$running || exit" \
+        "setsid flock ${DESK@Q}/users bash ${DESK@Q}/end </dev/null >/dev/null 2>&1 {running}>&- &" \
+        "exec setsid qemu-system-x86_64 ${VM_QEMU[*]@Q}"
+}
+
+# The text of a bash script: what is run when the last has gone.
+desk_write_end() {
+    declare -p DESK DESK_SECONDS
+    declare -f desk_ssh desk_end_machine vm_kill
+    echo desk_end_machine
+}
+
+# A machine that nobody is connected to ends by itself, once it has started; it is killed where it does not.
+desk_end_machine() {
+    desk_ssh -O exit desk 2>/dev/null || true
+    if [[ ! -e $DESK/exchange/started ]] || ! flock --timeout "$DESK_SECONDS" "$DESK/running" true; then
+        flock --nonblock "$DESK/running" true || vm_kill "$(<"$DESK/pid")"
         flock "$DESK/running" true
     fi
 }
@@ -174,10 +195,4 @@ desk_session_qemu() {
     desk_ssh "${terminal[@]}" root@desk "exec bash /run/zelk/$script" || status=$?
     rm -f -- "$DESK/exchange/$script"
     return "$status"
-}
-
-desk_leave_qemu() {
-    if flock --nonblock "$DESK_USERS"; then
-        desk_ssh -O exit desk 2>/dev/null || true
-    fi
 }

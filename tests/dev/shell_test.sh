@@ -37,8 +37,21 @@ machine_runs() {
     pgrep -f "qemu-system-x86_64.*$SCRATCH/zelk-desk" >/dev/null
 }
 
-no_machine() {
-    ! machine_runs
+# Neither the machine nor what is beside it: each has the desk's folder among its arguments.
+no_desk() {
+    ! pgrep -f "$SCRATCH/zelk-desk" >/dev/null
+}
+
+test_start_that_is_cut_short_leaves_nothing() {
+    use_desk
+    local key
+    for key in 'send-keys C-c' kill-server; do
+        terminal new-session -d "'$ROOT/dev' shell"
+        wait_until machine_runs
+        # shellcheck disable=SC2086 # several arguments
+        terminal $key
+        wait_until no_desk
+    done
 }
 
 test_terminal_in_qemu() {
@@ -90,10 +103,19 @@ test_terminal_in_qemu() {
     expect_status 1 "$ROOT/dev" shell --no-stack -- true
     expect_contains "a desk runs already, and its stack has other options" "$ERRORS"
 
-    # The home folder and the history stay, the machine does not.
+    # The machine stays while somebody is at the desk, and ends even if that one's terminal is closed; the home folder
+    # and the history are kept.
+    terminal new-window "'$ROOT/dev' shell"
+    expect_shown '^desk:.*#$'
+    terminal last-window
     enter 'echo kept >~/file; exit 4'
     expect_shown '^ended 4$'
-    wait_until no_machine
+    machine_runs || fail "the machine has ended with a terminal open"
+    terminal last-window
+    enter 'zelkctl ping'
+    expect_shown '^the service is alive$'
+    terminal kill-window
+    wait_until no_desk
     expect_equal "kept" "$(<"$ZELK_HOME/file")"
     expect_contains $'zelkctl ping\n' "$(<"$ZELK_HOME/.bash_history")"
     terminal kill-server
