@@ -4,6 +4,12 @@
 
 ZELK_CACHE=$(realpath -m -- "${ZELK_CACHE:-${XDG_CACHE_HOME:-$HOME/.cache}/zelk}")
 
+# The file that says that these scripts made the cache folder; regular expressions for what else is in one, at its top
+# and one folder below: what nobody else makes, and what others might.
+CACHE_MARK=.zelk-cache
+CACHE_MADE='sources/android-platform-tools-[^/]+|(platform|initramfs|kernel)/(bookworm-)?[0-9a-f]{16}(-uncompressed)?(\.partial)?'
+CACHE_BESIDE='(apt|initramfs|kernel|locks|logs|platform|sources)|apt/(cache|lists|sources|updated)|kernel/bookworm|lock|locks/[a-z_]+|logs/([a-z_]+-)?(cmake|private_apt|tar)\.log'
+
 # The steps of this run that take long, in order, and when it began; see plan_steps.
 STEPS=()
 STEPS_START=$SECONDS
@@ -93,11 +99,24 @@ make_cache_folder() {
     if ! mkdir -p -- "$ZELK_CACHE" 2>/dev/null || [[ ! -w $ZELK_CACHE ]]; then
         die "the cache folder $ZELK_CACHE cannot be written: set ZELK_CACHE to one that can"
     fi
+    if cache_is_ours; then
+        touch -- "$ZELK_CACHE/$CACHE_MARK"
+    fi
+}
+
+# Whether these scripts made the folder: it has their mark. A cache made before there was one is known by what it holds,
+# which is nothing but what they make.
+cache_is_ours() {
+    local content
+    [[ ! -e $ZELK_CACHE/$CACHE_MARK ]] || return 0
+    content=$(find "$ZELK_CACHE" -mindepth 1 -maxdepth 2 -printf '%P\n' 2>/dev/null) || return
+    [[ -z $content ]] || { grep -qE "^($CACHE_MADE)$" <<<"$content" &&
+        ! grep -qvE "^($CACHE_MADE|$CACHE_BESIDE)$" <<<"$content"; }
 }
 
 # Only what these scripts made, should the folder hold anything else.
 remove_cache() {
-    (cd -- "$ZELK_CACHE" && rm -rf -- apt initramfs kernel locks logs platform sources)
+    (cd -- "$ZELK_CACHE" && rm -rf -- apt initramfs kernel lock locks logs platform sources "$CACHE_MARK")
     rmdir -- "$ZELK_CACHE" 2>/dev/null || true
 }
 

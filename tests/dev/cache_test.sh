@@ -92,4 +92,58 @@ test_cleaning_leaves_what_others_put_there() {
     [[ ! -e $ZELK_CACHE ]] || fail "an empty cache folder is left"
 }
 
+# clean_all <what its folder holds: files, and folders with / at the end …>: of a tree that nothing is lost in.
+clean_all() {
+    local entry
+    rm -rf tree cache
+    mkdir -p tree/build cache
+    cp -R "$ROOT/dev" "$ROOT/platform" tree
+    for entry in "$@"; do
+        entry=cache/$entry
+        mkdir -p -- "${entry%/*}"
+        [[ $entry == */ ]] || echo content >"$entry"
+    done
+    ZELK_CACHE=$SCRATCH/cache tree/dev clean --all
+}
+
+test_what_is_no_cache_is_not_removed() {
+    local content
+    while read -r -a content; do
+        expect_status 1 clean_all "${content[@]}"
+        expect_one_error "dev: $SCRATCH/cache holds what ./dev did not make"
+        [[ -e cache/${content[0]} && -e tree/build ]] || fail "something was removed of: ${content[*]}"
+    done <<'ROWS'
+sources/main.c
+logs/program.log
+apt/sources/list
+logs/cmake.log
+platform/notes kernel/bookworm-0123456789abcdef/vmlinuz
+sources/main.c sources/android-platform-tools-29.0.6-28/
+letter platform/0123456789abcdef/ locks/platform
+ROWS
+}
+
+# Whether it has the mark, or is from the time before that.
+test_a_cache_is_removed() {
+    local content
+    while read -r -a content; do
+        expect_status 0 clean_all "${content[@]}"
+        [[ ! -e cache && ! -e tree/build ]] || fail "something is left of: ${content[*]}"
+    done <<'ROWS'
+.zelk-cache sources/x logs/program.log
+platform/0123456789abcdef/lib/ sources/android-platform-tools-29.0.6-28/ logs/platform-cmake.log locks/platform
+kernel/bookworm-0123456789abcdef-uncompressed/ initramfs/0123456789abcdef.partial/ apt/lists/ apt/updated lock
+
+ROWS
+}
+
+test_making_marks_what_is_a_cache_from_then_on() {
+    use_cache
+    [[ -e $ZELK_CACHE/.zelk-cache ]] || fail "a new cache has no mark"
+    rm "$ZELK_CACHE/.zelk-cache"
+    mkdir "$ZELK_CACHE/things"
+    make_cache_folder
+    [[ ! -e $ZELK_CACHE/.zelk-cache ]] || fail "another's folder has the mark"
+}
+
 run_tests
