@@ -60,6 +60,7 @@ desk_write_session() {
     while read -r name; do
         printf 'export %s=%q\n' "$name" "${!name}"
     done < <(compgen -e | grep -E "$DESK_ENVIRONMENT")
+    write_locale
     printf 'export HOME=%q ZELK_ROOT=%q ZELK_LOGS=%q\n' "$DESK_HOME" "$ROOT" "$logs"
     printf '. %q\n' "$ROOT/platform/desk-session"
     printf 'start_session'

@@ -2,6 +2,13 @@
 # What the other scripts lean on: messages, the cache folder, logged commands. Sourced by ./dev.
 # shellcheck shell=bash
 
+# What these scripts compare, sort and read of others' messages is the same in every locale. LC_ALL, which comes before
+# the other variables, is given back to what is run for the caller.
+if [[ -v LC_ALL ]]; then
+    CALLER_LC_ALL=$LC_ALL
+fi
+export LC_ALL=C.UTF-8
+
 ZELK_CACHE=$(realpath -m -- "${ZELK_CACHE:-${XDG_CACHE_HOME:-$HOME/.cache}/zelk}")
 
 # The file that says that these scripts made the cache folder; regular expressions for what else is in one, at its top
@@ -16,6 +23,23 @@ STEPS_START=$SECONDS
 
 say() {
     printf '==> %s\n' "$*" >&2
+}
+
+# write_locale: the line of a shell script from which on the locale is the caller's.
+write_locale() {
+    if [[ -v CALLER_LC_ALL ]]; then
+        printf 'export LC_ALL=%q\n' "$CALLER_LC_ALL"
+    else
+        echo 'unset LC_ALL'
+    fi
+}
+
+# in_locale <command …>: in the caller's.
+in_locale() {
+    (
+        eval "$(write_locale)"
+        exec "$@"
+    )
 }
 
 # plan_steps <step …>: of these steps those are counted for which needs_<step> holds.

@@ -56,6 +56,7 @@ vm_write_command() {
             printf 'export %s=%q\n' "$name" "${!name}"
         done < <(compgen -e | grep -E "$VM_ENVIRONMENT")
     fi
+    write_locale
     printf 'exec --'
     printf ' %q' "$@"
     printf '\n'

@@ -138,7 +138,7 @@ stage_driver() {
     for program in "${DRIVER_TESTS_PROGRAMS[@]}"; do
         options+=(--in-memory "$program")
     done
-    "$ROOT/dev" vm "${options[@]}" ctest "${CTEST_ARGUMENTS[@]}"
+    in_locale "$ROOT/dev" vm "${options[@]}" ctest "${CTEST_ARGUMENTS[@]}"
 }
 
 stage_lint() {
@@ -148,7 +148,7 @@ stage_lint() {
 run_ctest() {
     build_preset "$1"
     ctest_arguments "$@"
-    ctest "${CTEST_ARGUMENTS[@]}" --parallel "$(nproc)"
+    in_locale ctest "${CTEST_ARGUMENTS[@]}" --parallel "$(nproc)"
 }
 
 # ctest_arguments <preset> <label> <regular expression or "">

@@ -76,4 +76,31 @@ test_works_from_another_folder_and_through_a_link() {
     expect_contains "usage: ./dev" "$OUTPUT"
 }
 
+# In Turkish, i is no letter from a to z, and I not its capital: the names of commands and lists have to be found.
+test_works_in_every_locale() {
+    localedef -i tr_TR -f UTF-8 "$SCRATCH/tr_TR.UTF-8" 2>/dev/null || {
+        echo "    without Turkish, which is not installed"
+        return
+    }
+    local -a turkish=(env "LOCPATH=$SCRATCH" LC_ALL=tr_TR.UTF-8)
+    local capitals='word=lint && echo "${word^^}"'
+    expect_status 0 "${turkish[@]}" bash -c "$capitals"
+    expect_equal LİNT "$OUTPUT"
+    expect_status 0 "${turkish[@]}" bash -c ". '$ROOT/platform/lib.sh' && $capitals"
+    expect_equal LINT "$OUTPUT"
+    expect_status 0 "${turkish[@]}" "$dev" lint --help
+}
+
+test_own_locale_is_not_that_of_a_command_that_is_run() {
+    local setting expected show='echo "<${LC_ALL-none}>"'
+    for setting in --unset=LC_ALL LC_ALL= LC_ALL=POSIX; do
+        expect_status 0 env "$setting" bash -c "$show"
+        expected=$OUTPUT
+        expect_status 0 env "$setting" ZELK_VM=direct "$dev" vm bash -c "$show"
+        expect_equal "$expected" "$OUTPUT"
+        expect_status 0 env "$setting" bash -c ". '$ROOT/platform/lib.sh' && $show && in_locale bash -c '$show'"
+        expect_equal "<C.UTF-8>"$'\n'"$expected" "$OUTPUT"
+    done
+}
+
 run_tests
