@@ -37,8 +37,11 @@ desk_say_waiting() {
 # The desk's state is nobody else's business: it lets whoever can read it in.
 desk_folders() {
     DESK=${XDG_RUNTIME_DIR:-${TMPDIR:-/tmp}}/zelk-desk.$EUID.$(printf '%s\n' "$ROOT $VM_MODE" | short_hash)
-    mkdir -m 700 -- "$DESK" 2>/dev/null || [[ -d $DESK && -O $DESK && ! -L $DESK ]] ||
-        die "$DESK belongs to somebody else"
+    if ! mkdir -m 700 -- "$DESK" 2>/dev/null; then
+        [[ -e $DESK || -L $DESK ]] ||
+            die "the desk's folder $DESK cannot be made: set XDG_RUNTIME_DIR to a folder that can be written"
+        [[ -d $DESK && -O $DESK && ! -L $DESK ]] || die "$DESK belongs to somebody else"
+    fi
     chmod 700 -- "$DESK"
     DESK_HOME=$(realpath -m -- "${ZELK_HOME:-${XDG_DATA_HOME:-$HOME/.local/share}/zelk/home}")
     if ! mkdir -p -- "$DESK_HOME" 2>/dev/null || [[ ! -w $DESK_HOME ]]; then

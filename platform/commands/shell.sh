@@ -43,7 +43,8 @@ command_shell() {
     options=$(xargs -r -n 1 printf '%s\n' <<<"$stack" 2>/dev/null) ||
         die_usage "shell: a quote in '$stack' has no end"
     begin programs shell vm -- build_release
-    build_preset release "${PROGRAMS[@]}"
+    # The output is the command's.
+    build_preset release "${PROGRAMS[@]}" >&2
     desk_install
     setup_vm
     desk_run "$options" "$@"

@@ -42,6 +42,28 @@ no_desk() {
     ! pgrep -f "$SCRATCH/zelk-desk" >/dev/null
 }
 
+test_tells_which_folder_it_cannot_have() {
+    local where name
+    folders() {
+        bash -euo pipefail -c 'ROOT=$1 VM_MODE=direct
+            . "$1/platform/lib.sh"; . "$1/platform/vm.sh"; . "$1/platform/desk.sh"; desk_folders' bash "$ROOT"
+    }
+    use_desk
+    for where in "$SCRATCH/nowhere" /proc; do
+        XDG_RUNTIME_DIR=$where expect_status 1 folders
+        expect_one_error "dev: the desk's folder $where/zelk-desk."
+        expect_contains " cannot be made: set XDG_RUNTIME_DIR" "$ERRORS"
+    done
+    mkdir there
+    XDG_RUNTIME_DIR=$SCRATCH/there expect_status 0 folders
+    XDG_RUNTIME_DIR=$SCRATCH/there expect_status 0 folders
+    name=$(ls there)
+    mv "there/$name" elsewhere
+    ln -s "$SCRATCH/elsewhere" "there/$name"
+    XDG_RUNTIME_DIR=$SCRATCH/there expect_status 1 folders
+    expect_one_error "dev: $SCRATCH/there/$name belongs to somebody else"
+}
+
 test_start_that_is_cut_short_leaves_nothing() {
     use_desk
     local key
@@ -97,7 +119,7 @@ test_terminal_in_qemu() {
 
     # A second terminal joins, with input, output and status of its own; other options for the stack cannot be.
     expect_status 6 "$ROOT/dev" shell -- bash -c 'cat; zelkctl ping >&2; exit 6' <<<"two  words"
-    expect_equal "two  words" "$(tail -n 1 "$SCRATCH/.output")"
+    expect_equal "two  words" "$OUTPUT"
     expect_contains "the service is alive" "$ERRORS"
     expect_contains "joining the desk that runs already" "$ERRORS"
     expect_status 1 "$ROOT/dev" shell --no-stack -- true
