@@ -114,7 +114,7 @@ vm_interrupt() {
     vm_stop "$1" "$1"
 }
 
-# Until the child has ended. A reader that ends before it has lost whoever read the output.
+# Until the child has ended. A reader that ends before it has lost whoever read the output, or cannot write it.
 vm_wait() {
     local ended
     while kill -0 "$VM_CHILD" 2>/dev/null; do
@@ -128,7 +128,13 @@ vm_wait() {
             ;;
         *)
             vm_forget_reader "$ended"
-            [[ -n $VM_STOPPED ]] || vm_stop PIPE PIPE
+            if [[ -n $VM_STOPPED ]]; then
+                continue
+            elif [[ -s $VM_SCRATCH/readers ]]; then
+                vm_stop output PIPE
+            else
+                vm_stop PIPE PIPE
+            fi
             ;;
         esac
     done
@@ -153,6 +159,7 @@ vm_exit() {
         printf 'dev: vm: stopped, as the command had not ended after %s seconds\n' "$VM_TIMEOUT" >&2
         exit 124
         ;;
+    output) die "vm: the command's output cannot be written: $(sed -n '1s/.*: //p' "$VM_SCRATCH/readers")" ;;
     ?*) exit "${status:-$((128 + $(kill -l "$VM_STOPPED")))}" ;;
     *) exit "$status" ;;
     esac
@@ -253,8 +260,9 @@ vm_pack_files() {
     done
 }
 
+# What it has to say is told in the end.
 vm_follow() {
-    vm_helper tail -q -s 0.05 -c +1 --pid="$VM_CHILD" -f -- "$1" 2>/dev/null
+    vm_helper tail -q -s 0.05 -c +1 --pid="$VM_CHILD" -f -- "$1" 2>>"$VM_SCRATCH/readers"
 }
 
 # Ends a guest that hangs before it gets to the command.
@@ -310,6 +318,9 @@ vm_finish_qemu() {
     for reader in "${VM_READERS[@]}"; do
         wait "$reader" || true
     done
+    if [[ -s $VM_SCRATCH/readers ]]; then
+        VM_STOPPED=${VM_STOPPED:-output}
+    fi
     if [[ -s $VM_EXCHANGE/status || -n $VM_STOPPED ]]; then
         vm_exit "$(cat "$VM_EXCHANGE/status" 2>/dev/null)"
     fi

@@ -163,6 +163,30 @@ test_qemu_times_out() {
     wait_until no_leftovers
 }
 
+# The machine is a stand-in: what it writes is lost at once, or as it ends.
+test_qemu_tells_of_output_that_cannot_be_written() {
+    export ZELK_VM=qemu TMPDIR=$SCRATCH
+    local later
+    mkdir bin
+    cat >bin/qemu-system-x86_64 <<'SCRIPT'
+#!/bin/sh
+exchange=$(printf '%s\n' "$@" | sed -n 's/^local,id=exchange,path=\([^,]*\),.*/\1/p')
+touch "$exchange/started"
+echo "a line" >"$exchange/stdout"
+$MACHINE_WAITS
+echo 0 >"$exchange/status"
+SCRIPT
+    chmod +x bin/qemu-system-x86_64
+    full() {
+        PATH=$SCRATCH/bin:$PATH vm true >/dev/full
+    }
+    for later in 'read -r signal' ''; do
+        MACHINE_WAITS=$later expect_status 1 full
+        expect_one_error "dev: vm: the command's output cannot be written: No space left on device"
+        wait_until no_leftovers
+    done
+}
+
 test_qemu_that_does_not_boot_is_told_with_its_log() {
     export ZELK_VM=qemu TMPDIR=$SCRATCH
     mkdir bin
