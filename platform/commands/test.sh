@@ -76,6 +76,7 @@ build_first() {
 # builds; such a stage then waits for the rest of its own.
 start_ahead() {
     if [[ " $* " == *" native "* ]] && (($# > 1)); then
+        mkdir -p -- "$ROOT/build"
         setpriv --pdeathsig TERM setsid "$ROOT/platform/ahead" "$@" </dev/null >"$ROOT/build/ahead.log" 2>&1 &
         disown
     fi
