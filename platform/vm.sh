@@ -130,7 +130,7 @@ vm_wait() {
             vm_forget_reader "$ended"
             if [[ -n $VM_STOPPED ]]; then
                 continue
-            elif [[ -s $VM_SCRATCH/readers ]]; then
+            elif [[ $(vm_output_problem) ]]; then
                 vm_stop output PIPE
             else
                 vm_stop PIPE PIPE
@@ -159,7 +159,7 @@ vm_exit() {
         printf 'dev: vm: stopped, as the command had not ended after %s seconds\n' "$VM_TIMEOUT" >&2
         exit 124
         ;;
-    output) die "vm: the command's output cannot be written: $(sed -n '1s/.*: //p' "$VM_SCRATCH/readers")" ;;
+    output) die "vm: the command's output cannot be written: $(vm_output_problem)" ;;
     ?*) exit "${status:-$((128 + $(kill -l "$VM_STOPPED")))}" ;;
     *) exit "$status" ;;
     esac
@@ -260,7 +260,11 @@ vm_pack_files() {
     done
 }
 
-# What it has to say is told in the end.
+# What it has to say is told in the end, if it is this.
+vm_output_problem() {
+    sed -n -E "s/^tail: (write error|error writing 'standard output'): //p" "$VM_SCRATCH/readers" | head -n 1
+}
+
 vm_follow() {
     vm_helper tail -q -s 0.05 -c +1 --pid="$VM_CHILD" -f -- "$1" 2>>"$VM_SCRATCH/readers"
 }
@@ -318,7 +322,7 @@ vm_finish_qemu() {
     for reader in "${VM_READERS[@]}"; do
         wait "$reader" || true
     done
-    if [[ -s $VM_SCRATCH/readers ]]; then
+    if [[ $(vm_output_problem) ]]; then
         VM_STOPPED=${VM_STOPPED:-output}
     fi
     if [[ -s $VM_EXCHANGE/status || -n $VM_STOPPED ]]; then
