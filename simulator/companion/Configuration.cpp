@@ -1,11 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "simulator/companion/Configuration.h"
 
-#include <android-base/file.h>
-#include <android-base/unique_fd.h>
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <cstdio>
 #include <cstring>
 #include <memory>
@@ -14,6 +9,7 @@
 #include "pemaro/SerializableMapArray.h"
 #include "pemaro/Status.h"
 #include "simulator/Panel.h"
+#include "simulator/companion/WholeFile.h"
 
 namespace pemaro::simulator {
 namespace {
@@ -128,19 +124,7 @@ int Configuration::set(const SerializableMap& changes) {
 }
 
 int Configuration::save(const std::string& path) const {
-    // Written beside its place and then moved there: a full disk leaves the old file as it was.
-    const std::string draft = path + ".new";
-    android::base::unique_fd file(
-            open(draft.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666));
-    if (!file.ok()) {
-        return STATUS_ERROR_OPENING_FILE;
-    }
-    const bool written = android::base::WriteStringToFd(mValues.serialize() + "\n", file);
-    if (close(file.release()) != 0 || !written || rename(draft.c_str(), path.c_str()) != 0) {
-        remove(draft.c_str());
-        return STATUS_ERROR_WRITING_TO_FILE;
-    }
-    return STATUS_NO_ERROR;
+    return writeWholeFile(path, mValues.serialize() + "\n");
 }
 
 int Configuration::load(const std::string& path) {

@@ -120,7 +120,7 @@ TEST(Configuration, LoadsNothingFromABadFile) {
 TEST(Configuration, TellsWhatKeepsItFromBeingSaved) {
     const Configuration configuration;
     EXPECT_EQ(STATUS_ERROR_OPENING_FILE, configuration.save("/no/such/folder/file"));
-    EXPECT_EQ(STATUS_ERROR_WRITING_TO_FILE, configuration.save(testing::TempDir()));
+    EXPECT_EQ(STATUS_ERROR_OPENING_FILE, configuration.save(testing::TempDir()));
 }
 
 TEST(Configuration, GoesThroughItsBinaryForm) {
