@@ -121,6 +121,18 @@ TEST(FramesWatch, PrintsALineEachSecondWhereThereIsNoTerminal) {
                     "\"hottest\":[0-9]+\\}\n"));
 }
 
+TEST(FramesWatch, PrintsALineEachSecondToATerminalThatCannotBeDrawnOn) {
+    TouchStack touchStack(stackOptions());
+    WatchTerminal terminal("TERM=dumb", 250, 40);
+    EXPECT_TRUE(terminal.await([](const std::string& text) {
+        return testing::Matches(MatchesRegex("frame [^\n]*\nframe .*"))(text);
+    })) << terminal.text();
+    terminal.interrupt();
+    EXPECT_TRUE(terminal.awaitText("ended with 0")) << terminal.text();
+    EXPECT_THAT(terminal.text(),
+                MatchesRegex("(frame [^\n]*\n)+.*watched [0-9]+ frames, .*\nended with 0\n+"));
+}
+
 TEST(FramesWatch, TellsWhenNothingComesAndWhenTheServiceDies) {
     // A recording of one frame, and then nothing.
     Files files;

@@ -8,13 +8,13 @@
 
 #include "frames/FrameFile.h"
 #include "pemaro/ITouchCompanionFacade.h"
+#include "tools/common/LiveLine.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/commands/Commands.h"
 #include "tools/zelkctl/commands/Lasting.h"
 #include "tools/zelkctl/services/Connection.h"
 #include "tools/zelkctl/services/FrameReceiver.h"
 #include "tools/zelkctl/services/FrameStream.h"
-#include "tools/zelkctl/terminal/LiveLine.h"
 #include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Report.h"
 #include "tools/zelkctl/terminal/Settings.h"
@@ -78,7 +78,7 @@ class Progress {
     }
 
   private:
-    LiveLine mLine;
+    tools::LiveLine mLine{wordsDescriptor()};
     const Clock::time_point mStart;
     Clock::time_point mShownAt;
     uint64_t mShownFrames = 0;

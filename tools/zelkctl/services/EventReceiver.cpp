@@ -7,7 +7,6 @@
 
 #include "frames/Checksum.h"
 #include "tools/zelkctl/terminal/Json.h"
-#include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Printable.h"
 #include "tools/zelkctl/terminal/TerminalTraits.h"
 

@@ -11,8 +11,9 @@
 #include <vector>
 
 #include "frames/FrameFile.h"
+#include "tools/common/LiveLine.h"
 #include "tools/zelkctl/services/EventRecord.h"
-#include "tools/zelkctl/terminal/LiveLine.h"
+#include "tools/zelkctl/terminal/Output.h"
 
 namespace pemaro::zelkctl {
 
@@ -83,7 +84,7 @@ class EventReceiver {
     uint64_t mTaken = 0;
     bool mDone = false;
     std::optional<simulator::HandEvent> mAwaited;
-    LiveLine mLine;
+    tools::LiveLine mLine{wordsDescriptor()};
 };
 
 /// The line of an event, or of one that came without a record, whose size is then 0.

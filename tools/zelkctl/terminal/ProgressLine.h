@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <string>
 
-#include "tools/zelkctl/terminal/LiveLine.h"
+#include "tools/common/LiveLine.h"
 
 namespace pemaro::zelkctl {
 
@@ -30,7 +30,7 @@ class ProgressLine {
 
     const std::string mWhat;
     const std::string mUnit;
-    LiveLine mLine;
+    tools::LiveLine mLine;
     const bool mIsShown;
     Clock::time_point mDue;
 };

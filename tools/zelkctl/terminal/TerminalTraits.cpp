@@ -2,12 +2,13 @@
 #include "tools/zelkctl/terminal/TerminalTraits.h"
 
 #include <strings.h>
-#include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <cstdlib>
 #include <cstring>
 #include <string>
+
+#include "tools/common/Terminal.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -29,7 +30,7 @@ Colors colorsOf(const Variable& variable) {
     const std::string terminal = textOf(variable, "TERM");
     const std::string depth = textOf(variable, "COLORTERM");
     // Any NO_COLOR that is not empty counts, whatever it says.
-    if (!textOf(variable, "NO_COLOR").empty() || terminal.empty() || terminal == "dumb") {
+    if (!textOf(variable, "NO_COLOR").empty() || !tools::canBeDrawnOn(terminal)) {
         return Colors::kNone;
     }
     if (depth == "truecolor" || depth == "24bit" || contains(terminal, "direct")) {
@@ -51,18 +52,16 @@ bool isUnicode(const Variable& variable) {
 
 TerminalTraits terminalTraits() {
     TerminalTraits traits;
-    traits.isTerminal = isatty(STDOUT_FILENO) != 0;
+    traits.isTerminal = tools::isTerminal(STDOUT_FILENO);
     const auto environment = [](const char* name) -> const char* { return getenv(name); };
     traits.unicode = isUnicode(environment);
     if (!traits.isTerminal) {
         return traits;
     }
     traits.colors = colorsOf(environment);
-    winsize size{};
-    if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_col > 0 && size.ws_row > 0) {
-        traits.columns = size.ws_col;
-        traits.rows = size.ws_row;
-    }
+    const tools::TerminalSize size = tools::terminalSize(STDOUT_FILENO);
+    traits.columns = size.columns;
+    traits.rows = size.rows;
     return traits;
 }
 

@@ -3,14 +3,12 @@
 
 #include <string>
 
-namespace pemaro::zelkctl {
+namespace pemaro::tools {
 
-/// A line that tells how far a command is: on a terminal redrawn in place, and otherwise a line of
-/// its own each time.
+/// A line that tells how far a program is: on a terminal redrawn in place, cut where it would go on in
+/// the next line, and otherwise a line of its own each time.
 class LiveLine {
   public:
-    /// Among the command's words.
-    LiveLine();
     /// On the standard output or the standard error.
     explicit LiveLine(int fd);
     /// Ends the line, so that what follows stands on the next.
@@ -31,4 +29,4 @@ class LiveLine {
     bool mShown = false;
 };
 
-}  // namespace pemaro::zelkctl
+}  // namespace pemaro::tools

@@ -1,16 +1,14 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tools/zelkctl/terminal/LiveLine.h"
+#include "tools/common/LiveLine.h"
 
 #include <unistd.h>
 
 #include "tools/common/StandardOutput.h"
-#include "tools/zelkctl/terminal/Output.h"
+#include "tools/common/Terminal.h"
 
-namespace pemaro::zelkctl {
+namespace pemaro::tools {
 
-LiveLine::LiveLine() : LiveLine(wordsDescriptor()) {}
-
-LiveLine::LiveLine(int fd) : mFd(fd), mTerminal(isatty(fd) != 0) {}
+LiveLine::LiveLine(int fd) : mFd(fd), mTerminal(tools::isTerminal(fd)) {}
 
 LiveLine::~LiveLine() {
     end();
@@ -31,18 +29,23 @@ void LiveLine::clear() {
 }
 
 void LiveLine::show(const std::string& text) {
-    // Back to the first column, and away with what stood there.
-    draw(mTerminal ? "\r" + text + "\x1b[K" : text + "\n");
+    if (mTerminal) {
+        // Back to the first column, and away with what stood there. A line that reaches the last
+        // column may go on in the next, and could not be drawn over any more.
+        draw("\r" + cutToColumns(text, terminalSize(mFd).columns - 1) + "\x1b[K");
+    } else {
+        draw(text + "\n");
+    }
     mShown = true;
 }
 
 void LiveLine::draw(const std::string& text) const {
     if (mFd == STDOUT_FILENO) {
-        tools::writeOutput(text);
+        writeOutput(text);
     } else {
         // Not worth a word when it fails.
         [[maybe_unused]] const ssize_t written = write(mFd, text.data(), text.size());
     }
 }
 
-}  // namespace pemaro::zelkctl
+}  // namespace pemaro::tools
