@@ -15,14 +15,16 @@ constexpr nanoseconds kShortestPause = std::chrono::milliseconds(1);
 
 }  // namespace
 
-std::shared_ptr<const Replay> Replay::open(const std::string& path, std::string* problem) {
-    const auto file = RecordingFile::open(path, problem);
+std::shared_ptr<const Replay> Replay::open(const std::string& path, std::string* problem,
+                                           const RecordingFile::Progress& progress) {
+    const auto file = RecordingFile::open(path, problem, progress);
     if (file == nullptr) {
         return nullptr;
     }
     std::shared_ptr<Replay> replay(new Replay);
-    if (!replay->load(*file)) {
-        *problem = file->problem();
+    if (!replay->load(*file, progress)) {
+        *problem = file->problem().empty() ? "cannot read " + path + ": that was given up"
+                                           : file->problem();
         return nullptr;
     }
     if (replay->mFrames.empty()) {
@@ -32,10 +34,14 @@ std::shared_ptr<const Replay> Replay::open(const std::string& path, std::string*
     return replay;
 }
 
-bool Replay::load(const RecordingFile& file) {
+/// False when the file has not what it had, and when that is given up.
+bool Replay::load(const RecordingFile& file, const RecordingFile::Progress& progress) {
     nanoseconds due{0};
     const RecordingFile::Part* before = nullptr;
     for (const RecordingFile::Part& part : file.parts()) {
+        if (progress && !progress(part.offset, file.size())) {
+            return false;
+        }
         if (part.kind == RecordingFile::Kind::kTruncated || part.header.length != part.length) {
             mLeftOut += part.length;
             continue;

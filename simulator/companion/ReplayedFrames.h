@@ -15,7 +15,10 @@ namespace pemaro::simulator {
 class Replay {
   public:
     /// Null, with a sentence about why, when the file cannot be read or has no frame to play.
-    static std::shared_ptr<const Replay> open(const std::string& path, std::string* problem);
+    /// The file is read twice, and each time `progress` is told of it as by a RecordingFile.
+    static std::shared_ptr<const Replay> open(
+            const std::string& path, std::string* problem,
+            const frames::RecordingFile::Progress& progress = nullptr);
 
     size_t frames() const { return mFrames.size(); }
     size_t longestFrame() const { return mLongest; }
@@ -32,7 +35,7 @@ class Replay {
     };
 
     Replay() = default;
-    bool load(const frames::RecordingFile& file);
+    bool load(const frames::RecordingFile& file, const frames::RecordingFile::Progress& progress);
 
     std::vector<Entry> mFrames;
     size_t mLongest = 0;

@@ -18,6 +18,7 @@
 #include "simulator/companion/ReplayedFrames.h"
 #include "tools/common/BinderDriver.h"
 #include "tools/common/CommandLine.h"
+#include "tools/common/ProgressLine.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/touchstack/Options.h"
 #include "tools/touchstack/Registrar.h"
@@ -59,7 +60,14 @@ std::string openReplay(CommandLine& line) {
         return "";
     }
     std::string problem;
-    options.replay = Replay::open(line.replayPath, &problem);
+    {
+        pemaro::tools::ProgressLine progress("reading", "bytes");
+        options.replay =
+                Replay::open(line.replayPath, &problem, [&](uint64_t done, uint64_t total) {
+                    progress.step(done, total);
+                    return true;
+                });
+    }
     if (options.replay == nullptr) {
         return problem;
     }

@@ -133,6 +133,30 @@ TEST_F(ReplayedFramesTest, AreRefusedWhereThereIsNothingToPlay) {
     EXPECT_EQ(path + " is no recording of touch frames: it does not begin with one", problem);
 }
 
+TEST_F(ReplayedFramesTest, TellHowFarTheyAreReadUntilThatIsGivenUp) {
+    const std::string bytes = frame(0, milliseconds(0)) + frame(1, milliseconds(10));
+    ASSERT_NE(nullptr, open(bytes));
+    size_t told = 0;
+    const auto tell = [&](uint64_t done, uint64_t total) {
+        told += 1;
+        EXPECT_LE(done, total);
+        EXPECT_EQ(bytes.size(), total);
+        return true;
+    };
+    EXPECT_NE(nullptr, Replay::open(path, &problem, tell));
+    // While frames are looked for, and while they are taken.
+    EXPECT_GE(told, 4u);
+    for (size_t last = 1; last <= told; ++last) {
+        size_t now = 0;
+        problem.clear();
+        EXPECT_EQ(nullptr, Replay::open(path, &problem, [&](uint64_t, uint64_t) {
+                      now += 1;
+                      return now < last;
+                  }));
+        EXPECT_EQ("cannot read " + path + ": that was given up", problem) << last;
+    }
+}
+
 TEST_F(ReplayedFramesTest, GoOnWhenTheFileIsCutOrWrittenAnew) {
     const std::vector<std::string> frames = {frame(0, milliseconds(0)), frame(1, milliseconds(10))};
     const auto replay = open(frames[0] + frames[1]);

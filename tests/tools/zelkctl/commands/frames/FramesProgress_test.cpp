@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
-// What the commands about recordings show at a terminal while they take long. How long is in the hands
-// of whoever is at the other end of a FIFO.
+// What the programs show at a terminal while they take long to read a recording, or to make something of
+// it. How long is in the hands of whoever is at the other end of a FIFO.
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -96,6 +96,32 @@ TEST_F(FramesProgress, IsShownWhileARecordingIsRead) {
     writer.join();
     EXPECT_THAT(terminal.text(), HasSubstr("frames      3000 of 344 bytes\n"));
     EXPECT_THAT(terminal.text(), Not(HasSubstr("reading")));
+}
+
+TEST_F(FramesProgress, IsShownWhileARecordingIsMadeReadyToBePlayed) {
+    std::thread writer([this] { feed(); });
+    // With packets that are too short it is not played.
+    Terminal terminal(
+            "env TERM=vt100 " ZELK_BIN_DIR "/zelk-touchstack --frame-bytes 100 --replay " + fifo,
+            80, 20);
+    EXPECT_TRUE(terminal.await([](const std::string& text) {
+        return testing::Matches(MatchesRegex("reading: [1-9][0-9]* bytes\n+"))(text);
+    })) << terminal.text();
+    hurry = true;
+    EXPECT_TRUE(terminal.awaitText("ended with 1"));
+    writer.join();
+    EXPECT_THAT(terminal.text(), Not(HasSubstr("reading")));
+}
+
+TEST_F(FramesProgress, IsNotDrawnOnADumbTerminal) {
+    std::thread writer([this] { feed(); });
+    Terminal terminal("env TERM=dumb " ZELK_BIN_DIR "/zelkctl frames stat " + fifo, 80, 20);
+    // Twice as long as it takes to be shown.
+    std::this_thread::sleep_for(std::chrono::seconds(2));
+    EXPECT_THAT(terminal.text(), MatchesRegex("\n+"));
+    hurry = true;
+    EXPECT_TRUE(terminal.awaitText("ended with 0"));
+    writer.join();
 }
 
 TEST_F(FramesProgress, IsShownWhileFramesAreExported) {

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tools/zelkctl/terminal/ProgressLine.h"
+#include "tools/common/ProgressLine.h"
 
 #include <gtest/gtest.h>
 
-namespace pemaro::zelkctl {
+namespace pemaro::tools {
 
 TEST(ProgressLine, TellsHowFarItIs) {
     const struct {
@@ -23,4 +23,4 @@ TEST(ProgressLine, TellsHowFarItIs) {
     }
 }
 
-}  // namespace pemaro::zelkctl
+}  // namespace pemaro::tools

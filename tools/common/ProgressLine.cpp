@@ -1,15 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
-#include "tools/zelkctl/terminal/ProgressLine.h"
+#include "tools/common/ProgressLine.h"
 
 #include <fmt/core.h>
 #include <unistd.h>
 
 #include <utility>
 
-#include "tools/zelkctl/terminal/Settings.h"
-#include "tools/zelkctl/terminal/Supervisor.h"
-
-namespace pemaro::zelkctl {
+namespace pemaro::tools {
 namespace {
 
 /// What takes no longer needs no word.
@@ -22,22 +19,22 @@ ProgressLine::ProgressLine(std::string what, std::string unit, bool isShown)
         : mWhat(std::move(what)),
           mUnit(std::move(unit)),
           mLine(STDERR_FILENO),
-          mIsShown(isShown && mLine.isTerminal() && !settings().json),
+          mIsShown(isShown && mLine.isTerminal()),
           mDue(Clock::now() + kPatience) {}
 
 ProgressLine::~ProgressLine() {
     mLine.clear();
 }
 
-bool ProgressLine::step(uint64_t done, uint64_t total) {
-    if (mIsShown) {
-        const Clock::time_point now = Clock::now();
-        if (now >= mDue) {
-            mLine.show(progressText(mWhat, done, total, mUnit));
-            mDue = now + kRedrawPeriod;
-        }
+void ProgressLine::step(uint64_t done, uint64_t total) {
+    if (!mIsShown) {
+        return;
     }
-    return !mustStop();
+    const Clock::time_point now = Clock::now();
+    if (now >= mDue) {
+        mLine.show(progressText(mWhat, done, total, mUnit));
+        mDue = now + kRedrawPeriod;
+    }
 }
 
 std::string progressText(const std::string& what, uint64_t done, uint64_t total,
@@ -49,4 +46,4 @@ std::string progressText(const std::string& what, uint64_t done, uint64_t total,
     return fmt::format("{}: {} of {} {}, {:.0f} %", what, done, total, unit, 100 * part);
 }
 
-}  // namespace pemaro::zelkctl
+}  // namespace pemaro::tools
