@@ -22,9 +22,11 @@
 #include "tests/driver/CommandRows.h"
 #include "tests/driver/DriverSetting.h"
 #include "tests/driver/FrameCollector.h"
+#include "tests/support/Terminal.h"
 
 using testing::HasSubstr;
 using testing::MatchesRegex;
+using testing::Not;
 using testing::StartsWith;
 
 namespace pemaro::test {
@@ -361,6 +363,19 @@ TEST(Timeout, GivesUpACallThatIsNotAnswered) {
     EXPECT_EQ(4, scan.status);
     EXPECT_EQ("{\"error\":\"scan: no answer within 2 s\",\"exit\":4}\n", scan.errors);
     EXPECT_EQ(0, zelkctl({"packet-size", "--timeout", "20"}).status);
+}
+
+TEST(Terminals, ShowACallUntilItIsAnswered) {
+    TouchStack touchStack;
+    touchStack.process().signal(SIGSTOP);
+    Terminal terminal("env TERM=vt100 " + binary("zelkctl") + " ping", 80, 20);
+    EXPECT_TRUE(terminal.await([](const std::string& text) {
+        return testing::Matches(MatchesRegex("[a-zA-Z]+: waiting for the answer, [0-9]+ s\n+"))(
+                text);
+    })) << terminal.text();
+    touchStack.process().signal(SIGCONT);
+    EXPECT_TRUE(terminal.awaitText("ended with 0")) << terminal.text();
+    EXPECT_THAT(terminal.text(), Not(HasSubstr("waiting")));
 }
 
 TEST(Signals, EndACommandWhoseCallIsNotAnswered) {

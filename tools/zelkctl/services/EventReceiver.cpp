@@ -8,6 +8,7 @@
 #include "frames/Checksum.h"
 #include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Printable.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 #include "tools/zelkctl/terminal/TerminalTraits.h"
 
 namespace pemaro::zelkctl {
@@ -90,6 +91,7 @@ uint64_t EventReceiver::close() {
 
 void EventReceiver::print(const void* record, size_t size) {
     if (mGoal.reached && !mAwaited && !mJson && mLine.isTerminal()) {
+        hideCall();
         mLine.show(eventLine(Clock::now(), record, size, false));
         return;
     }

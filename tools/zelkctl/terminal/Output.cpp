@@ -7,6 +7,7 @@
 
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -24,6 +25,7 @@ int wordsDescriptor() {
 }
 
 void say(const std::string& line) {
+    hideCall();
     if (gDataOnOutput) {
         tools::writeError(line);
     } else {
@@ -36,6 +38,7 @@ void sayResult(const std::string& text, JsonObject& object) {
 }
 
 void note(const std::string& text) {
+    hideCall();
     tools::writeError(settings().json ? JsonObject().add("note", text).text() : "zelkctl: " + text);
 }
 

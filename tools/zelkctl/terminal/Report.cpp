@@ -4,10 +4,12 @@
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Settings.h"
+#include "tools/zelkctl/terminal/Supervisor.h"
 
 namespace pemaro::zelkctl {
 
 int fail(const std::string& problem, int exitStatus) {
+    hideCall();
     tools::writeError(settings().json
                               ? JsonObject().add("error", problem).add("exit", exitStatus).text()
                               : "zelkctl: " + problem);

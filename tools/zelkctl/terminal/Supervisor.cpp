@@ -16,8 +16,10 @@
 #include <utility>
 #include <vector>
 
+#include "tools/common/LiveLine.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/terminal/Report.h"
+#include "tools/zelkctl/terminal/Settings.h"
 
 namespace pemaro::zelkctl {
 namespace {
@@ -30,8 +32,11 @@ using std::chrono::milliseconds;
 constexpr milliseconds kGrace(800);
 /// How long what it finishes may take.
 constexpr milliseconds kFinishGrace(10000);
-/// How often calls are looked at, when they have a time.
+/// How often calls are looked at, when they have a time, and when they are shown.
 constexpr milliseconds kCallPeriod(20);
+constexpr milliseconds kShowPeriod(200);
+/// What takes no longer needs no word.
+constexpr std::chrono::seconds kPatience(1);
 
 struct Wait {
     uint64_t number;
@@ -44,6 +49,10 @@ std::mutex gLock;
 std::vector<Wait> gWaits;
 std::atomic<uint64_t> gLastWait{0};
 std::vector<std::function<void()>> gLastWords;
+
+/// What the standard error shows of a call. Locked last, and never while it is waited for anything.
+std::mutex gShowing;
+std::string gShownCall;
 
 std::atomic<int> gFinishing{0};
 std::atomic<Clock::time_point> gFinishedAt{Clock::time_point()};
@@ -59,8 +68,44 @@ std::string stopReason() {
     return gSignal == 0 ? tools::outputProblem() : "interrupted";
 }
 
+tools::LiveLine& callLine() {
+    static tools::LiveLine line(STDERR_FILENO);
+    return line;
+}
+
+bool showsCalls() {
+    return !settings().json && callLine().isTerminal();
+}
+
+/// Whether the terminal takes something now: one that is held back by Ctrl-S does not.
+bool takesWords() {
+    pollfd entry{STDERR_FILENO, POLLOUT, 0};
+    return poll(&entry, 1, 0) > 0;
+}
+
+/// Tells of a call that takes long, the one that was made first.
+void showLateCall() {
+    const std::lock_guard<std::mutex> guard(gLock);
+    const auto now = Clock::now();
+    const auto late = std::find_if(gWaits.begin(), gWaits.end(), [&](const Wait& wait) {
+        return wait.isCall && now - wait.since >= kPatience;
+    });
+    if (late == gWaits.end()) {
+        return;
+    }
+    const auto waited = std::chrono::floor<std::chrono::seconds>(now - late->since);
+    const std::string text =
+            fmt::format("{}: waiting for the answer, {} s", late->what, waited.count());
+    const std::lock_guard<std::mutex> showing(gShowing);
+    if (text != gShownCall && takesWords()) {
+        callLine().show(text);
+        gShownCall = text;
+    }
+}
+
 /// Ends the process while the command hangs.
 [[noreturn]] void abandon(const std::string& reason, int status) {
+    hideCall();
     // The command cannot go on in what the last words look at.
     const std::lock_guard<std::mutex> guard(gLock);
     for (auto words = gLastWords.rbegin(); words != gLastWords.rend(); ++words) {
@@ -146,6 +191,9 @@ class Watch {
             if (mTimeout > 0) {
                 checkCalls(mTimeout);
             }
+            if (mShowsCalls) {
+                showLateCall();
+            }
         }
     }
 
@@ -154,11 +202,13 @@ class Watch {
         if (mTimeout > 0) {
             return static_cast<int>(kCallPeriod.count());
         }
+        const auto most = static_cast<int>(mShowsCalls ? kShowPeriod.count() : -1);
         if (mDeadline == kNever) {
-            return -1;
+            return most;
         }
         const auto left = std::chrono::ceil<milliseconds>(mDeadline - Clock::now());
-        return static_cast<int>(std::max<int64_t>(left.count(), 0));
+        const auto patience = static_cast<int>(std::max<int64_t>(left.count(), 0));
+        return mShowsCalls ? std::min(patience, most) : patience;
     }
 
     /// What was finished until now has its time, and so has what comes behind it.
@@ -195,12 +245,21 @@ class Watch {
 
     const double mTimeout;
     const int mDone;
+    const bool mShowsCalls = showsCalls();
     const unique_fd mSignals = takeSignals();
     Clock::time_point mDeadline = kNever;
     Clock::time_point mLastDeadline = kNever;
 };
 
 }  // namespace
+
+void hideCall() {
+    const std::lock_guard<std::mutex> guard(gShowing);
+    if (!gShownCall.empty() && takesWords()) {
+        callLine().clear();
+    }
+    gShownCall.clear();
+}
 
 int supervise(const std::function<int()>& command, double callTimeout) {
     const unique_fd done(eventfd(0, EFD_CLOEXEC));
@@ -234,9 +293,12 @@ Waiting::Waiting(const std::string& what, bool isCall) : mNumber(++gLastWait) {
 
 /// Threads may wait for several things at once, and end in any order.
 Waiting::~Waiting() {
-    const std::lock_guard<std::mutex> guard(gLock);
-    gWaits.erase(std::find_if(gWaits.begin(), gWaits.end(),
-                              [this](const Wait& wait) { return wait.number == mNumber; }));
+    {
+        const std::lock_guard<std::mutex> guard(gLock);
+        gWaits.erase(std::find_if(gWaits.begin(), gWaits.end(),
+                                  [this](const Wait& wait) { return wait.number == mNumber; }));
+    }
+    hideCall();
 }
 
 Finishing::Finishing() {

@@ -14,8 +14,14 @@ namespace pemaro::zelkctl {
 /// Runs a command and returns its exit status. SIGINT, SIGTERM and SIGHUP, and the end of whoever
 /// reads the standard output, ask it to stop; when it has not within a second, or when a signal
 /// comes again, or when a call takes longer than `callTimeout` seconds (0: it may), the last words
-/// are spoken and the process ends, without a return. To be called once.
+/// are spoken and the process ends, without a return. A call that takes longer than a second is shown
+/// on the standard error until it is answered, if that is a terminal, and not with --json. To be called
+/// once.
 int supervise(const std::function<int()>& command, double callTimeout);
+
+/// Takes away what is shown of a call, so that what is written next stands in its place. It comes back
+/// while there is no answer.
+void hideCall();
 
 /// Whether the command was asked to stop.
 bool mustStop();

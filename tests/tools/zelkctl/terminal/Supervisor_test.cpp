@@ -2,6 +2,7 @@
 // How a command ends under supervision. Each runs in a process of its own, which it ends.
 #include "tools/zelkctl/terminal/Supervisor.h"
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <signal.h>
 #include <unistd.h>
@@ -11,11 +12,15 @@
 #include <string>
 #include <thread>
 
+#include "tests/support/Paper.h"
 #include "tests/support/Sanitizers.h"
 #include "tools/common/ExitStatus.h"
 #include "tools/common/StandardOutput.h"
+#include "tools/zelkctl/terminal/Output.h"
+#include "tools/zelkctl/terminal/Settings.h"
 
 using testing::ExitedWithCode;
+using testing::MatchesRegex;
 
 #ifdef ZELK_THREAD_SANITIZER
 // A process that ends while threads are at work would be kept for a second, for races to show: too long for
@@ -169,6 +174,57 @@ TEST(SupervisorDeathTest, GivesACallUpThatTakesTooLong) {
                         },
                         0.05),
                 ExitedWithCode(5), "^$");
+}
+
+TEST(SupervisorDeathTest, ShowsACallThatTakesLongOnATerminal) {
+    const std::string shown = "(\ropenDoor: waiting for the answer, [0-9]+ s\x1b\\[K)+";
+    const std::string gone = "\r\x1b\\[K";
+    const auto takes = [](int tenths) {
+        return [tenths] {
+            return call("openDoor", [tenths] {
+                std::this_thread::sleep_for(std::chrono::milliseconds(100 * tenths));
+                return 5;
+            });
+        };
+    };
+    const auto isHeard = [] {
+        return call("openDoor", [] {
+            std::this_thread::sleep_for(std::chrono::seconds(2));
+            note("news");
+            return 5;
+        });
+    };
+    const struct {
+        const char* what;
+        const char* term;
+        bool json;
+        double timeout;
+        std::function<int()> command;
+        int status;
+        std::string text;
+    } rows[] = {
+            {"a long one", "vt100", false, 0, takes(20), 5, shown + gone},
+            {"one that is given up", "vt100", false, 2, takes(100), tools::kExitTimeout,
+             shown + gone + "zelkctl: openDoor: no answer within 2 s\r\n"},
+            {"one with other words", "vt100", false, 0, isHeard, 5,
+             shown + gone + "zelkctl: news\r\n(" + shown + gone + ")?"},
+            {"a short one", "vt100", false, 0, takes(1), 5, ""},
+            {"on a dumb terminal", "dumb", false, 0, takes(15), 5, ""},
+            {"for a program", "vt100", true, 0, takes(15), 5, ""},
+    };
+    for (const auto& row : rows) {
+        const test::Term term(row.term);
+        const test::Paper paper(80);
+        EXPECT_EXIT(
+                {
+                    dup2(paper.fd, STDERR_FILENO);
+                    settings().json = row.json;
+                    superviseAndExit(row.command, row.timeout);
+                },
+                ExitedWithCode(row.status), "^$")
+                << row.what;
+        EXPECT_THAT(paper.text(), MatchesRegex(row.text)) << row.what;
+    }
 }
 
 TEST(SupervisorDeathTest, AsksTheCommandToStopWhenNobodyReadsItsOutput) {
