@@ -52,4 +52,26 @@ TEST(ServiceManager, ThatIsNewLearnsOfTheServices) {
     EXPECT_EQ(0, stack.wait());
 }
 
+TEST(ServiceManager, ThatHangsKeepsNobodyFromEndingTheServices) {
+    ChildProcess manager({ZELK_PLATFORM_BIN_DIR "/servicemanager"});
+    std::this_thread::sleep_for(std::chrono::milliseconds(500));
+    const std::string program = ZELK_BIN_DIR "/zelk-touchstack";
+    for (const int signal : {SIGINT, SIGTERM}) {
+        ChildProcess registered({program, "--gesture-rate", "0"});
+        ASSERT_TRUE(registered.awaitOutput("process "));
+        manager.signal(SIGSTOP);
+        ChildProcess unknown({program, "--gesture-rate", "0"});
+        // Until both wait for the service manager.
+        std::this_thread::sleep_for(std::chrono::seconds(1));
+        for (ChildProcess* stack : {&registered, &unknown}) {
+            stack->signal(signal);
+            EXPECT_EQ(0, stack->wait(std::chrono::seconds(10)));
+            EXPECT_EQ("", stack->errors());
+        }
+        EXPECT_NE(std::string::npos, registered.output().find("stopped: 0 recordings, "));
+        EXPECT_EQ("", unknown.output());
+        manager.signal(SIGCONT);
+    }
+}
+
 }  // namespace pemaro::test

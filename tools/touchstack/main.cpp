@@ -10,8 +10,11 @@
 #include <algorithm>
 #include <atomic>
 #include <chrono>
+#include <condition_variable>
 #include <memory>
+#include <mutex>
 #include <string>
+#include <thread>
 #include <utility>
 
 #include "simulator/TouchStack.h"
@@ -38,7 +41,9 @@ using pemaro::touchstack::Registrar;
 namespace {
 
 /// How often the service manager and a source are looked after.
-constexpr timespec kPeriod{0, 500000000};
+constexpr std::chrono::milliseconds kPeriod(500);
+/// How long whoever does that may take to end.
+constexpr std::chrono::milliseconds kGrace(800);
 
 int fail(const std::string& problem, int status = kExitFailure) {
     pemaro::tools::writeError("zelk-touchstack: " + problem);
@@ -165,38 +170,89 @@ class SourceWatch {
     std::shared_ptr<TouchScreen> mScreen;
 };
 
-int serve(CommandLine& line) {
-    // Blocked before the first thread is made, so that only sigtimedwait below sees them.
+/// The services, registered and looked after on a thread of their own: a service manager that hangs
+/// keeps whoever asks it, and that must not be who waits for the signals.
+class Server {
+  public:
+    explicit Server(const CommandLine& line) : mLine(line) {}
+
+    /// Serves until end() is called; ends the process when that cannot be.
+    void run() {
+        const std::string problem = pemaro::tools::binderProblem();
+        if (!problem.empty()) {
+            pemaro::tools::leave(fail(problem, pemaro::tools::kExitAbsent));
+        }
+        TouchStack& stack = makeStack();
+        android::ProcessState::self()->startThreadPool();
+        const std::string refusal = stack.registerAll();
+        if (!refusal.empty()) {
+            pemaro::tools::leave(fail(refusal));
+        }
+        describe(mLine);
+
+        Registrar registrar(stack.services(), tell);
+        SourceWatch source(mLine.options.companion.touchScreen);
+        while (!awaitEnd()) {
+            registrar.check();
+            source.check();
+        }
+        const std::lock_guard<std::mutex> guard(mLock);
+        mHasEnded = true;
+        mChanged.notify_all();
+    }
+
+    /// Ends the services, and tells what they have done.
+    void end() {
+        std::unique_lock<std::mutex> guard(mLock);
+        mMustEnd = true;
+        mChanged.notify_all();
+        mChanged.wait_for(guard, kGrace, [this] { return mHasEnded; });
+        if (mStack == nullptr) {
+            return;
+        }
+        mStack->shutDown();
+        for (const std::string& text : mStack->summary()) {
+            tell(text);
+        }
+    }
+
+  private:
+    TouchStack& makeStack() {
+        const std::lock_guard<std::mutex> guard(mLock);
+        mStack = std::make_unique<TouchStack>(mLine.options);
+        for (const Fault& fault : mLine.faults) {
+            mStack->order(fault);
+        }
+        return *mStack;
+    }
+
+    /// Whether it is to end, before the time has come to look again.
+    bool awaitEnd() {
+        std::unique_lock<std::mutex> guard(mLock);
+        return mChanged.wait_for(guard, kPeriod, [this] { return mMustEnd; });
+    }
+
+    const CommandLine& mLine;
+    std::mutex mLock;
+    std::condition_variable mChanged;
+    bool mMustEnd = false;
+    bool mHasEnded = false;
+    std::unique_ptr<TouchStack> mStack;
+};
+
+[[noreturn]] void serve(CommandLine& line) {
+    // Blocked before the first thread is made, so that only sigwait below sees them.
     const sigset_t signals = stopSignals();
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
 
-    const std::string problem = pemaro::tools::binderProblem();
-    if (!problem.empty()) {
-        return fail(problem, pemaro::tools::kExitAbsent);
-    }
     line.options.companion.narrate = line.options.managers.narrate = tell;
-    TouchStack stack(line.options);
-    for (const Fault& fault : line.faults) {
-        stack.order(fault);
-    }
-    android::ProcessState::self()->startThreadPool();
-    const std::string refusal = stack.registerAll();
-    if (!refusal.empty()) {
-        return fail(refusal);
-    }
-    describe(line);
-
-    Registrar registrar(stack.services(), tell);
-    SourceWatch source(line.options.companion.touchScreen);
-    while (sigtimedwait(&signals, nullptr, &kPeriod) < 0) {
-        registrar.check();
-        source.check();
-    }
-    stack.shutDown();
-    for (const std::string& text : stack.summary()) {
-        tell(text);
-    }
-    return pemaro::tools::outputProblem().empty() ? kExitSuccess : kExitFailure;
+    // It may hang in there when the process ends, and what it uses stays until then.
+    Server server(line);
+    std::thread([&server] { server.run(); }).detach();
+    int signal = 0;
+    sigwait(&signals, &signal);
+    server.end();
+    pemaro::tools::leave(pemaro::tools::outputProblem().empty() ? kExitSuccess : kExitFailure);
 }
 
 }  // namespace
@@ -222,5 +278,5 @@ int main(int argc, char** argv) {
         return fail(problem);
     }
     pemaro::tools::showPlatformLog(line.showLog);
-    pemaro::tools::leave(serve(line));
+    serve(line);
 }
