@@ -113,6 +113,17 @@ INSTANTIATE_TEST_SUITE_P(
                 Misuse{"zelkctl record --speed", "zelkctl: there is no option '--speed'"}));
 
 INSTANTIATE_TEST_SUITE_P(
+        ControlCharacters, Usage,
+        ::testing::Values(
+                Misuse{"zelkctl x\x1b[31mred", "zelkctl: there is no command 'x?[31mred'"},
+                Misuse{"zelkctl help x\x1b[31mred", "zelkctl: there is no command 'x?[31mred'"},
+                Misuse{"zelkctl --x\x1b[31mred", "zelkctl: there is no option '--x?[31mred'"},
+                Misuse{"zelkctl status \x7f",
+                       "zelkctl: NUMBER: '?' is no number from -2147483648 to 4294967295"},
+                Misuse{"zelk-touchstack \x1b[31mred",
+                       "zelk-touchstack: the argument '?[31mred' is one too many"}));
+
+INSTANTIATE_TEST_SUITE_P(
         CompanionCommands, Usage,
         ::testing::Values(
                 Misuse{"zelkctl check finger", "zelkctl: SERVICE: there is no 'finger'"},

@@ -12,6 +12,7 @@
 
 #include "pemaro/Version.h"
 #include "tools/common/NearestWord.h"
+#include "tools/common/Printable.h"
 #include "tools/common/StandardOutput.h"
 
 namespace pemaro::tools {
@@ -147,7 +148,7 @@ std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
         if (report) {
             report(problem);
         } else {
-            writeError(app.get_name() + ": " + problem + " (--help tells more)");
+            writeError(app.get_name() + ": " + printable(problem) + " (--help tells more)");
         }
         return kExitUsage;
     };

@@ -3,16 +3,7 @@
 
 #include <fmt/chrono.h>
 
-#include <algorithm>
-
 namespace pemaro::zelkctl {
-
-std::string printable(std::string name) {
-    std::replace_if(
-            name.begin(), name.end(), [](unsigned char byte) { return byte < ' ' || byte == 0x7F; },
-            '?');
-    return name;
-}
 
 std::string joined(const std::vector<std::string>& words) {
     std::string list;

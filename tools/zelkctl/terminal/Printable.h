@@ -5,10 +5,11 @@
 #include <string>
 #include <vector>
 
+#include "tools/common/Printable.h"
+
 namespace pemaro::zelkctl {
 
-/// A name as it can be printed on one line: each control character becomes a question mark.
-std::string printable(std::string name);
+using tools::printable;
 
 /// Several words with commas between.
 std::string joined(const std::vector<std::string>& words);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/zelkctl/terminal/Report.h"
 
+#include "tools/common/Printable.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/terminal/Json.h"
 #include "tools/zelkctl/terminal/Settings.h"
@@ -17,7 +18,8 @@ int fail(const std::string& problem, int exitStatus) {
 }
 
 int failUsage(const std::string& problem) {
-    return fail(settings().json ? problem : problem + " (--help tells more)", tools::kExitUsage);
+    const std::string text = tools::printable(problem);
+    return fail(settings().json ? text : text + " (--help tells more)", tools::kExitUsage);
 }
 
 int failAbsent(const std::string& service) {

@@ -8,15 +8,6 @@
 
 namespace pemaro::zelkctl {
 
-TEST(Printable, PutsAQuestionMarkInPlaceOfEachControlCharacter) {
-    EXPECT_EQ("a?b??", printable("a\nb\x1b\x7F"));
-}
-
-TEST(Printable, LeavesEverythingElseAsItIs) {
-    EXPECT_EQ(" Zo\xC3\xAB ~", printable(" Zo\xC3\xAB ~"));
-    EXPECT_EQ("", printable(""));
-}
-
 TEST(TimeOfDay, HasThreePlacesBehindTheSecond) {
     const std::chrono::system_clock::time_point when(std::chrono::milliseconds(1'700'000'021'007));
     EXPECT_THAT(timeOfDay(when), testing::MatchesRegex("[0-9]{2}:[0-9]{2}:41\\.007"));
