@@ -125,6 +125,7 @@ TEST(Settings, CanBeReadAndListed) {
              "getConfigParams: Not Found (0x40000019): volume, brightness\n"},
             {{"property", "get", "rollingLogSize"}, 0, "rollingLogSize=256\n"},
             {{"property", "get", "volume"}, 1, "property get: Not Found (0x40000019): volume\n"},
+            {{"property", "get", "++"}, 1, "property get: Not Found (0x40000019): ++\n"},
             {{"afe", "set", "frequency=5"}, 0, "frequency=5\n"},
             {{"afe", "get", "frequency"}, 0, "frequency=5\n"},
             {{"afe", "set", "volume=5"}, 1, "setAFEParams: Bad parameter (0x4000000D): volume\n"},

@@ -113,6 +113,20 @@ INSTANTIATE_TEST_SUITE_P(
                 Misuse{"zelkctl record --speed", "zelkctl: there is no option '--speed'"}));
 
 INSTANTIATE_TEST_SUITE_P(
+        ValuesOfFlags, Usage,
+        ::testing::Values(
+                Misuse{"zelkctl --json=nonsense", "zelkctl: --json: it takes no value"},
+                Misuse{"zelkctl status --json=false", "zelkctl: --json: it takes no value"},
+                Misuse{"zelkctl status --json= 0", "zelkctl: --json: it takes no value"},
+                Misuse{"zelkctl --log=1 status", "zelkctl: --log: it takes no value"},
+                Misuse{"zelkctl --version=x", "zelkctl: --version: it takes no value"},
+                Misuse{"zelkctl ping --help=x", "zelkctl: --help: it takes no value"},
+                Misuse{"zelkctl ping -hx", "zelkctl: -h: it takes no value"},
+                Misuse{"zelkctl check --tap=yes", "zelkctl: --tap: it takes no value"},
+                Misuse{"zelkctl hand enroll --stop=1", "zelkctl: --stop: it takes no value"},
+                Misuse{"zelk-touchstack --loop=2", "zelk-touchstack: --loop: it takes no value"}));
+
+INSTANTIATE_TEST_SUITE_P(
         ControlCharacters, Usage,
         ::testing::Values(
                 Misuse{"zelkctl x\x1b[31mred", "zelkctl: there is no command 'x?[31mred'"},
@@ -331,6 +345,48 @@ TEST(Arguments, AreNotEmpty) {
         EXPECT_EQ(2, result.status) << row.what;
         EXPECT_EQ("", result.output);
         EXPECT_EQ(program + ": " + row.what + " (--help tells more)\n", result.errors);
+    }
+}
+
+TEST(Arguments, ArriveAsTheyAreTyped) {
+    const struct {
+        std::vector<std::string> words;
+        int status;
+        std::string output;
+        std::string errors;
+    } rows[] = {
+            {{"--", "status", "0"}, 0, "0x00000000           0  No error\n", ""},
+            {{"status", "--", "0"}, 0, "0x00000000           0  No error\n", ""},
+            {{"status", "++"},
+             2,
+             "",
+             "zelkctl: NUMBER: '++' is no number from -2147483648 to 4294967295 (--help tells "
+             "more)\n"},
+            {{"gesture", "add", "[/no/x]"},
+             1,
+             "",
+             "zelkctl: cannot open [/no/x]: No such file or directory\n"},
+            {{"gesture", "add", "[/no/a,b]"},
+             1,
+             "",
+             "zelkctl: cannot open [/no/a,b]: No such file or directory\n"},
+            {{"frames", "stat", "++"},
+             1,
+             "",
+             "zelkctl: cannot read ++: No such file or directory\n"},
+            // What is an operand asks for no JSON.
+            {{"gesture", "add", "--", "--json"},
+             1,
+             "",
+             "zelkctl: cannot open --json: No such file or directory\n"},
+    };
+    for (const auto& row : rows) {
+        std::vector<std::string> words = row.words;
+        words.insert(words.begin(), ZELK_BIN_DIR "/zelkctl");
+        const RunResult result = run(words);
+        EXPECT_EQ(row.status, result.status) << row.errors;
+        EXPECT_EQ(row.output, result.output);
+        EXPECT_EQ(row.errors, result.errors);
     }
 }
 

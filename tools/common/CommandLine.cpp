@@ -18,11 +18,20 @@
 namespace pemaro::tools {
 namespace {
 
+/// Stands in front of what is a value or an operand, as it is handed to the parser: the parser has a
+/// syntax of its own for some words, as "[a,b]", "++" and the names of commands, and sees none of
+/// them then.
+constexpr char kMark = '\1';
+
+std::string unmarked(const std::string& word) {
+    return !word.empty() && word[0] == kMark ? word.substr(1) : word;
+}
+
 /// Follows the words of a command line through the tree of commands, for what the parser tells too
-/// late, in another order, or without a hint.
+/// late, in another order, or without a hint, and for what it would take for something else.
 class Walk {
   public:
-    explicit Walk(const CLI::App& app) : mCommand(&app) {}
+    explicit Walk(CLI::App& app) : mCommand(&app) {}
 
     /// The first thing that is wrong; empty when nothing is.
     std::string problem(const std::vector<std::string>& words) {
@@ -45,6 +54,20 @@ class Walk {
         return "";
     }
 
+    /// The words as the parser takes them: an option and its value apart, and no "--".
+    const std::vector<std::string>& words() const { return mWords; }
+
+    /// Makes the options and operands of the commands that were named take what was typed.
+    void prepareOptions() const {
+        for (CLI::App* app = mCommand; app != nullptr; app = app->get_parent()) {
+            for (CLI::Option* option : app->get_options()) {
+                if (option->get_expected_max() != 0) {
+                    option->transform(unmarked, "");
+                }
+            }
+        }
+    }
+
   private:
     static bool isOption(const std::string& word) {
         const bool isNumber = word.size() > 1 && (isdigit(word[1]) != 0 || word[1] == '.');
@@ -63,16 +86,17 @@ class Walk {
     }
 
     std::string takeCommand(const std::string& word) {
-        for (const CLI::App* command : mCommand->get_subcommands({})) {
+        for (CLI::App* command : mCommand->get_subcommands({})) {
             if (command->get_name() == word) {
                 mCommand = command;
+                mWords.push_back(word);
                 return "";
             }
         }
         return unknown("command", word, commandNames());
     }
 
-    std::string takeOption(const std::vector<std::string>& words, size_t& i) const {
+    std::string takeOption(const std::vector<std::string>& words, size_t& i) {
         const std::string& word = words[i];
         const bool isLong = word[1] == '-';
         const size_t end = isLong ? word.find('=') : 2;
@@ -81,14 +105,16 @@ class Walk {
         if (option == nullptr || !option->nonpositional()) {
             return unknown("option", name, optionNames());
         }
-        if (option->get_expected_max() == 0) {
-            return "";
-        }
         const bool isAttached = end != std::string::npos && end < word.size();
+        mWords.push_back(name);
+        if (option->get_expected_max() == 0) {
+            return isAttached ? name + ": it takes no value" : "";
+        }
         if (!isAttached && (i + 1 == words.size() || isOption(words[i + 1]))) {
             return name + ": a value is missing";
         }
         const std::string value = isAttached ? word.substr(isLong ? end + 1 : end) : words[++i];
+        mWords.push_back(kMark + value);
         return value.empty() ? name + ": the value is empty" : "";
     }
 
@@ -106,6 +132,7 @@ class Walk {
             return fmt::format("the argument '{}' is one too many", word);
         }
         mOperands += 1;
+        mWords.push_back(kMark + word);
         return word.empty() ? current->get_name(true) + ": the argument is empty" : "";
     }
 
@@ -127,7 +154,8 @@ class Walk {
         return fmt::format("there is no {} '{}'{}", kind, word, nearestWordHint(word, known));
     }
 
-    const CLI::App* mCommand;
+    CLI::App* mCommand;
+    std::vector<std::string> mWords;
     size_t mOperands = 0;
     bool mOperandsOnly = false;
 };
@@ -155,12 +183,15 @@ std::optional<int> parseCommandLine(CLI::App& app, int argc, char** argv,
     app.set_version_flag("--version", app.get_name() + " " ZELK_VERSION,
                          "Print the version and exit");
     addVersionBehind(app, app.get_name() + " " ZELK_VERSION);
-    const std::string problem = Walk(app).problem({argv + 1, argv + argc});
+    Walk walk(app);
+    const std::string problem = walk.problem({argv + 1, argv + argc});
     if (!problem.empty()) {
         return refuse(problem);
     }
+    walk.prepareOptions();
     try {
-        app.parse(argc, argv);
+        // The parser takes them from the end.
+        app.parse(std::vector<std::string>(walk.words().rbegin(), walk.words().rend()));
         if (check) {
             check();
         }

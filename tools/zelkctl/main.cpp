@@ -18,8 +18,9 @@ using namespace pemaro;
 namespace {
 
 /// What is wrong with a command line is told before it is read, and in the form that it asks for.
+/// Behind "--" it is an operand.
 bool asksForJson(int argc, char** argv) {
-    for (int i = 1; i < argc; ++i) {
+    for (int i = 1; i < argc && strcmp(argv[i], "--") != 0; ++i) {
         if (strcmp(argv[i], "--json") == 0) {
             return true;
         }
