@@ -94,6 +94,15 @@ TEST(ManPage, OfZelkctlExplainsTheOptionsOfTheProgram) {
     }
 }
 
+TEST(ManPage, OfZelkctlPutsWhatMayBeLeftOutBetweenBrackets) {
+    const std::string page = shownPage("zelkctl.1");
+    for (const char* heading :
+         {"frames export --format png|csv|cells|json [--output FILE] [--first NUMBER]",
+          "frames report --output FILE [--every NUMBER] FILE", "status [NUMBER]"}) {
+        EXPECT_NE(std::string::npos, page.find(heading)) << heading;
+    }
+}
+
 TEST(ManPage, OfTheTouchStackTellsEachOption) {
     EXPECT_EQ(readHelpTree("zelk-touchstack").at("").options,
               documentedOptions("zelk-touchstack.1"));

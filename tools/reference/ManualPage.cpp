@@ -32,11 +32,16 @@ bool isCommon(const Argument& option) {
            option.longName == "--timeout" || option.longName == "--version";
 }
 
+/// Between brackets, unless it has to be there.
+std::string manWanted(const Argument& argument, const std::string& shown) {
+    return argument.isRequired ? " " + shown : " Oo " + shown + " Oc";
+}
+
 std::string manHeading(const Entry& entry) {
     std::string line = ".It Cm " + entry.path;
     for (const Argument& option : entry.options) {
         if (!isCommon(option)) {
-            line += " Oo " + manOption(option) + " Oc";
+            line += manWanted(option, manOption(option));
         }
     }
     for (const Argument& operand : entry.operands) {
@@ -44,7 +49,7 @@ std::string manHeading(const Entry& entry) {
         const bool isChoice = operand.word.find('|') != std::string::npos;
         const std::string shown =
                 (isChoice ? "Cm " : "Ar ") + manText(word) + (operand.isRepeated ? " ..." : "");
-        line += operand.isRequired ? " " + shown : " Oo " + shown + " Oc";
+        line += manWanted(operand, shown);
     }
     return line + "\n";
 }

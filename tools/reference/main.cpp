@@ -11,13 +11,18 @@
 #include <fmt/core.h>
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
+#include <cerrno>
 #include <cstdio>
+#include <cstring>
+#include <iterator>
 #include <optional>
 #include <sstream>
 #include <string>
 
 #include "simulator/faults/Fault.h"
 #include "tools/common/ExitStatus.h"
+#include "tools/common/Printable.h"
 #include "tools/reference/Parts.h"
 #include "tools/touchstack/Options.h"
 #include "tools/zelkctl/commands/CommandTree.h"
@@ -57,6 +62,9 @@ std::optional<Program> read(const std::string& name) {
     return std::nullopt;
 }
 
+constexpr const char* kUsage =
+        "usage: zelk-reference zelkctl|zelk-touchstack bash|zsh|man TEMPLATE OUTPUT";
+
 struct Part {
     const char* kind;
     const char* mark;
@@ -85,23 +93,31 @@ std::string fill(const std::string& pattern, const std::string& kind, const Prog
     return text;
 }
 
-int fail(const std::string& problem) {
-    fmt::print(stderr, "zelk-reference: {}\n", problem);
-    return tools::kExitFailure;
+bool isKind(const std::string& kind) {
+    return std::any_of(std::begin(kParts), std::end(kParts),
+                       [&kind](const Part& part) { return kind == part.kind; });
+}
+
+int fail(const std::string& problem, int exitStatus = tools::kExitFailure) {
+    fmt::print(stderr, "zelk-reference: {}\n", tools::printable(problem));
+    return exitStatus;
 }
 
 int make(const std::string& name, const std::string& kind, const std::string& pattern,
          const std::string& output) {
     const std::optional<Program> program = read(name);
     if (!program) {
-        return fail("there is no program " + name);
+        return fail("there is no program '" + name + "'", tools::kExitUsage);
+    }
+    if (!isKind(kind)) {
+        return fail("there is no kind of reference '" + kind + "'", tools::kExitUsage);
     }
     std::string text;
     if (!android::base::ReadFileToString(pattern, &text, true)) {
-        return fail("cannot read " + pattern);
+        return fail("cannot read " + pattern + ": " + strerror(errno));
     }
     if (!android::base::WriteStringToFile(fill(text, kind, *program), output, true)) {
-        return fail("cannot write " + output);
+        return fail("cannot write " + output + ": " + strerror(errno));
     }
     return tools::kExitSuccess;
 }
@@ -111,8 +127,7 @@ int make(const std::string& name, const std::string& kind, const std::string& pa
 
 int main(int argc, char** argv) {
     if (argc != 5) {
-        return pemaro::reference::fail(
-                "usage: zelk-reference zelkctl|zelk-touchstack bash|zsh|man TEMPLATE OUTPUT");
+        return pemaro::reference::fail(pemaro::reference::kUsage, pemaro::tools::kExitUsage);
     }
     return pemaro::reference::make(argv[1], argv[2], argv[3], argv[4]);
 }
