@@ -111,8 +111,8 @@ FrameSummary summarize(const RecordingFile& file) {
     FrameSummary summary;
     frames::Sequence sequence;
     std::vector<double> intervals;
-    uint64_t firstTime = 0;
     uint64_t lastTime = 0;
+    double nanoseconds = 0;
     for (const RecordingFile::Part& part : file.parts()) {
         if (part.kind == RecordingFile::Kind::kCorrupt) {
             summary.corrupt.push_back(part);
@@ -128,11 +128,17 @@ FrameSummary summarize(const RecordingFile& file) {
             summary.gaps.push_back({summary.frames, part.offset, lost});
             summary.lost += lost;
         }
-        if (summary.frames == 0) {
-            firstTime = part.header.timeNs;
-        } else if (!isGap) {
-            intervals.push_back(
-                    static_cast<double>(static_cast<int64_t>(part.header.timeNs - lastTime)) / 1e6);
+        if (summary.frames != 0) {
+            const auto passed =
+                    static_cast<double>(static_cast<int64_t>(part.header.timeNs - lastTime));
+            // Where two recordings meet, the clock of one is no measure for the other.
+            if (passed >= 0) {
+                nanoseconds += passed;
+                summary.steps += 1;
+            }
+            if (!isGap) {
+                intervals.push_back(passed / 1e6);
+            }
         }
         lastTime = part.header.timeNs;
         summary.frames += 1;
@@ -141,7 +147,7 @@ FrameSummary summarize(const RecordingFile& file) {
         summary.rows.add(part.header.rows);
         summary.fingers.add(part.header.fingers);
     }
-    summary.seconds = static_cast<double>(static_cast<int64_t>(lastTime - firstTime)) / 1e9;
+    summary.seconds = nanoseconds / 1e9;
     summary.intervals = spreadOf(std::move(intervals));
     return summary;
 }

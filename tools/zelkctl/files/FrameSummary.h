@@ -45,7 +45,8 @@ struct FrameSummary {
     Extent columns;
     Extent rows;
     Extent fingers;
-    double seconds = 0;  ///< from the first frame to the last
+    double seconds = 0;  ///< from the first frame to the last, without where the time goes back
+    uint64_t steps = 0;  ///< from a frame to the next within these seconds
     /// Between frames of which none is missing, in milliseconds.
     std::optional<Spread> intervals;
     uint64_t lost = 0;
@@ -54,7 +55,7 @@ struct FrameSummary {
     std::optional<frames::RecordingFile::Part> truncated;
 
     /// Frames a second.
-    double rate() const { return seconds > 0 ? static_cast<double>(frames - 1) / seconds : 0; }
+    double rate() const { return seconds > 0 ? static_cast<double>(steps) / seconds : 0; }
 };
 
 FrameSummary summarize(const frames::RecordingFile& file);

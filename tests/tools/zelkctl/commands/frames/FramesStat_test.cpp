@@ -3,7 +3,9 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <string>
+#include <vector>
 
 #include "tests/tools/zelkctl/commands/frames/RecordingToLookInto.h"
 #include "tools/zelkctl/files/FrameSummary.h"
@@ -106,6 +108,29 @@ TEST_F(FramesStat, KnowsWhereTwoRecordingsMeet) {
               stat.output.find("lost        0 in 1 gaps\n"
                                "  before frame 2, offset 688: the numbers go back\n"))
             << stat.output;
+}
+
+TEST_F(FramesStat, CountsNoTimeThatGoesBack) {
+    const struct {
+        std::vector<uint32_t> numbers;
+        const char* duration;
+        const char* json;
+    } rows[] = {
+            {{5, 6, 7, 0, 1},
+             "duration    0.012 s, 250.0 frames/s\n",
+             "\"seconds\":0.012,\"rate\":250.0"},
+            {{9, 0}, "duration    0.000 s, 0.0 frames/s\n", "\"seconds\":0.0,\"rate\":0.0"},
+            {{4, 0, 1},
+             "duration    0.004 s, 250.0 frames/s\n",
+             "\"seconds\":0.004,\"rate\":250.0"},
+    };
+    for (const auto& row : rows) {
+        const std::string path = recordings.write("back", recordings.frames(row.numbers));
+        const std::string text = framesCommand({"stat", path}).output;
+        EXPECT_NE(std::string::npos, text.find(row.duration)) << text;
+        const std::string json = framesCommand({"stat", "--json", path}).output;
+        EXPECT_NE(std::string::npos, json.find(row.json)) << json;
+    }
 }
 
 TEST_F(FramesStat, TellsOfAnEmptyRecording) {
