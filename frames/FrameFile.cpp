@@ -17,6 +17,8 @@
 #include <thread>
 #include <utility>
 
+#include "frames/OwnDescriptor.h"
+
 namespace pemaro::frames {
 namespace {
 
@@ -57,9 +59,11 @@ bool FrameFile::open(const std::string& path, std::function<bool()> giveUp) {
     mPath = mName = path;
     mGiveUp = std::move(giveUp);
     struct stat info {};
-    if (path == "-") {
-        mName = "the standard output";
-        mFd.reset(::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 0));
+    const int descriptor = path == "-" ? STDOUT_FILENO : ownDescriptor(path);
+    if (descriptor >= 0) {
+        mName = path == "-" ? "the standard output" : path;
+        mIsCallers = true;
+        mFd.reset(::fcntl(descriptor, F_DUPFD_CLOEXEC, 0));
     } else if (::stat(path.c_str(), &info) == 0) {
         if (S_ISFIFO(info.st_mode)) {
             return openFifo(path);
@@ -101,9 +105,9 @@ bool FrameFile::write(const void* frame, size_t length) {
     return false;
 }
 
-/// What a file held before gives way. The standard output is the caller's, who may be adding to it.
+/// What a file held before gives way. A descriptor is the caller's, who may be adding to its file.
 bool FrameFile::begin() {
-    if (!mHasBegun && mIsFile && mPath != "-" && ::ftruncate(mFd.get(), 0) != 0) {
+    if (!mHasBegun && mIsFile && !mIsCallers && ::ftruncate(mFd.get(), 0) != 0) {
         return fail("write");
     }
     mHasBegun = true;

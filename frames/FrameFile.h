@@ -20,9 +20,10 @@ enum class Appended {
 /// file stays readable frame by frame; errno tells why.
 Appended appendFrame(int fd, const void* frame, size_t length);
 
-/// Raw frames, one after another, in a file, or to what is no file: the standard output, which is
-/// called "-", a pipe, a device. It never keeps a part of a frame in a file, and touches one that is
-/// there no sooner than there is something to write. One thread at a time.
+/// Raw frames, one after another, in a file, or to what is no file: a pipe, a device. The standard
+/// output is called "-"; it, and what a path such as /dev/fd/3 names, is added to. It never keeps a
+/// part of a frame in a file, and touches one that is there no sooner than there is something to
+/// write. One thread at a time.
 class FrameFile {
   public:
     ~FrameFile();
@@ -60,6 +61,7 @@ class FrameFile {
     android::base::unique_fd mFd;
     std::function<bool()> mGiveUp;
     bool mIsFile = false;
+    bool mIsCallers = false;  ///< a descriptor that was there before
     bool mIsCreated = false;
     bool mHasBegun = false;
     std::atomic<bool> mWithinFrame{false};

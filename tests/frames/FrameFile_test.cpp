@@ -42,6 +42,23 @@ TEST_F(FrameFileTest, KeepsFramesOneAfterAnother) {
     EXPECT_EQ("onefour", contents(path));
 }
 
+TEST_F(FrameFileTest, AddsToWhatADescriptorLeadsTo) {
+    std::ofstream(path) << "old ";
+    const int fd = ::open(path.c_str(), O_WRONLY | O_APPEND);
+    ASSERT_TRUE(file.open("/proc/self/fd/" + std::to_string(fd)));
+    EXPECT_TRUE(file.write("new", 3));
+    EXPECT_TRUE(file.close());
+    EXPECT_EQ("old new", contents(path));
+    EXPECT_EQ(4, ::write(fd, " end", 4));
+    EXPECT_EQ("old new end", contents(path));
+    ::close(fd);
+
+    FrameFile closed;
+    EXPECT_FALSE(closed.open("/proc/self/fd/" + std::to_string(fd)));
+    EXPECT_EQ("cannot open /proc/self/fd/" + std::to_string(fd) + ": Bad file descriptor",
+              closed.problem());
+}
+
 TEST_F(FrameFileTest, TellsWhyItCannotBeOpened) {
     EXPECT_FALSE(file.open("/no/such/folder/file"));
     EXPECT_EQ("cannot open /no/such/folder/file: No such file or directory", file.problem());

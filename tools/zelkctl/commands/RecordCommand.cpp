@@ -198,7 +198,7 @@ class Recorder {
 };
 
 int record(const RecordOptions& options) {
-    if (options.output == kStandardOutput) {
+    if (isStandardOutput(options.output)) {
         giveOutputToData();
     }
     return Recorder(options).run();

@@ -296,7 +296,7 @@ class Trace {
 };
 
 int trace(const TraceOptions& options) {
-    if (options.output == kStandardOutput) {
+    if (isStandardOutput(options.output)) {
         giveOutputToData();
     }
     const int exitStatus = startBinder();

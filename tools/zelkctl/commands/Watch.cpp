@@ -201,7 +201,7 @@ void addWatchCommand(CLI::App& app, Action& action, const char* name, const char
 }
 
 int watch(const WatchOptions& options, const MakeWatched& make) {
-    if (options.output == kStandardOutput) {
+    if (isStandardOutput(options.output)) {
         giveOutputToData();
     }
     int result = startBinder();

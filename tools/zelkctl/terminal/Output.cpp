@@ -5,6 +5,7 @@
 
 #include <atomic>
 
+#include "frames/OwnDescriptor.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/terminal/Settings.h"
 #include "tools/zelkctl/terminal/Supervisor.h"
@@ -15,6 +16,10 @@ namespace {
 std::atomic<bool> gDataOnOutput{false};
 
 }  // namespace
+
+bool isStandardOutput(const std::string& path) {
+    return path == kStandardOutput || frames::ownDescriptor(path) == STDOUT_FILENO;
+}
 
 void giveOutputToData() {
     gDataOnOutput = true;

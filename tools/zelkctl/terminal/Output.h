@@ -12,6 +12,10 @@ namespace pemaro::zelkctl {
 /// The name that stands for the standard output where a file is due.
 constexpr const char* kStandardOutput = "-";
 
+/// Whether a file to write is the standard output, by this name or by that of its descriptor, as
+/// /dev/stdout is.
+bool isStandardOutput(const std::string& path);
+
 /// From now on the standard output carries data, and words go to the standard error.
 void giveOutputToData();
 
