@@ -62,6 +62,8 @@ class RecordingFile {
 
     const std::string& path() const { return mPath; }
     uint64_t size() const { return mSize; }
+    /// That of the open file, for whoever must not write to the same.
+    int descriptor() const { return mFd.get(); }
 
     /// The whole file, from its beginning to its end.
     const std::vector<Part>& parts() const { return mParts; }

@@ -11,6 +11,7 @@
 #include <cstring>
 #include <utility>
 
+#include "frames/OwnDescriptor.h"
 #include "tools/common/StandardOutput.h"
 #include "tools/zelkctl/terminal/Output.h"
 #include "tools/zelkctl/terminal/Supervisor.h"
@@ -20,54 +21,106 @@ namespace {
 
 constexpr size_t kHoldBack = 1 << 16;
 
+/// Whether a plain write to the file may work although that next to it failed with this errno.
+bool isFolders(int error) {
+    return error == EACCES || error == EPERM || error == EROFS;
+}
+
+bool isSameFile(const struct stat& output, int input) {
+    struct stat info {};
+    return S_ISREG(output.st_mode) && input >= 0 && fstat(input, &info) == 0 &&
+           info.st_dev == output.st_dev && info.st_ino == output.st_ino;
+}
+
+/// Gives a file the owner of another one.
+bool adopt(int fd, const struct stat& old) {
+    struct stat info {};
+    return fstat(fd, &info) == 0 && ((info.st_uid == old.st_uid && info.st_gid == old.st_gid) ||
+                                     fchown(fd, old.st_uid, old.st_gid) == 0);
+}
+
 }  // namespace
 
 OutputFile::~OutputFile() {
-    if (!mDraft.empty()) {
-        unlink(mDraft.c_str());
-    }
+    dropDraft();
 }
 
-bool OutputFile::open(const std::string& path) {
+bool OutputFile::open(const std::string& path, int input) {
     mPath = path;
-    mIsStandardOutput = path == kStandardOutput;
-    if (mIsStandardOutput) {
-        return true;
-    }
+    mIsStandardOutput = isStandardOutput(path);
+    const int descriptor = mIsStandardOutput ? STDOUT_FILENO : frames::ownDescriptor(path);
     struct stat info {};
-    if (stat(path.c_str(), &info) == 0) {
-        if (!S_ISREG(info.st_mode)) {
-            return openInPlace();
-        }
-        // A file that must not be written must not be replaced either.
-        if (access(path.c_str(), W_OK) != 0) {
-            return fail(STATUS_ERROR_OPENING_FILE);
-        }
-        mMode = info.st_mode & 07777;
-    } else if (lstat(path.c_str(), &info) == 0) {
+    const bool isThere =
+            (descriptor >= 0 ? fstat(descriptor, &info) : stat(path.c_str(), &info)) == 0;
+    if (isThere && isSameFile(info, input)) {
+        mResult = {STATUS_ERROR_WRITING_TO_FILE,
+                   (mIsStandardOutput ? "cannot write the standard output" : path) +
+                           std::string(": it is the file that is read")};
+        return false;
+    }
+    if (descriptor >= 0) {
+        return mIsStandardOutput || openDescriptor(descriptor);
+    }
+    if (isThere && !S_ISREG(info.st_mode)) {
+        return openInPlace(false);
+    }
+    // A file that must not be written must not be replaced either.
+    if (isThere && access(path.c_str(), W_OK) != 0) {
+        return fail(STATUS_ERROR_OPENING_FILE);
+    }
+    if (isThere) {
+        return openDraft(&info);
+    }
+    if (lstat(path.c_str(), &info) == 0) {
         mResult = {STATUS_ERROR_OPENING_FILE, path + ": it is a link to nothing"};
         return false;
     }
-    return openDraft();
+    return openDraft(nullptr);
 }
 
-bool OutputFile::openInPlace() {
-    const Waiting waiting("while waiting for a reader of " + mPath);
-    mFd.reset(::open(mPath.c_str(), O_WRONLY | O_CLOEXEC));
+/// What the caller opened has its place in the file, or is at its end.
+bool OutputFile::openDescriptor(int descriptor) {
+    mFd.reset(fcntl(descriptor, F_DUPFD_CLOEXEC, 0));
     return mFd.ok() || fail(STATUS_ERROR_OPENING_FILE);
 }
 
-bool OutputFile::openDraft() {
+bool OutputFile::openInPlace(bool isRegular) {
+    const Waiting waiting("while waiting for a reader of " + mPath);
+    mFd.reset(::open(mPath.c_str(), O_WRONLY | O_CLOEXEC));
+    mMustEmpty = isRegular;
+    return mFd.ok() || fail(STATUS_ERROR_OPENING_FILE);
+}
+
+/// `old` is what is there, or null.
+bool OutputFile::openDraft(const struct stat* old) {
     if (!android::base::Realpath(mPath, &mTarget)) {
         mTarget = mPath;
     }
+    // Who may not read the old one may not read the new one before it is complete either.
+    const mode_t mode = old == nullptr ? 0644 : 0600;
     const std::string draft = fmt::format("{}.{}.new", mTarget, getpid());
-    mFd.reset(::open(draft.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0644));
+    mFd.reset(::open(draft.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode));
     if (!mFd.ok()) {
-        return fail(STATUS_ERROR_OPENING_FILE);
+        return old != nullptr && isFolders(errno) ? openInPlace(true)
+                                                  : fail(STATUS_ERROR_OPENING_FILE);
     }
     mDraft = draft;
+    if (old == nullptr) {
+        return true;
+    }
+    mMode = old->st_mode & 07777;
+    if (!adopt(mFd.get(), *old)) {
+        dropDraft();
+        return openInPlace(true);
+    }
     return true;
+}
+
+void OutputFile::dropDraft() {
+    if (!mDraft.empty()) {
+        unlink(mDraft.c_str());
+        mDraft.clear();
+    }
 }
 
 bool OutputFile::write(const std::string& bytes) {
@@ -88,15 +141,24 @@ bool OutputFile::flush() {
         }
         return mResult.isGood();
     }
-    return android::base::WriteFully(mFd, held.data(), held.size()) ||
-           fail(STATUS_ERROR_WRITING_TO_FILE);
+    return begin() && (android::base::WriteFully(mFd, held.data(), held.size()) ||
+                       fail(STATUS_ERROR_WRITING_TO_FILE));
+}
+
+/// What a file held that is written in place gives way as late as that.
+bool OutputFile::begin() {
+    if (mMustEmpty && ftruncate(mFd.get(), 0) != 0) {
+        return fail(STATUS_ERROR_WRITING_TO_FILE);
+    }
+    mMustEmpty = false;
+    return true;
 }
 
 bool OutputFile::close() {
     if (!flush() || mIsStandardOutput) {
         return mResult.isGood();
     }
-    return (mDraft.empty() || replace()) &&
+    return begin() && (mDraft.empty() || replace()) &&
            (::close(mFd.release()) == 0 || fail(STATUS_ERROR_WRITING_TO_FILE));
 }
 
@@ -104,10 +166,35 @@ bool OutputFile::replace() {
     // Who may read the old one may read the new one, and nobody else. What is to be lost is replaced
     // by what is on the disk; where nothing is lost, that can wait.
     const bool isReady = !mMode || (fchmod(mFd.get(), *mMode) == 0 && fsync(mFd.get()) == 0);
-    if (!isReady || rename(mDraft.c_str(), mTarget.c_str()) != 0) {
+    if (isReady && rename(mDraft.c_str(), mTarget.c_str()) == 0) {
+        mDraft.clear();
+        return true;
+    }
+    // It is mounted, or its folder gives nothing up.
+    if (isReady && mMode && (errno == EBUSY || isFolders(errno))) {
+        return copyDraft();
+    }
+    return fail(STATUS_ERROR_WRITING_TO_FILE);
+}
+
+bool OutputFile::copyDraft() {
+    const android::base::unique_fd draft = std::move(mFd);
+    if (!openInPlace(true) || !begin()) {
+        return false;
+    }
+    std::string bytes(kHoldBack, '\0');
+    off_t offset = 0;
+    ssize_t got = 0;
+    while ((got = TEMP_FAILURE_RETRY(pread(draft, &bytes[0], bytes.size(), offset))) > 0) {
+        if (!android::base::WriteFully(mFd, bytes.data(), static_cast<size_t>(got))) {
+            return fail(STATUS_ERROR_WRITING_TO_FILE);
+        }
+        offset += got;
+    }
+    if (got < 0) {
         return fail(STATUS_ERROR_WRITING_TO_FILE);
     }
-    mDraft.clear();
+    dropDraft();
     return true;
 }
 

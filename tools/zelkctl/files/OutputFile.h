@@ -2,6 +2,7 @@
 #pragma once
 
 #include <android-base/unique_fd.h>
+#include <sys/stat.h>
 #include <sys/types.h>
 
 #include <optional>
@@ -13,24 +14,32 @@ namespace pemaro::zelkctl {
 
 /// Where a command writes a whole that it makes: a file, or the standard output, which is called "-".
 ///
-/// A file is written beside the one that is there and takes its place in close(), so that the old
-/// one stays what it was until the new one is complete. What a link leads to is replaced and not
-/// the link; what is no file, a device or a FIFO, is written to. What grows record by record
-/// instead, and is worth having at any time, is a frames::FrameFile.
+/// A file is written beside the one that is there and takes its place in close(), with its owner and
+/// its permissions, so that the old one stays what it was until the new one is complete. What a link
+/// leads to is replaced and not the link; what is no file, a device or a FIFO, is written to, and what
+/// a descriptor leads to, such as /dev/fd/3, is added to.
+///
+/// Where nothing can be written beside a file, or nothing can take its place, for its folder is not
+/// to be written, it is mounted, or its owner is another one, it is written to as well. It stays what
+/// it was until there is something to write, but then what was there is gone at once: a failure, or a
+/// signal, leaves a part of the new one, and whoever reads it meanwhile sees a part.
+///
+/// What grows record by record instead, and is worth having at any time, is a frames::FrameFile.
 class OutputFile {
   public:
     /// Takes back a file that was not closed.
     ~OutputFile();
 
-    /// False, with the reason in problem(), when nothing can be written there. Waits for the reader
-    /// of a FIFO.
-    bool open(const std::string& path);
+    /// False, with the reason in problem(), when nothing can be written there, or when that is the
+    /// file which the descriptor `input` reads, from which the bytes come. Waits for the reader of a
+    /// FIFO.
+    bool open(const std::string& path, int input = -1);
 
     /// Adds to it. False after the first failure, and then nothing is written any more.
     bool write(const std::string& bytes);
 
     /// Writes what is still held back and puts the file in its place; false when something did not
-    /// reach it, and then what was there is there still.
+    /// reach it, and then what was there is there still, unless it had to be written to.
     bool close();
 
     /// The first failure.
@@ -39,10 +48,14 @@ class OutputFile {
     std::string problem() const;
 
   private:
-    bool openInPlace();
-    bool openDraft();
+    bool openDescriptor(int descriptor);
+    bool openInPlace(bool isRegular);
+    bool openDraft(const struct stat* old);
+    bool begin();
     bool flush();
     bool replace();
+    bool copyDraft();
+    void dropDraft();
     bool fail(int status);
 
     std::string mPath;
@@ -53,6 +66,8 @@ class OutputFile {
     android::base::unique_fd mFd;
     /// The permissions of the file that is there.
     std::optional<mode_t> mMode;
+    /// What a file holds that is written in place is still to give way.
+    bool mMustEmpty = false;
     bool mIsStandardOutput = false;
 };
 

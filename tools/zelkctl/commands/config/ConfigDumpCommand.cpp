@@ -29,7 +29,7 @@ int readBinary(ITouchCompanionFacade& facade, std::string& bytes) {
 }
 
 int dump(const std::string& path) {
-    if (path == kStandardOutput) {
+    if (isStandardOutput(path)) {
         giveOutputToData();
     }
     return withFacade([&](ITouchCompanionFacade& facade) {
@@ -43,7 +43,7 @@ int dump(const std::string& path) {
             return fail("config dump", file.result());
         }
         sayResult(fmt::format("configuration of {} bytes written to {}", bytes.size(),
-                              path == kStandardOutput ? "the standard output" : path),
+                              isStandardOutput(path) ? "the standard output" : path),
                   JsonObject().add("bytes", static_cast<int64_t>(bytes.size())).add("path", path));
         return tools::kExitSuccess;
     });
@@ -56,8 +56,8 @@ void addConfigDumpCommand(CLI::App& config, Action& action) {
     Command(config, action, "dump", "Write the binary configuration to a file")
             .operand("FILE", *path, "The file; - is the standard output")
             .details(
-                    "A file is replaced once all of it is there; a device, a FIFO, or what a link "
-                    "leads to is written to.")
+                    "A file is replaced once all of it is there, where its folder allows that; a "
+                    "device, a FIFO, or what a link leads to is written to.")
             .runs([path] { return dump(*path); });
 }
 

@@ -45,7 +45,7 @@ struct ExportOptions {
 /// command is asked to stop.
 void forEachFrame(const RecordingFile& file, const ExportOptions& options,
                   const std::function<bool(uint64_t, const FrameContent&)>& body) {
-    const bool showsData = options.output == kStandardOutput && isatty(STDOUT_FILENO) != 0;
+    const bool showsData = isStandardOutput(options.output) && isatty(STDOUT_FILENO) != 0;
     ProgressLine progress("exporting", "frames", !showsData);
     uint64_t number = 0;
     for (const RecordingFile::Part& part : file.parts()) {
@@ -83,7 +83,8 @@ int exportPictures(const RecordingFile& file, const ExportOptions& options) {
             return true;
         }
         OutputFile output;
-        if (!output.open(fmt::format("{}/frame-{:06}.png", options.output, number)) ||
+        if (!output.open(fmt::format("{}/frame-{:06}.png", options.output, number),
+                         file.descriptor()) ||
             !output.write(png) || !output.close()) {
             problem = output.problem();
             return false;
@@ -108,7 +109,7 @@ int exportPictures(const RecordingFile& file, const ExportOptions& options) {
 
 int exportText(const RecordingFile& file, const ExportOptions& options) {
     OutputFile output;
-    if (!output.open(options.output)) {
+    if (!output.open(options.output, file.descriptor())) {
         return fail(printable(output.problem()));
     }
     const auto text = options.format == "csv"     ? fingersCsv
@@ -135,7 +136,7 @@ int exportText(const RecordingFile& file, const ExportOptions& options) {
         return fail(printable(output.problem()));
     }
     // What was asked for on the standard output stands there alone.
-    if (options.output != kStandardOutput) {
+    if (!isStandardOutput(options.output)) {
         sayResult(fmt::format("{} frames in {}", written, printable(options.output)),
                   JsonObject().add("frames", written).add("file", options.output));
     }

@@ -26,11 +26,11 @@ int makeReport(const ReportOptions& options) {
     if (file == nullptr) {
         return exitStatus;
     }
-    if (options.output == kStandardOutput) {
+    if (isStandardOutput(options.output)) {
         giveOutputToData();
     }
     OutputFile output;
-    if (!output.open(options.output)) {
+    if (!output.open(options.output, file->descriptor())) {
         return fail(printable(output.problem()));
     }
     const FrameSummary summary = summarize(*file);

@@ -3,6 +3,8 @@
 
 #include <gtest/gtest.h>
 #include <png.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <string>
@@ -171,6 +173,62 @@ TEST_F(FramesExport, WritesToAFile) {
     EXPECT_EQ(5u, splitLines(recordings.read("fingers.csv")).size());
     // Data on the standard output stands there alone.
     EXPECT_EQ(15u, lines("csv", {"--output", "-", "--json"}).size());
+}
+
+TEST_F(FramesExport, DoesNotWriteToTheRecording) {
+    const std::string before = recordings.read("frames");
+    ASSERT_EQ(0, symlink(path.c_str(), recordings.path("link").c_str()));
+    ASSERT_EQ(0, mkdir(recordings.path("folder").c_str(), 0700));
+    ASSERT_EQ(0, link(path.c_str(), recordings.path("folder/frame-000002.png").c_str()));
+    const struct {
+        std::vector<std::string> words;
+        std::string output;
+    } rows[] = {
+            {{"export", path, "-f", "csv", "-o", path}, path},
+            {{"export", path, "-f", "json", "-o", recordings.path("link")},
+             recordings.path("link")},
+            {{"export", recordings.path("link"), "-f", "cells", "-o", path}, path},
+            {{"export", path, "-f", "png", "-o", recordings.path("folder"), "--first", "2"},
+             recordings.path("folder/frame-000002.png")},
+            {{"report", path, "-o", recordings.path("link")}, recordings.path("link")},
+    };
+    for (const auto& row : rows) {
+        const RunResult result = framesCommand(row.words);
+        EXPECT_EQ(1, result.status);
+        EXPECT_EQ("", result.output);
+        EXPECT_EQ("zelkctl: cannot write " + row.output + ": it is the file that is read\n",
+                  result.errors);
+        EXPECT_EQ(before, recordings.read("frames"));
+    }
+    const RunResult appended = run({"bash", "-c", R"("$0" frames export "$1" -f csv >>"$1")",
+                                    ZELK_BIN_DIR "/zelkctl", path});
+    EXPECT_EQ(1, appended.status);
+    EXPECT_EQ("zelkctl: cannot write the standard output: it is the file that is read\n",
+              appended.errors);
+    EXPECT_EQ(before, recordings.read("frames"));
+}
+
+TEST_F(FramesExport, AddsToTheStandardOutputByItsDescriptor) {
+    const std::string file = recordings.path("fingers.csv");
+    for (const char* output : {"/dev/stdout", "/dev/fd/1", "/proc/self/fd/1", "/dev/fd/3"}) {
+        recordings.write("fingers.csv", "before\n");
+        const RunResult result = run(
+                {"bash", "-c",
+                 R"({ "$0" frames export "$1" -f csv --last 0 -o "$2" 3>&1; echo after; } >>"$3")",
+                 ZELK_BIN_DIR "/zelkctl", path, output, file});
+        EXPECT_EQ("", result.errors) << output;
+        const std::vector<std::string> lines = splitLines(recordings.read("fingers.csv"));
+        // What was exported is said where that is not the standard output by name.
+        ASSERT_EQ(output == std::string("/dev/fd/3") ? 6u : 5u, lines.size()) << output;
+        EXPECT_EQ("before", lines[0]);
+        EXPECT_EQ("frame,sequence,time_ns,finger,x,y,peak", lines[1]);
+        EXPECT_EQ("after", lines.back());
+    }
+    const RunResult page =
+            run({"bash", "-c", R"({ echo before; "$0" frames report "$1" -o /dev/stdout; } >"$2")",
+                 ZELK_BIN_DIR "/zelkctl", path, file});
+    EXPECT_EQ("7 frames in /dev/stdout\n", page.errors);
+    EXPECT_EQ(0u, recordings.read("fingers.csv").find("before\n<!DOCTYPE html>"));
 }
 
 TEST_F(FramesExport, TellsWhatItCannotWrite) {
