@@ -6,6 +6,7 @@
 #include <fcntl.h>
 #include <limits.h>
 #include <poll.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -74,7 +75,32 @@ bool FrameFile::open(const std::string& path, std::function<bool()> giveUp) {
         mIsCreated = mFd.ok();
     }
     mIsFile = mFd.ok() && ::fstat(mFd.get(), &info) == 0 && S_ISREG(info.st_mode);
-    return mFd.ok() || fail("open");
+    if (!mFd.ok()) {
+        return fail("open");
+    }
+    return !mIsFile || mIsCallers || lock();
+}
+
+/// Two at once would write over each other's frames.
+bool FrameFile::lock() {
+    // Where a file system knows no locks, nobody is kept away.
+    if (TEMP_FAILURE_RETRY(::flock(mFd.get(), LOCK_EX | LOCK_NB)) != 0 && errno == EWOULDBLOCK) {
+        mFd.reset();
+        mProblem = "cannot open " + mName + ": somebody else is writing to it";
+        return false;
+    }
+    struct stat locked {};
+    struct stat there {};
+    // Whoever had created it, and then had nothing to write to it, has taken it away meanwhile.
+    const bool isThere = ::fstat(mFd.get(), &locked) == 0 && ::stat(mPath.c_str(), &there) == 0 &&
+                         locked.st_dev == there.st_dev && locked.st_ino == there.st_ino;
+    if (!isThere) {
+        mIsCreated = false;
+        return open(mPath, std::move(mGiveUp));
+    }
+    // Somebody else may have written to it before it was locked.
+    mIsCreated = mIsCreated && locked.st_size == 0;
+    return true;
 }
 
 bool FrameFile::openFifo(const std::string& path) {

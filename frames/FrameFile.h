@@ -30,7 +30,8 @@ class FrameFile {
 
     /// Opens what is called `path`, through links, and creates it when it is not there; waits for
     /// the reader of a FIFO. False, with the reason in problem(), when it cannot, or when `giveUp`
-    /// returns true; that is asked as well while whoever reads what is no file takes nothing.
+    /// returns true; that is asked as well while whoever reads what is no file takes nothing. A file
+    /// that another FrameFile has open, in any process, is refused.
     bool open(const std::string& path, std::function<bool()> giveUp = nullptr);
 
     /// Adds a frame; the first takes the place of what the file held. False after the first
@@ -49,6 +50,7 @@ class FrameFile {
 
   private:
     bool openFifo(const std::string& path);
+    bool lock();
     bool begin();
     Appended appendToStream(const void* frame, size_t length);
     bool awaitRoom() const;

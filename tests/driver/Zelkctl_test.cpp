@@ -125,6 +125,38 @@ TEST(Zelkctl, FindsAnUnwritableOutputBeforeItRecords) {
     EXPECT_EQ(std::string::npos, touchStack.process().output().find(" records"));
 }
 
+TEST(Zelkctl, RefusesAFileThatIsBeingRecordedTo) {
+    Files folder;
+    TouchStack touchStack({"--rate", "200"});
+    const std::string path = folder.path("frames");
+    ChildProcess record({binary("zelkctl"), "record", "--output", path});
+    ASSERT_TRUE(record.awaitOutput(" frames/s "));
+    const RunResult second = zelkctl({"record", "--frames", "5", "--output", path});
+    EXPECT_EQ(1, second.status);
+    EXPECT_EQ("", second.output);
+    EXPECT_EQ("zelkctl: cannot open " + path + ": somebody else is writing to it\n", second.errors);
+    record.signal(SIGINT);
+    EXPECT_EQ(0, record.wait());
+    EXPECT_THAT(lastLine(record.output()),
+                MatchesRegex("recorded " + std::to_string(countFrames(path)) + " frames, .*"));
+    EXPECT_EQ(0, zelkctl({"record", "--frames", "5", "--output", path}).status);
+    EXPECT_EQ(5, countFrames(path));
+}
+
+TEST(Zelkctl, AddsARecordingToWhatItsDescriptorLeadsTo) {
+    Files folder;
+    TouchStack touchStack({"--rate", "200"});
+    const std::string path = folder.path("frames");
+    for (const char* output : {"/dev/stdout", "/dev/fd/1", "-"}) {
+        const RunResult both = run(
+                {"bash", "-c", R"({ "$0" record -n 5 -o "$1" && "$0" record -n 7 -o "$1"; } >"$2")",
+                 binary("zelkctl"), output, path});
+        EXPECT_EQ(0, both.status) << output;
+        EXPECT_THAT(both.errors, HasSubstr("recorded 7 frames, "));
+        EXPECT_EQ(12, countFrames(path)) << output;
+    }
+}
+
 TEST(Zelkctl, StopsTheRecordingWhenTheDiskIsFull) {
     TinyDisk folder;
     TouchStack touchStack({"--rate", "0", "--frame-bytes", "5000"});

@@ -7,10 +7,12 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <atomic>
 #include <csignal>
 #include <fstream>
 #include <iterator>
 #include <string>
+#include <thread>
 #include <vector>
 
 namespace pemaro::frames {
@@ -87,6 +89,60 @@ TEST_F(FrameFileTest, LeavesNoFileWhenThereWasNothingToWrite) {
     ASSERT_TRUE(file.open(path));
     EXPECT_TRUE(file.close());
     EXPECT_EQ(0, access(path.c_str(), F_OK));
+}
+
+TEST_F(FrameFileTest, HasAFileForItself) {
+    const std::string link = path + ".link";
+    ASSERT_EQ(0, symlink(path.c_str(), link.c_str()));
+    for (const bool isThere : {false, true}) {
+        if (isThere) {
+            std::ofstream(path) << "old";
+        }
+        {
+            FrameFile first;
+            ASSERT_TRUE(first.open(path));
+            for (const std::string& name : {path, link}) {
+                FrameFile second;
+                EXPECT_FALSE(second.open(name));
+                EXPECT_EQ("cannot open " + name + ": somebody else is writing to it",
+                          second.problem());
+                EXPECT_FALSE(second.write("two", 3));
+                EXPECT_FALSE(second.close());
+            }
+            EXPECT_TRUE(first.write("one", 3));
+            EXPECT_TRUE(first.close());
+        }
+        EXPECT_EQ("one", contents(path));
+        unlink(path.c_str());
+    }
+    unlink(link.c_str());
+
+    // Devices are everybody's.
+    FrameFile one;
+    FrameFile another;
+    EXPECT_TRUE(one.open("/dev/null"));
+    EXPECT_TRUE(another.open("/dev/null"));
+}
+
+TEST_F(FrameFileTest, IsNeverTheOneThatSomebodyElseTakesAwayAgain) {
+    std::atomic<bool> mustEnd{false};
+    std::thread other([&] {
+        while (!mustEnd) {
+            FrameFile nothing;
+            static_cast<void>(nothing.open(path));
+        }
+    });
+    for (int i = 0; i < 1000; ++i) {
+        FrameFile mine;
+        if (mine.open(path)) {
+            EXPECT_TRUE(mine.write("mine", 4));
+            EXPECT_TRUE(mine.close());
+            EXPECT_EQ("mine", contents(path)) << i;
+            unlink(path.c_str());
+        }
+    }
+    mustEnd = true;
+    other.join();
 }
 
 TEST_F(FrameFileTest, FollowsALink) {
