@@ -807,6 +807,12 @@ class Inside {
     }
 
     void letGo() { mLetGo = true; }
+    std::thread letGoSoon() {
+        return std::thread([this] {
+            usleep(50000);
+            letGo();
+        });
+    }
     bool isInside() const { return mInside != 0; }
     bool wasAlone() const { return !mCrowded; }
     bool waitUntilDone() const {
@@ -854,10 +860,7 @@ TEST_F(TouchCompanionRecording, EndsForOthersWhenTheCallbackThatStoppedItReturns
     inside.client = client.get();
     mRing.put();
     ASSERT_TRUE(inside.waitUntilDone());
-    std::thread letting([&] {
-        usleep(50000);
-        inside.letGo();
-    });
+    std::thread letting = inside.letGoSoon();
     EXPECT_EQ(0, client->stopRecord());
     EXPECT_FALSE(inside.isInside());
     letting.join();
@@ -869,10 +872,7 @@ TEST_F(TouchCompanionRecording, IsDestroyedWhenTheCallbackThatStoppedItReturns) 
     inside.client = client.get();
     mRing.put();
     ASSERT_TRUE(inside.waitUntilDone());
-    std::thread letting([&] {
-        usleep(50000);
-        inside.letGo();
-    });
+    std::thread letting = inside.letGoSoon();
     client.clear();
     EXPECT_FALSE(inside.isInside());
     letting.join();
