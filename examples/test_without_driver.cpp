@@ -76,6 +76,8 @@ void testDeath() {
     service->die();
     expect(deaths == 1, "it is told of the death");
     expect(client->enableWakeup() == pemaro::STATUS_UNKNOWN_ERROR, "and nobody answers any more");
+    // In one process a client and its service would keep each other.
+    client->deinit();
 }
 
 }  // namespace

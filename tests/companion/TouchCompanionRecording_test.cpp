@@ -908,9 +908,10 @@ TEST_F(TouchCompanionRecording, DeliversOneFrameAtATimeAfterAStartInItsCallback)
     ASSERT_TRUE(inside.waitUntilDone());
     mRing.put();
     usleep(50000);
-    EXPECT_EQ(0u, mRing.cblk().read);
+    const auto taken = [&] { return TouchCompanionSharedCblk::acquireIndex(mRing.cblk().read); };
+    EXPECT_EQ(0u, taken());
     inside.letGo();
-    EXPECT_TRUE(Inside::waitFor([&] { return mRing.cblk().read == 2; }));
+    EXPECT_TRUE(Inside::waitFor([&] { return taken() == 2; }));
     EXPECT_TRUE(inside.wasAlone());
     EXPECT_EQ(0, client->stopRecord());
 }

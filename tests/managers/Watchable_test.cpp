@@ -95,6 +95,8 @@ TYPED_TEST(WatchableService, IsServedUntilItDies) {
     EXPECT_EQ(STATUS_NO_ERROR, this->mClient->enableWakeup());
     next->die();
     EXPECT_EQ(2, this->mTold.deaths);
+    // In one process both would keep each other.
+    EXPECT_EQ(STATUS_NO_ERROR, this->mClient->deinit());
 }
 
 TYPED_TEST(WatchableService, ForgetsWhoEndsItsWatch) {

@@ -64,18 +64,11 @@ class CommaLocale {
         fs::create_directories(folder / "comma");
         std::ofstream(folder / "comma" / "LC_NUMERIC").write(kNumeric, sizeof(kNumeric));
         setenv("LOCPATH", folder.c_str(), 1);
-        mLocale = newlocale(LC_NUMERIC_MASK, "comma", nullptr);
+        EXPECT_NE(nullptr, setlocale(LC_NUMERIC, "comma"));
         unsetenv("LOCPATH");
         fs::remove_all(folder);
-        uselocale(mLocale);
     }
-    ~CommaLocale() {
-        uselocale(LC_GLOBAL_LOCALE);
-        freelocale(mLocale);
-    }
-
-  private:
-    locale_t mLocale;
+    ~CommaLocale() { setlocale(LC_NUMERIC, "C"); }
 };
 
 // What peers send does not depend on where the user is, however many digits it has.
