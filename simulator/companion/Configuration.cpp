@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "simulator/companion/Configuration.h"
 
+#include <fcntl.h>
+
 #include <cstdio>
 #include <cstring>
 #include <memory>
@@ -61,8 +63,10 @@ uint32_t binaryChecksum(const std::string& binary) {
     return frames::crc32(copy.data(), copy.size());
 }
 
+/// Waits for nobody who may write to a FIFO: the service would wait as well.
 int readFile(const std::string& path, std::string* text) {
-    File file(fopen(path.c_str(), "re"));
+    const int fd = open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
+    File file(fd < 0 ? nullptr : fdopen(fd, "r"));
     if (file == nullptr) {
         return STATUS_ERROR_OPENING_FILE;
     }

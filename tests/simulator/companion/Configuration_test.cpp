@@ -2,6 +2,7 @@
 #include "simulator/companion/Configuration.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cstring>
@@ -115,6 +116,12 @@ TEST(Configuration, LoadsNothingFromABadFile) {
     EXPECT_EQ(STATUS_ERROR_OPENING_FILE, configuration.load("/no/such/file"));
     EXPECT_EQ(STATUS_ERROR_READING_FILE, configuration.load("/"));
     EXPECT_EQ(STATUS_DATA_EXCEEDS_BUFFER, configuration.load("/dev/zero"));
+
+    // One that nobody writes to holds nothing.
+    const std::string fifo = testing::TempDir() + "Configuration_test." + std::to_string(getpid());
+    ASSERT_EQ(0, mkfifo(fifo.c_str(), 0600));
+    EXPECT_EQ(STATUS_ERROR_PARSING_CONFIGURATION_SETTING, configuration.load(fifo));
+    unlink(fifo.c_str());
 }
 
 TEST(Configuration, TellsWhatKeepsItFromBeingSaved) {
