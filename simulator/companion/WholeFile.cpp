@@ -7,10 +7,9 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <atomic>
 #include <cerrno>
-#include <cstdio>
 
+#include "frames/Draft.h"
 #include "pemaro/Status.h"
 
 namespace pemaro::simulator {
@@ -29,17 +28,6 @@ int writeInPlace(const std::string& path, const std::string& bytes, int flags) {
     return close(file.release()) == 0 && written ? STATUS_NO_ERROR : STATUS_ERROR_WRITING_TO_FILE;
 }
 
-/// A file beside its place, under a name that no other has.
-unique_fd openDraft(const std::string& target, mode_t mode, std::string* draft) {
-    static std::atomic<unsigned int> last{0};
-    unique_fd file;
-    do {
-        *draft = target + "." + std::to_string(getpid()) + "." + std::to_string(++last) + ".new";
-        file.reset(open(draft->c_str(), kToWrite | O_CREAT | O_EXCL, mode));
-    } while (!file.ok() && errno == EEXIST);
-    return file;
-}
-
 }  // namespace
 
 int writeWholeFile(const std::string& path, const std::string& bytes) {
@@ -48,31 +36,18 @@ int writeWholeFile(const std::string& path, const std::string& bytes) {
     if (isThere && !S_ISREG(old.st_mode)) {
         return writeInPlace(path, bytes, 0);
     }
-    std::string target = path;
     // A file that must not be written must not be replaced either, nor a link to nothing.
-    if (isThere ? access(path.c_str(), W_OK) != 0 || !android::base::Realpath(path, &target)
-                : lstat(path.c_str(), &old) == 0) {
+    if (isThere ? access(path.c_str(), W_OK) != 0 : lstat(path.c_str(), &old) == 0) {
         return STATUS_ERROR_OPENING_FILE;
     }
-    std::string draft;
-    unique_fd file = openDraft(target, isThere ? 0600 : 0666, &draft);
-    if (!file.ok()) {
-        return STATUS_ERROR_OPENING_FILE;
-    }
-    if (isThere && fchown(file.get(), old.st_uid, old.st_gid) != 0) {
+    frames::Draft draft;
+    if (!draft.open(path, isThere ? &old : nullptr)) {
         // It is another's, who keeps it.
-        unlink(draft.c_str());
-        return writeInPlace(target, bytes, O_TRUNC);
+        return isThere && errno == EPERM ? writeInPlace(path, bytes, O_TRUNC)
+                                         : STATUS_ERROR_OPENING_FILE;
     }
-    // What is to be lost is replaced by what is on the disk; where nothing is lost, that can wait.
-    const bool written =
-            android::base::WriteStringToFd(bytes, file) &&
-            (!isThere || (fchmod(file.get(), old.st_mode & 07777) == 0 && fsync(file.get()) == 0));
-    if (close(file.release()) != 0 || !written || rename(draft.c_str(), target.c_str()) != 0) {
-        unlink(draft.c_str());
-        return STATUS_ERROR_WRITING_TO_FILE;
-    }
-    return STATUS_NO_ERROR;
+    const bool written = android::base::WriteStringToFd(bytes, draft.fd()) && draft.commit();
+    return written && draft.close() ? STATUS_NO_ERROR : STATUS_ERROR_WRITING_TO_FILE;
 }
 
 }  // namespace pemaro::simulator

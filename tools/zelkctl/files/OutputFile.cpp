@@ -32,18 +32,7 @@ bool isSameFile(const struct stat& output, int input) {
            info.st_dev == output.st_dev && info.st_ino == output.st_ino;
 }
 
-/// Gives a file the owner of another one.
-bool adopt(int fd, const struct stat& old) {
-    struct stat info {};
-    return fstat(fd, &info) == 0 && ((info.st_uid == old.st_uid && info.st_gid == old.st_gid) ||
-                                     fchown(fd, old.st_uid, old.st_gid) == 0);
-}
-
 }  // namespace
-
-OutputFile::~OutputFile() {
-    dropDraft();
-}
 
 bool OutputFile::open(const std::string& path, int input) {
     mPath = path;
@@ -93,34 +82,11 @@ bool OutputFile::openInPlace(bool isRegular) {
 
 /// `old` is what is there, or null.
 bool OutputFile::openDraft(const struct stat* old) {
-    if (!android::base::Realpath(mPath, &mTarget)) {
-        mTarget = mPath;
-    }
-    // Who may not read the old one may not read the new one before it is complete either.
-    const mode_t mode = old == nullptr ? 0644 : 0600;
-    const std::string draft = fmt::format("{}.{}.new", mTarget, getpid());
-    mFd.reset(::open(draft.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode));
-    if (!mFd.ok()) {
-        return old != nullptr && isFolders(errno) ? openInPlace(true)
-                                                  : fail(STATUS_ERROR_OPENING_FILE);
-    }
-    mDraft = draft;
-    if (old == nullptr) {
+    if (mDraft.open(mPath, old)) {
+        mIsNew = old == nullptr;
         return true;
     }
-    mMode = old->st_mode & 07777;
-    if (!adopt(mFd.get(), *old)) {
-        dropDraft();
-        return openInPlace(true);
-    }
-    return true;
-}
-
-void OutputFile::dropDraft() {
-    if (!mDraft.empty()) {
-        unlink(mDraft.c_str());
-        mDraft.clear();
-    }
+    return old != nullptr && isFolders(errno) ? openInPlace(true) : fail(STATUS_ERROR_OPENING_FILE);
 }
 
 bool OutputFile::write(const std::string& bytes) {
@@ -141,7 +107,7 @@ bool OutputFile::flush() {
         }
         return mResult.isGood();
     }
-    return begin() && (android::base::WriteFully(mFd, held.data(), held.size()) ||
+    return begin() && (android::base::WriteFully(file(), held.data(), held.size()) ||
                        fail(STATUS_ERROR_WRITING_TO_FILE));
 }
 
@@ -158,43 +124,40 @@ bool OutputFile::close() {
     if (!flush() || mIsStandardOutput) {
         return mResult.isGood();
     }
-    return begin() && (mDraft.empty() || replace()) &&
-           (::close(mFd.release()) == 0 || fail(STATUS_ERROR_WRITING_TO_FILE));
+    if (mDraft.fd().ok()) {
+        return replace();
+    }
+    return begin() && (::close(mFd.release()) == 0 || fail(STATUS_ERROR_WRITING_TO_FILE));
 }
 
 bool OutputFile::replace() {
-    // Who may read the old one may read the new one, and nobody else. What is to be lost is replaced
-    // by what is on the disk; where nothing is lost, that can wait.
-    const bool isReady = !mMode || (fchmod(mFd.get(), *mMode) == 0 && fsync(mFd.get()) == 0);
-    if (isReady && rename(mDraft.c_str(), mTarget.c_str()) == 0) {
-        mDraft.clear();
-        return true;
+    if (mDraft.commit()) {
+        return mDraft.close() || fail(STATUS_ERROR_WRITING_TO_FILE);
     }
     // It is mounted, or its folder gives nothing up.
-    if (isReady && mMode && (errno == EBUSY || isFolders(errno))) {
+    if (!mIsNew && (errno == EBUSY || isFolders(errno))) {
         return copyDraft();
     }
     return fail(STATUS_ERROR_WRITING_TO_FILE);
 }
 
 bool OutputFile::copyDraft() {
-    const android::base::unique_fd draft = std::move(mFd);
     if (!openInPlace(true) || !begin()) {
         return false;
     }
     std::string bytes(kHoldBack, '\0');
     off_t offset = 0;
     ssize_t got = 0;
-    while ((got = TEMP_FAILURE_RETRY(pread(draft, &bytes[0], bytes.size(), offset))) > 0) {
+    while ((got = TEMP_FAILURE_RETRY(pread(mDraft.fd(), &bytes[0], bytes.size(), offset))) > 0) {
         if (!android::base::WriteFully(mFd, bytes.data(), static_cast<size_t>(got))) {
             return fail(STATUS_ERROR_WRITING_TO_FILE);
         }
         offset += got;
     }
-    if (got < 0) {
+    if (got < 0 || ::close(mFd.release()) != 0) {
         return fail(STATUS_ERROR_WRITING_TO_FILE);
     }
-    dropDraft();
+    mDraft.drop();
     return true;
 }
 

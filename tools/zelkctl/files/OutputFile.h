@@ -3,20 +3,19 @@
 
 #include <android-base/unique_fd.h>
 #include <sys/stat.h>
-#include <sys/types.h>
 
-#include <optional>
 #include <string>
 
+#include "frames/Draft.h"
 #include "tools/zelkctl/files/FileResult.h"
 
 namespace pemaro::zelkctl {
 
 /// Where a command writes a whole that it makes: a file, or the standard output, which is called "-".
 ///
-/// A file is written beside the one that is there and takes its place in close(), with its owner and
-/// its permissions, so that the old one stays what it was until the new one is complete. What a link
-/// leads to is replaced and not the link; what is no file, a device or a FIFO, is written to, and what
+/// A file is written as a frames::Draft and takes its place in close(), with the owner and the
+/// permissions of the one that is there; one that is not closed is taken back. What a link leads to is
+/// replaced and not the link; what is no file, a device or a FIFO, is written to, and what
 /// a descriptor leads to, such as /dev/fd/3, is added to.
 ///
 /// Where nothing can be written beside a file, or nothing can take its place, for its folder is not
@@ -27,9 +26,6 @@ namespace pemaro::zelkctl {
 /// What grows record by record instead, and is worth having at any time, is a frames::FrameFile.
 class OutputFile {
   public:
-    /// Takes back a file that was not closed.
-    ~OutputFile();
-
     /// False, with the reason in problem(), when nothing can be written there, or when that is the
     /// file which the descriptor `input` reads, from which the bytes come. Waits for the reader of a
     /// FIFO.
@@ -55,17 +51,15 @@ class OutputFile {
     bool flush();
     bool replace();
     bool copyDraft();
-    void dropDraft();
+    const android::base::unique_fd& file() const { return mDraft.fd().ok() ? mDraft.fd() : mFd; }
     bool fail(int status);
 
     std::string mPath;
-    std::string mTarget;  ///< without links
-    std::string mDraft;   ///< empty for what is written in place
     std::string mHeld;
     FileResult mResult;
-    android::base::unique_fd mFd;
-    /// The permissions of the file that is there.
-    std::optional<mode_t> mMode;
+    frames::Draft mDraft;
+    bool mIsNew = false;           ///< what the draft becomes
+    android::base::unique_fd mFd;  ///< of what is written in place, or through a descriptor
     /// What a file holds that is written in place is still to give way.
     bool mMustEmpty = false;
     bool mIsStandardOutput = false;
