@@ -17,10 +17,8 @@ namespace {
 
 using android::base::unique_fd;
 
-constexpr int kToWrite = O_WRONLY | O_CLOEXEC;
-
 int writeInPlace(const std::string& path, const std::string& bytes, int flags) {
-    unique_fd file(open(path.c_str(), kToWrite | O_NONBLOCK | O_NOCTTY | flags));
+    unique_fd file(open(path.c_str(), O_WRONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY | flags));
     if (!file.ok()) {
         return STATUS_ERROR_OPENING_FILE;
     }

@@ -3,7 +3,6 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <stdlib.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/sysmacros.h>
@@ -11,12 +10,11 @@
 
 #include <csignal>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
 
 #include "pemaro/Status.h"
+#include "tests/support/FolderTest.h"
 
 namespace pemaro::simulator {
 
@@ -26,57 +24,35 @@ namespace fs = std::filesystem;
 
 constexpr uid_t kNobody = 65534;
 
-class WholeFile : public ::testing::Test {
+class WholeFile : public test::FolderTest {
   protected:
-    WholeFile() { EXPECT_NE(nullptr, mkdtemp(&folder[0])); }
-    ~WholeFile() override { fs::remove_all(folder); }
-
-    std::string path(const std::string& name) const { return folder + "/" + name; }
-
-    std::string make(const std::string& name, const std::string& content) const {
-        std::ofstream(path(name)) << content;
-        return path(name);
-    }
-
-    std::string contents(const std::string& name) const {
-        std::ifstream stream(path(name));
-        return {std::istreambuf_iterator<char>(stream), {}};
-    }
-
     static struct stat about(const std::string& file) {
         struct stat info {};
         EXPECT_EQ(0, lstat(file.c_str(), &info)) << file;
         return info;
     }
-
-    size_t files() const {
-        return static_cast<size_t>(
-                std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
-    }
-
-    std::string folder = testing::TempDir() + "WholeFile_test.XXXXXX";
 };
 
 }  // namespace
 
 TEST_F(WholeFile, HoldsTheBytesAndNothingElse) {
-    EXPECT_EQ(0, writeWholeFile(make("old", "old and longer"), "new"));
-    EXPECT_EQ("new", contents("old"));
+    EXPECT_EQ(0, writeWholeFile(write("old", "old and longer"), "new"));
+    EXPECT_EQ("new", contents(path("old")));
     const mode_t before = umask(027);
     EXPECT_EQ(0, writeWholeFile(path("fresh"), "new"));
     umask(before);
-    EXPECT_EQ("new", contents("fresh"));
+    EXPECT_EQ("new", contents(path("fresh")));
     EXPECT_EQ(0640u, about(path("fresh")).st_mode & 07777);
     EXPECT_EQ(2u, files());
 }
 
 TEST_F(WholeFile, IsWrittenWhereALinkLeads) {
-    const std::string file = make("file", "old");
+    const std::string file = write("file", "old");
     fs::create_symlink("file", path("link"));
     EXPECT_EQ(0, writeWholeFile(path("link"), "new"));
     EXPECT_TRUE(fs::is_symlink(path("link")));
     EXPECT_FALSE(fs::is_symlink(file));
-    EXPECT_EQ("new", contents("file"));
+    EXPECT_EQ("new", contents(path("file")));
 
     fs::create_symlink("nothing", path("dangling"));
     EXPECT_EQ(STATUS_ERROR_OPENING_FILE, writeWholeFile(path("dangling"), "new"));
@@ -87,13 +63,13 @@ TEST_F(WholeFile, IsWrittenWhereALinkLeads) {
 TEST_F(WholeFile, KeepsOwnerAndPermissions) {
     const bool isRoot = geteuid() == 0;
     for (const mode_t mode : {0600u, 0664u}) {
-        const std::string file = make("file", "old");
+        const std::string file = write("file", "old");
         ASSERT_EQ(0, chown(file.c_str(), isRoot ? kNobody : getuid(), isRoot ? 1 : getgid()));
         ASSERT_EQ(0, chmod(file.c_str(), mode));
         const struct stat before = about(file);
         EXPECT_EQ(0, writeWholeFile(file, "new"));
         const struct stat after = about(file);
-        EXPECT_EQ("new", contents("file"));
+        EXPECT_EQ("new", contents(path("file")));
         EXPECT_EQ(before.st_mode, after.st_mode);
         EXPECT_EQ(before.st_uid, after.st_uid);
         EXPECT_EQ(before.st_gid, after.st_gid);
@@ -106,12 +82,12 @@ TEST_F(WholeFile, StaysItsOwnersWhereOnlyRootCouldMakeItSo) {
     if (geteuid() != 0) {
         GTEST_SKIP() << "only root has two users";
     }
-    const std::string file = make("file", "old and longer");
+    const std::string file = write("file", "old and longer");
     ASSERT_EQ(0, chmod(file.c_str(), 0666));
     ASSERT_EQ(0, chmod(folder.c_str(), 0777));
     EXPECT_EXIT(_exit(setuid(kNobody) == 0 && writeWholeFile(file, "new") == 0 ? 0 : 1),
                 ::testing::ExitedWithCode(0), "");
-    EXPECT_EQ("new", contents("file"));
+    EXPECT_EQ("new", contents(path("file")));
     EXPECT_EQ(0u, about(file).st_uid);
     EXPECT_EQ(0666u, about(file).st_mode & 07777);
     ASSERT_EQ(0, chmod(file.c_str(), 0644));
@@ -120,31 +96,31 @@ TEST_F(WholeFile, StaysItsOwnersWhereOnlyRootCouldMakeItSo) {
                           ? 0
                           : 1),
             ::testing::ExitedWithCode(0), "");
-    EXPECT_EQ("new", contents("file"));
+    EXPECT_EQ("new", contents(path("file")));
     EXPECT_EQ(1u, files());
 }
 
 TEST_F(WholeFile, LeavesOthersFilesAlone) {
-    const std::string file = make("file", "old");
+    const std::string file = write("file", "old");
     // Those of another process that had the same number, which has ended, are among them.
     std::vector<std::string> others = {"file.new"};
     for (int i = 1; i <= 100; ++i) {
         others.push_back("file." + std::to_string(getpid()) + "." + std::to_string(i) + ".new");
     }
     for (const std::string& other : others) {
-        make(other, "precious");
+        write(other, "precious");
     }
     EXPECT_EQ(0, writeWholeFile(file, "new"));
-    EXPECT_EQ("new", contents("file"));
+    EXPECT_EQ("new", contents(path("file")));
     for (const std::string& other : others) {
-        EXPECT_EQ("precious", contents(other)) << other;
+        EXPECT_EQ("precious", contents(path(other))) << other;
     }
     EXPECT_EQ(others.size() + 1, files());
 }
 
 TEST_F(WholeFile, StaysWhatItWasWhereTheDiskIsFull) {
     // A limit on the size of files, as a full disk is one.
-    const std::string file = make("file", "precious");
+    const std::string file = write("file", "precious");
     signal(SIGXFSZ, SIG_IGN);
     rlimit before{};
     ASSERT_EQ(0, getrlimit(RLIMIT_FSIZE, &before));
@@ -153,7 +129,7 @@ TEST_F(WholeFile, StaysWhatItWasWhereTheDiskIsFull) {
     ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &limit));
     EXPECT_EQ(STATUS_ERROR_WRITING_TO_FILE, writeWholeFile(file, std::string(2000, 'a')));
     ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &before));
-    EXPECT_EQ("precious", contents("file"));
+    EXPECT_EQ("precious", contents(path("file")));
     EXPECT_EQ(1u, files());
 }
 
@@ -191,13 +167,13 @@ TEST_F(WholeFile, LeavesNothingBehindWhenItCannotBeWritten) {
         int status;
     } rows[] = {
             {path("none/file"), STATUS_ERROR_OPENING_FILE},
-            {make("file", "precious") + "/below", STATUS_ERROR_OPENING_FILE},
+            {write("file", "precious") + "/below", STATUS_ERROR_OPENING_FILE},
             {folder, STATUS_ERROR_OPENING_FILE},
     };
     for (const auto& row : rows) {
         EXPECT_EQ(row.status, writeWholeFile(row.path, "bytes")) << row.path;
     }
-    EXPECT_EQ("precious", contents("file"));
+    EXPECT_EQ("precious", contents(path("file")));
     EXPECT_EQ(1u, files());
 }
 

@@ -2,32 +2,16 @@
 #include "tools/zelkctl/files/ConfigFile.h"
 
 #include <gtest/gtest.h>
-#include <stdlib.h>
 
-#include <filesystem>
-#include <fstream>
 #include <string>
+
+#include "tests/support/FolderTest.h"
 
 namespace pemaro::zelkctl {
 
 namespace {
 
-namespace fs = std::filesystem;
-
-class ConfigFileTest : public ::testing::Test {
-  protected:
-    ConfigFileTest() { EXPECT_NE(nullptr, mkdtemp(&folder[0])); }
-    ~ConfigFileTest() override { fs::remove_all(folder); }
-
-    std::string path(const std::string& name) const { return folder + "/" + name; }
-
-    std::string write(const std::string& name, const std::string& content) const {
-        std::ofstream(path(name), std::ios::binary) << content;
-        return path(name);
-    }
-
-    std::string folder = testing::TempDir() + "ConfigFile_test.XXXXXX";
-};
+using ConfigFileTest = test::FolderTest;
 
 }  // namespace
 

@@ -20,34 +20,21 @@
 #include <string>
 #include <thread>
 
+#include "tests/support/FolderTest.h"
+
 namespace pemaro::zelkctl {
 
 namespace {
 
 namespace fs = std::filesystem;
 
-class OutputFileTest : public ::testing::Test {
+class OutputFileTest : public test::FolderTest {
   protected:
-    OutputFileTest() { EXPECT_NE(nullptr, mkdtemp(&folder[0])); }
-    ~OutputFileTest() override { fs::remove_all(folder); }
-
-    std::string path(const std::string& name) const { return folder + "/" + name; }
-
-    std::string write(const std::string& name, const std::string& content) const {
-        std::ofstream(path(name), std::ios::binary) << content;
-        return path(name);
-    }
-
     // Makes a whole of these bytes.
     static FileResult make(const std::string& path, const std::string& bytes) {
         OutputFile file;
         static_cast<void>(file.open(path) && file.write(bytes) && file.close());
         return file.result();
-    }
-
-    static std::string contents(const std::string& file) {
-        std::ifstream stream(file, std::ios::binary);
-        return {std::istreambuf_iterator<char>(stream), {}};
     }
 
     // What a process of its own makes of it: 0 for true.
@@ -69,13 +56,6 @@ class OutputFileTest : public ::testing::Test {
             _exit(2);
         }
     }
-
-    size_t files() const {
-        return static_cast<size_t>(
-                std::distance(fs::directory_iterator(folder), fs::directory_iterator()));
-    }
-
-    std::string folder = testing::TempDir() + "OutputFile_test.XXXXXX";
 };
 
 }  // namespace
