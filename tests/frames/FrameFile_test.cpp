@@ -3,17 +3,17 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include <atomic>
-#include <csignal>
 #include <fstream>
 #include <iterator>
 #include <string>
 #include <thread>
 #include <vector>
+
+#include "tests/support/FullDisk.h"
 
 namespace pemaro::frames {
 
@@ -189,18 +189,14 @@ TEST_F(FrameFileTest, WritesNothingMoreAfterAFailure) {
 }
 
 TEST_F(FrameFileTest, TakesBackAPartOfAFrame) {
-    // A limit on the file's size cuts the third frame in two, as a full disk does.
-    signal(SIGXFSZ, SIG_IGN);
-    rlimit before{};
-    ASSERT_EQ(0, getrlimit(RLIMIT_FSIZE, &before));
-    rlimit limit = before;
-    limit.rlim_cur = 25;
     ASSERT_TRUE(file.open(path));
-    ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &limit));
-    EXPECT_TRUE(file.write("0123456789", 10));
-    EXPECT_TRUE(file.write("abcdefghij", 10));
-    EXPECT_FALSE(file.write("ABCDEFGHIJ", 10));
-    ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &before));
+    {
+        // The third frame is cut in two.
+        const test::FullDisk full(25);
+        EXPECT_TRUE(file.write("0123456789", 10));
+        EXPECT_TRUE(file.write("abcdefghij", 10));
+        EXPECT_FALSE(file.write("ABCDEFGHIJ", 10));
+    }
     EXPECT_EQ("cannot write " + path + ": File too large", file.problem());
     EXPECT_EQ("0123456789abcdefghij", contents(path));
 }

@@ -3,18 +3,17 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/sysmacros.h>
 #include <unistd.h>
 
-#include <csignal>
 #include <filesystem>
 #include <string>
 #include <vector>
 
 #include "pemaro/Status.h"
 #include "tests/support/FolderTest.h"
+#include "tests/support/FullDisk.h"
 
 namespace pemaro::simulator {
 
@@ -119,16 +118,11 @@ TEST_F(WholeFile, LeavesOthersFilesAlone) {
 }
 
 TEST_F(WholeFile, StaysWhatItWasWhereTheDiskIsFull) {
-    // A limit on the size of files, as a full disk is one.
     const std::string file = write("file", "precious");
-    signal(SIGXFSZ, SIG_IGN);
-    rlimit before{};
-    ASSERT_EQ(0, getrlimit(RLIMIT_FSIZE, &before));
-    rlimit limit = before;
-    limit.rlim_cur = 1000;
-    ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &limit));
-    EXPECT_EQ(STATUS_ERROR_WRITING_TO_FILE, writeWholeFile(file, std::string(2000, 'a')));
-    ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &before));
+    {
+        const test::FullDisk full(1000);
+        EXPECT_EQ(STATUS_ERROR_WRITING_TO_FILE, writeWholeFile(file, std::string(2000, 'a')));
+    }
     EXPECT_EQ("precious", contents(path("file")));
     EXPECT_EQ(1u, files());
 }

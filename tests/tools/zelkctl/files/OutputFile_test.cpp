@@ -8,12 +8,10 @@
 #include <sched.h>
 #include <stdlib.h>
 #include <sys/mount.h>
-#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <csignal>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -21,6 +19,7 @@
 #include <thread>
 
 #include "tests/support/FolderTest.h"
+#include "tests/support/FullDisk.h"
 
 namespace pemaro::zelkctl {
 
@@ -268,15 +267,9 @@ TEST_F(OutputFileTest, IsWrittenToWhereItIsMounted) {
 }
 
 TEST_F(OutputFileTest, IsNotMadeWhereTheDiskIsFull) {
-    // A limit on the size of files, as a full disk is one.
     const std::string kept = write("file", "precious");
-    signal(SIGXFSZ, SIG_IGN);
-    rlimit before{};
-    ASSERT_EQ(0, getrlimit(RLIMIT_FSIZE, &before));
-    rlimit limit = before;
-    limit.rlim_cur = 1000;
-    ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &limit));
     {
+        const test::FullDisk full(1000);
         OutputFile file;
         EXPECT_TRUE(file.open(kept));
         EXPECT_TRUE(file.write(std::string(2000, 'a')));
@@ -284,7 +277,6 @@ TEST_F(OutputFileTest, IsNotMadeWhereTheDiskIsFull) {
         EXPECT_EQ("cannot write " + kept + ": File too large", file.problem());
         EXPECT_FALSE(file.write("more"));
     }
-    ASSERT_EQ(0, setrlimit(RLIMIT_FSIZE, &before));
     EXPECT_EQ("precious", contents(kept));
     EXPECT_EQ(1u, files());
 }
